@@ -1,0 +1,102 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "fileops/ui_utils.h"
+
+#include "platform/platform.h"
+#include "platform/ui/alert_controller.h"
+#include "platform/ui/screen_factory.h"
+
+namespace vaelo {
+
+namespace {
+
+std::string localized(const char* key) { return Platform::current().formatting.localizedString(key); }
+
+std::string wordsOf(const std::optional<Error>& error) {
+  if (error && error->localizedDescription) return *error->localizedDescription;
+  if (error && error->localizedFailureReason) return *error->localizedFailureReason;
+  return localized("Error exception");
+}
+
+}  // namespace
+
+void UIUtils::showAlertMessageParentViewController(const std::string& title, const std::string& message,
+                                                   const ViewControllerRef& parent) {
+  auto alert = std::make_shared<AlertController>(title, message, AlertController::Style::Alert);
+  alert->addAction(std::make_shared<AlertAction>(localized("OK"), AlertAction::Style::Default));
+  if (parent) parent->presentViewController(alert, true);
+}
+
+void UIUtils::showErrorParentViewController(const std::optional<Error>& error, const ViewControllerRef& parent) {
+  showAlertMessageParentViewController(wordsOf(error), "", parent);
+}
+
+void UIUtils::showFriendlyMoveErrorParentViewController(const Error& error, const ViewControllerRef& parent) {
+  const auto path = error.userInfo.find(DestinationFilePathErrorKey);
+  const std::string* text = path == error.userInfo.end() ? nullptr : path->second.get<std::string>();
+  showFriendlyMoveOrRenameErrorBasenameMovingToDirParentViewController(
+      error, text ? URL(*text).lastPathComponent() : std::string(), true, parent);
+}
+
+void UIUtils::showFriendlyRenameErrorBasenameParentViewController(const Error& error, const std::string& basename,
+                                                                  const ViewControllerRef& parent) {
+  showFriendlyMoveOrRenameErrorBasenameMovingToDirParentViewController(error, basename, false, parent);
+}
+
+void UIUtils::showFriendlyMoveOrRenameErrorBasenameMovingToDirParentViewController(const Error& error,
+                                                                                   const std::string& basename,
+                                                                                   bool movingToDir,
+                                                                                   const ViewControllerRef& parent) {
+  switch (error.code) {
+    case FileErrorCode::WriteFileExists:
+      showItemExistsAlertMovingToDirParentViewController(basename, movingToDir, parent);
+      break;
+    case FileErrorCode::WriteInvalidFileName:
+      showInvalidItemNameAlertParentViewController(basename, parent);
+      break;
+    default:
+      showErrorParentViewController(error, parent);
+  }
+}
+
+void UIUtils::showItemExistsAlertMovingToDirParentViewController(const std::string& basename, bool movingToDir,
+                                                                 const ViewControllerRef& parent) {
+  Formatting& formatting = Platform::current().formatting;
+  if (movingToDir) {
+    const std::string title =
+        formatting.filled(localized("An item named “%@” already exists in the new location."), {basename});
+    showAlertMessageParentViewController(title, "", parent);
+    return;
+  }
+  const std::string extension = URL("/" + basename).pathExtension();
+  const std::string stem =
+      extension.empty() ? basename : basename.substr(0, basename.size() - extension.size() - 1);
+  const std::string title =
+      extension.empty()
+          ? formatting.filled(localized("The name “%@” is already taken."), {stem})
+          : formatting.filled(localized("The name “%1$@” with extension “.%2$@” is already taken."), {stem, extension});
+  showAlertMessageParentViewController(title, localized("Choose a different name."), parent);
+}
+
+void UIUtils::showInvalidItemNameAlertParentViewController(const std::string& basename, const ViewControllerRef& parent) {
+  const std::string message = Platform::current().formatting.filled(
+      localized("The name “%@” can’t be used. Try using a name with fewer characters, or with no punctuation marks."),
+      {basename});
+  showAlertMessageParentViewController("", message, parent);
+}
+
+void UIUtils::showUnsupportedError(const ViewControllerRef& parent) {
+  Error error{FileErrorDomain, FileErrorCode::FeatureUnsupported, {}, {}, {}};
+  error.localizedDescription = localized("This can’t be done with this item.");
+  showErrorParentViewController(error, parent);
+}
+
+std::string UIUtils::bestMessage(const std::optional<Error>& error) {
+  if (!error) return "";
+  if (error->code == FileErrorCode::WriteFileExists) return localized("Name is already taken");
+  if (error->code == FileErrorCode::WriteInvalidFileName) return localized("Character not allowed in filename");
+  return wordsOf(error);
+}
+
+bool UIUtils::slateMode() { return Platform::current().screens.idiom() == InterfaceIdiom::Slate; }
+
+}  // namespace vaelo

@@ -1,0 +1,41 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <optional>
+#include <string>
+
+#include "platform/error.h"
+#include "platform/ui/view_controller.h"
+
+namespace vaelo {
+
+/// Tells a person what went wrong. Main thread.
+class UIUtils {
+ public:
+  /// An alert with the title, the message (either may be empty) and one "OK" button over `parent`.
+  static void showAlertMessageParentViewController(const std::string& title, const std::string& message,
+                                                   const ViewControllerRef& parent);
+  /// An alert titled with the error's description, else its failure reason, else "Error exception".
+  static void showErrorParentViewController(const std::optional<Error>& error, const ViewControllerRef& parent);
+  /// An alert for a failed move: names the clash or the name that can't be used, else as showError does. The name comes from
+  /// the destination path in the error's user information.
+  static void showFriendlyMoveErrorParentViewController(const Error& error, const ViewControllerRef& parent);
+  /// Likewise for a rename to `basename`.
+  static void showFriendlyRenameErrorBasenameParentViewController(const Error& error, const std::string& basename,
+                                                                  const ViewControllerRef& parent);
+  static void showFriendlyMoveOrRenameErrorBasenameMovingToDirParentViewController(const Error& error,
+                                                                                   const std::string& basename,
+                                                                                   bool movingToDir,
+                                                                                   const ViewControllerRef& parent);
+  static void showItemExistsAlertMovingToDirParentViewController(const std::string& basename, bool movingToDir,
+                                                                 const ViewControllerRef& parent);
+  static void showInvalidItemNameAlertParentViewController(const std::string& basename, const ViewControllerRef& parent);
+  /// The alert for something that can't be done with this item.
+  static void showUnsupportedError(const ViewControllerRef& parent);
+  /// One line for the error, empty for none.
+  static std::string bestMessage(const std::optional<Error>& error);
+  /// True on a tablet-class device.
+  static bool slateMode();
+};
+
+}  // namespace vaelo

@@ -1,0 +1,72 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "preview/glimpse_item_controller.h"
+
+#include "items/dr_item.h"
+#include "items/vlo_log.h"
+#include "platform/platform.h"
+#include "preview/preview_item_manager.h"
+
+namespace vaelo {
+
+const std::shared_ptr<GlimpseItemController>& GlimpseItemController::defaultController() {
+  static const auto shared = std::make_shared<GlimpseItemController>();
+  return shared;
+}
+
+GlimpseItemController::GlimpseItemController() {
+  setDelegate(this);
+  setDataSource(this);
+}
+
+std::shared_ptr<GlimpseItemController> GlimpseItemController::initWithItemManager(
+    const std::shared_ptr<PreviewItemManager>& manager) {
+  auto controller = std::make_shared<GlimpseItemController>();
+  controller->takeDocumentsOf(manager);
+  return controller;
+}
+
+void GlimpseItemController::glimpseNewItem(const std::shared_ptr<PreviewItemManager>& manager) {
+  takeDocumentsOf(manager);
+  VLO_DEBUG("GLPreviewController: reloadData");
+  reloadData();
+}
+
+void GlimpseItemController::takeDocumentsOf(const std::shared_ptr<PreviewItemManager>& manager) {
+  itemManager_ = manager;
+  arrayOfDocuments_.reset();
+  const std::shared_ptr<DRItem> item = manager ? manager->item() : nullptr;
+  if (item && item->resolvedURL()) arrayOfDocuments_ = {*item->resolvedURL()};
+}
+
+bool GlimpseItemController::isVisible() const {
+  return isViewLoaded() && const_cast<GlimpseItemController*>(this)->view()->isInWindow();
+}
+
+void GlimpseItemController::viewWillDisappear(bool animated) {
+  if (const auto manager = itemManager_.lock()) manager->viewControllerWillDisappear(shared_from_this());
+  PreviewController::viewWillDisappear(animated);
+}
+
+std::size_t GlimpseItemController::numberOfPreviewItemsInPreviewController(PreviewController&) {
+  return arrayOfDocuments_ ? arrayOfDocuments_->size() : 0;
+}
+
+URL GlimpseItemController::previewControllerPreviewItemAtIndex(PreviewController&, std::size_t index) {
+  return arrayOfDocuments_->at(index);
+}
+
+bool GlimpseItemController::glPreviewItemIsPDFKind(const URL& item) {
+  TypeIdentifiers& types = Platform::current().types;
+  const std::optional<std::string> type = types.preferredIdentifierForExtension(item.pathExtension());
+  return type && types.conformsTo(*type, "com.adobe.pdf");
+}
+
+bool GlimpseItemController::previewControllerCanEditItem(PreviewController&, const URL& item) {
+  return glPreviewItemIsPDFKind(item);
+}
+
+bool GlimpseItemController::previewControllerShouldSaveEditedItem(PreviewController&, const URL& item) {
+  return glPreviewItemIsPDFKind(item);
+}
+
+}  // namespace vaelo
