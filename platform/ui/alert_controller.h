@@ -1,70 +1,57 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <functional>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "platform/ui/alert_action.h"
 #include "platform/ui/text_field.h"
 #include "platform/ui/view_controller.h"
 
 namespace vaelo {
 
-/// A button of an alert.
-class AlertAction : public Observable {
- public:
-  enum class Style { Default, Cancel, Destructive };
-  AlertAction(std::string title, Style style, std::function<void()> handler = nullptr)
-      : title_(std::move(title)), style_(style), handler_(std::move(handler)) {}
-  const std::string& title() const { return title_; }
-  Style style() const { return style_; }
-  bool isEnabled() const { return enabled_; }
-  void setEnabled(bool enabled) { set(enabled_, enabled); }
-  /// Asked when pressed; the alert stays open when it answers false.
-  void setShouldDismiss(std::function<bool()> shouldDismiss) { shouldDismiss_ = std::move(shouldDismiss); }
+enum class AlertStyle { Alert, ActionSheet };
 
- private:
-  friend class AlertController;
-  std::string title_;
-  Style style_;
-  std::function<void()> handler_;
-  std::function<bool()> shouldDismiss_;
-  bool enabled_ = true;
-};
-
-/// A question or a message over a screen: an alert in the middle, or a sheet of actions. Main thread.
+/// A question or a message over the screen; its anchor is the popover anchor that every screen has. Main thread.
 class AlertController : public ViewController {
  public:
-  enum class Style { Alert, ActionSheet };
-  struct PopoverAnchor {
-    std::shared_ptr<View> sourceView;
-    Rect sourceRect;
-    bool leftAndRightArrowsOnly = false;
-    std::shared_ptr<BarButtonItem> barButton;
-  };
-
-  AlertController(std::string title, std::string message, Style style)
-      : title_(std::move(title)), message_(std::move(message)), style_(style) {}
+  /// Texts may be empty.
+  AlertController(AlertStyle style, const std::string& title, std::string message);
+  static std::shared_ptr<AlertController> make(AlertStyle style, const std::string& title, const std::string& message) {
+    return std::make_shared<AlertController>(style, title, message);
+  }
   std::string className() const override { return "AlertController"; }
-  std::string title() const override { return title_; }
-  const std::string& message() const { return message_; }
-  Style style() const { return style_; }
-  void addAction(std::shared_ptr<AlertAction> action) { actions_.push_back(std::move(action)); }
-  const std::vector<std::shared_ptr<AlertAction>>& actions() const { return actions_; }
-  std::shared_ptr<TextField> addTextField();
-  const std::vector<std::shared_ptr<TextField>>& textFields() const { return textFields_; }
-  const ViewControllerRef& contentViewController() const { return content_; }
-  void setContentViewController(ViewControllerRef content) { content_ = std::move(content); }
-  PopoverAnchor& popover() { return popover_; }
 
-  /// The user pressed `action`: nothing while it is disabled; otherwise asks whether the alert may close, runs the handler
-  /// and, when it may, takes the alert away first.
-  void press(const std::shared_ptr<AlertAction>& action);
+  AlertStyle style() const { return style_; }
+  const std::string& message() const { return message_; }
+  const std::vector<AlertActionRef>& actions() const { return actions_; }
+  void addAction(AlertActionRef action);
+  /// The action that the return key of the keyboard means; null for none.
+  const AlertActionRef& preferredAction() const { return preferredAction_; }
+  void setPreferredAction(AlertActionRef action) { preferredAction_ = std::move(action); }
+  const std::vector<std::shared_ptr<TextField>>& textFields() const { return textFields_; }
+  /// Adds a field and lets `configure` set it up.
+  void addTextField(const std::function<void(const std::shared_ptr<TextField>&)>& configure);
+  /// A screen shown between message and buttons; null for none.
+  const ViewControllerRef& contentViewController() const { return contentViewController_; }
+  void setContentViewController(ViewControllerRef controller);
+
+  /// For the host, and for tests: the user chose the action. Nothing happens when it is disabled; else its shouldDismiss is
+  /// asked, the alert goes away, and then the handler runs, so that it can show something else. True when the alert went.
+  bool performAction(const AlertActionRef& action);
+  /// For the host: the user waved the alert away (Escape, a click beside it): performs the cancel action. False when there
+  /// is none; the alert stays.
+  bool cancel();
 
  private:
-  std::string title_;
+  AlertStyle style_;
   std::string message_;
-  Style style_;
-  std::vector<std::shared_ptr<AlertAction>> actions_;
+  std::vector<AlertActionRef> actions_;
+  AlertActionRef preferredAction_;
   std::vector<std::shared_ptr<TextField>> textFields_;
-  ViewControllerRef content_;
-  PopoverAnchor popover_;
+  ViewControllerRef contentViewController_;
 };
 
 }  // namespace vaelo

@@ -3,38 +3,56 @@
 
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 
+#include "platform/ui/signal.h"
 #include "platform/ui/view.h"
 
 namespace vaelo {
 
-/// A button, a view or a space in a navigation bar or toolbar. Main thread.
-class BarButtonItem : public Observable {
+class BarButtonItem;
+using BarButtonItemRef = std::shared_ptr<BarButtonItem>;
+
+enum class SystemItem { Cancel, Done, Trash, Action, Organize, FlexibleSpace, FixedSpace };
+enum class BarButtonStyle { Plain, Done };
+
+/// A button, a space or a view in a navigation bar or toolbar. Main thread.
+class BarButtonItem : public std::enable_shared_from_this<BarButtonItem> {
  public:
-  enum class Kind { Title, Cancel, Done, Trash, Action, Organize, FlexibleSpace, FixedSpace, CustomView };
-  using Action = std::function<void(BarButtonItem&)>;
+  /// Gets the item that was pressed.
+  using Action = std::function<void(const BarButtonItemRef& sender)>;
 
-  static std::shared_ptr<BarButtonItem> withTitle(std::string title, Action action);
-  static std::shared_ptr<BarButtonItem> system(Kind kind, Action action = nullptr);
-  static std::shared_ptr<BarButtonItem> withCustomView(std::shared_ptr<View> view);
+  static BarButtonItemRef withTitle(std::string title, BarButtonStyle style, Action action);
+  /// Spaces have no action.
+  static BarButtonItemRef system(SystemItem item, Action action = nullptr);
+  static BarButtonItemRef withCustomView(ViewRef view);
 
-  Kind kind() const { return kind_; }
   const std::string& title() const { return title_; }
-  const std::shared_ptr<View>& customView() const { return customView_; }
-  bool isEnabled() const { return enabled_; }
-  void setEnabled(bool enabled) { set(enabled_, enabled); }
-  /// Runs the action as a press does; nothing while disabled.
+  void setTitle(std::string title);
+  const std::optional<SystemItem>& systemItem() const { return systemItem_; }
+  const ViewRef& customView() const { return customView_; }
+  BarButtonStyle style() const { return style_; }
+  bool enabled() const { return enabled_; }
+  /// Also enables or disables a control that is the custom view.
+  void setEnabled(bool enabled);
+  const Action& action() const { return action_; }
+  void setAction(Action action) { action_ = std::move(action); }
+  /// For the host, and for tests: the user pressed the item. A disabled one ignores it; a control that is the custom view
+  /// gets touch-up-inside.
   void press();
+  /// Emitted after a property changed.
+  Signal<BarButtonItem&>& changed() { return changed_; }
 
  private:
-  Kind kind_ = Kind::Title;
+  BarButtonItem() = default;
   std::string title_;
-  std::shared_ptr<View> customView_;
-  Action action_;
+  std::optional<SystemItem> systemItem_;
+  ViewRef customView_;
+  BarButtonStyle style_ = BarButtonStyle::Plain;
   bool enabled_ = true;
+  Action action_;
+  Signal<BarButtonItem&> changed_;
 };
-
-using BarButtonItems = std::vector<std::shared_ptr<BarButtonItem>>;
 
 }  // namespace vaelo

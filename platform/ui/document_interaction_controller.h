@@ -5,21 +5,32 @@
 #include <string>
 
 #include "platform/launch_services.h"
-#include "platform/ui/view_controller.h"
+#include "platform/ui/bar_button_item.h"
 
 namespace vaelo {
 
-/// Hands one document to other applications. Main thread.
+class DocumentInteractionController;
+
+class DocumentInteractionControllerDelegate {
+ public:
+  virtual ~DocumentInteractionControllerDelegate() = default;
+  virtual void documentInteractionControllerDidDismissOptionsMenu(DocumentInteractionController&) {}
+};
+
+/// Shares a document or opens it in another application. It must be kept alive while its menu is shown. Main thread.
 class DocumentInteractionController {
  public:
   virtual ~DocumentInteractionController() = default;
-  virtual const URL& url() const = 0;
-  /// The name that the sheet shows; empty for the document's own.
-  virtual void setName(const std::string& name) = 0;
-  virtual void presentOptionsMenuFromRectInView(const Rect& rect, const std::shared_ptr<View>& view, bool animated) = 0;
-  virtual void presentOptionsMenuFromBarButtonItem(const std::shared_ptr<BarButtonItem>& button, bool animated) = 0;
-  /// Opens the document, where it lies, with the application.
-  virtual void openInPlaceWithApplication(const ApplicationRecord& application) = 0;
+  virtual URL url() const = 0;
+  /// The name that the menu shows; at the start the document's own.
+  virtual std::string name() const = 0;
+  virtual void setName(std::string name) = 0;
+  virtual void setDelegate(std::weak_ptr<DocumentInteractionControllerDelegate> delegate) = 0;
+  /// False when there is nothing to offer.
+  virtual bool presentOptionsMenuFromRect(const Rect& rect, const ViewRef& view, bool animated) = 0;
+  virtual bool presentOptionsMenuFromBarButtonItem(const BarButtonItemRef& item, bool animated) = 0;
+  /// Hands the document itself, not a copy, to the application. True when it was started.
+  virtual bool openInPlaceWith(const ApplicationRecord& application) = 0;
 };
 
 }  // namespace vaelo

@@ -1,80 +1,91 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <functional>
 #include <map>
+#include <memory>
 #include <optional>
+#include <string>
 #include <vector>
 
-#include "platform/ui/view_controller.h"
-#include "platform/url.h"
+#include "platform/ui/document_list_controller_delegate.h"
 
 namespace vaelo {
 
-/// Per-item actions of a list; bit n of the available actions is code n.
-enum ItemAction {
-  ItemActionDelete = 0,
-  ItemActionMore = 1,
-  ItemActionInfo = 2,
-  ItemActionRename = 3,
-  ItemActionShare = 4,
-  ItemActionMove = 5,
-  ItemActionFirmpressPop = 6,
-};
+class SearchController;
 
-class DocumentListController;
-using DocumentListControllerRef = std::shared_ptr<DocumentListController>;
+enum class DocumentListChange { Items, Selection, Editing, AvailableActions, Search };
 
-/// Told what the user does in a list. Main thread.
-class DocumentListControllerDelegate {
- public:
-  virtual ~DocumentListControllerDelegate() = default;
-  /// A folder was chosen; `folder` is a ready list of it.
-  virtual void documentListControllerDidSelectContainerWithViewController(const DocumentListControllerRef& list,
-                                                                          const DocumentListControllerRef& folder) = 0;
-  virtual void documentListControllerDidSelectItemAtURL(const DocumentListControllerRef& list, const URL& url) = 0;
-  /// Its items or its selection changed.
-  virtual void documentListControllerItemsChanged(const DocumentListControllerRef& list) = 0;
-  virtual void documentListControllerURLWasRemoved(const DocumentListControllerRef& list) = 0;
-  virtual void documentListControllerPerformActionURLOriginatingViewCompletion(
-      const DocumentListControllerRef& list, int action, const URL& url, const std::shared_ptr<View>& originatingView,
-      std::function<void()> completion) = 0;
-  virtual void documentListControllerPerformActionURL(const DocumentListControllerRef& list, int action, const URL& url) = 0;
-  virtual ViewControllerRef documentListControllerViewControllerForPreviewingItemAtURL(const DocumentListControllerRef& list,
-                                                                                       const URL& url) = 0;
-};
-
-/// The platform's list of one folder, or of the root of the drive. Main thread.
+/// A list of one folder of the drive. Main thread.
+///
+/// The model holds what the screens ask for; the host fills it from the folder and shows it. The operations under "For the
+/// host" are what the user and the folder do; tests use them as well. The delegate is held weakly.
 class DocumentListController : public ViewController {
  public:
+  /// A list of the folder; `allContainers` makes it the drive's root list, which also shows the libraries. Use ScreenFactory,
+  /// so that the host knows of the list, except in subclasses.
+  explicit DocumentListController(std::optional<URL> presentedURL, bool allContainers = false);
+  ~DocumentListController() override;
   std::string className() const override { return "DocumentListController"; }
-  /// The folder it shows; the default container's for the root list. Nothing when there is none.
-  virtual std::optional<URL> presentedURL() const = 0;
-  /// The items that it shows now, in order.
-  virtual std::vector<URL> containedItems() const = 0;
-  virtual std::size_t containedItemCount() const = 0;
-  virtual std::vector<URL> selectedItems() const = 0;
-  virtual void setSelectedItems(const std::vector<URL>& items) = 0;
-  virtual bool isEditing() const = 0;
-  virtual void setEditingAnimated(bool editing, bool animated) = 0;
-  virtual unsigned availableActions() const = 0;
-  virtual void setAvailableActions(unsigned actions) = 0;
-  virtual void setDelegate(std::weak_ptr<DocumentListControllerDelegate> delegate) = 0;
-  /// Opens the search field with the query; the empty string opens an empty one.
-  virtual void startSearchWithQueryStringBecomeFirstResponder(const std::string& query, bool becomeFirstResponder) = 0;
-  virtual bool shouldShowSearch() const { return true; }
 
-  /// An object that lives as long as the list, under a key; null takes it away.
+  const std::optional<URL>& presentedURL() const { return presentedURL_; }
+  bool showsAllContainers() const { return allContainers_; }
+  /// In the order in which they are shown.
+  const std::vector<URL>& containedItems() const { return containedItems_; }
+  const std::vector<URL>& selectedItems() const { return selectedItems_; }
+  /// Selects those that the list contains, in the list's order, and reports itemsChanged if that changes the selection.
+  void setSelectedItems(const std::vector<URL>& items);
+  bool editing() const { return editing_; }
+  /// Leaving clears the selection without a report: whoever switches the mode refreshes its own screen.
+  void setEditingAnimated(bool editing, bool animated);
+  unsigned availableActions() const { return availableActions_; }
+  void setAvailableActions(unsigned actions);
+  std::shared_ptr<DocumentListControllerDelegate> delegate() const { return delegate_.lock(); }
+  void setDelegate(std::weak_ptr<DocumentListControllerDelegate> delegate) { delegate_ = std::move(delegate); }
+  /// Presents a SearchController with the query, or gives the query to the one that is there.
+  void startSearchWithQueryStringBecomeFirstResponder(const std::string& query, bool becomeFirstResponder);
+  /// Whether the list offers a search field.
+  virtual bool shouldShowSearch() const { return true; }
+  /// Scrolls up and down for a performance harness; a list that nobody shows does nothing.
+  void runScrollTest(const std::string& name, int iterations, int delta, int listMode);
+
+  /// Keeps an object for as long as the list lives; null drops it.
   void setAttachment(const std::string& key, std::shared_ptr<void> object);
   std::shared_ptr<void> attachment(const std::string& key) const;
+  /// The caller knows which class it attached.
+  template <typename T>
+  std::shared_ptr<T> attachmentAs(const std::string& key) const {
+    return std::static_pointer_cast<T>(attachment(key));
+  }
+
+  // For the host.
+  /// The folder's items are these now; selected ones that are gone are no longer selected. Always reports itemsChanged.
+  void itemsLoaded(std::vector<URL> items);
+  /// The folder moved or was renamed.
+  void folderMoved(const URL& url);
+  void folderWasRemoved();
+  void userSelectedContainer(const DocumentListControllerRef& chosen);
+  void userSelectedItem(const URL& url);
+  void userChoseAction(int action, const URL& url, const ViewRef& view, std::function<void()> completion);
+  ViewControllerRef viewControllerForPreviewing(const URL& url);
+  /// Emitted after a property changed.
+  Signal<DocumentListController&, DocumentListChange>& listChanged() { return listChanged_; }
+  using ScrollTest = std::function<void(const std::string& name, int iterations, int delta, int listMode)>;
+  void setScrollTest(ScrollTest test) { scrollTest_ = std::move(test); }
 
  private:
-  std::map<std::string, std::shared_ptr<void>> attachments_;
-};
+  DocumentListControllerRef self();
 
-/// The search of a list while it is open; it is presented over the list.
-class SearchController : public ViewController {
- public:
-  std::string className() const override { return "SearchController"; }
+  std::optional<URL> presentedURL_;
+  bool allContainers_;
+  bool editing_ = false;
+  unsigned availableActions_ = 0;
+  std::vector<URL> containedItems_;
+  std::vector<URL> selectedItems_;
+  std::weak_ptr<DocumentListControllerDelegate> delegate_;
+  std::map<std::string, std::shared_ptr<void>> attachments_;
+  ScrollTest scrollTest_;
+  Signal<DocumentListController&, DocumentListChange> listChanged_;
 };
 
 }  // namespace vaelo

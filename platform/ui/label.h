@@ -1,34 +1,49 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include "platform/ui/font.h"
+#include <optional>
+#include <string>
+
+#include "platform/ui/attributed_string.h"
 #include "platform/ui/view.h"
 
 namespace vaelo {
 
-enum class TextAlignment { Natural, Left, Right, Center };
+/// Natural follows the interface's direction.
+enum class TextAlignment { Left, Center, Right, Natural };
 
-/// A text that is read, not edited.
+/// Text that can't be edited. Main thread.
 class Label : public View {
  public:
+  explicit Label(const Rect& frame = {}) : View(frame) {}
   const std::string& text() const { return text_; }
-  void setText(std::string text) { set(text_, std::move(text)); }
+  /// Drops attributed text.
+  void setText(std::string text);
+  const std::optional<AttributedString>& attributedText() const { return attributedText_; }
+  /// text() becomes its characters.
+  void setAttributedText(std::optional<AttributedString> text);
   const Font& font() const { return font_; }
-  void setFont(Font font) { set(font_, font); }
+  void setFont(const Font& font);
   const Color& textColor() const { return textColor_; }
-  void setTextColor(Color color) { set(textColor_, color); }
-  TextAlignment alignment() const { return alignment_; }
-  void setAlignment(TextAlignment alignment) { set(alignment_, alignment); }
-  /// 0 is no limit.
-  int maxLines() const { return maxLines_; }
-  void setMaxLines(int lines) { set(maxLines_, lines); }
+  void setTextColor(const Color& color);
+  TextAlignment textAlignment() const { return alignment_; }
+  void setTextAlignment(TextAlignment alignment);
+  /// 0: as many as it takes; 1 at the start. What does not fit ends in an ellipsis.
+  int numberOfLines() const { return numberOfLines_; }
+  void setNumberOfLines(int lines);
+
+  /// The measured text; empty text takes no room.
+  Size intrinsicContentSize() const override;
+  Size sizeThatFits(const Size& size) const override;
 
  private:
+  Size measured(double maxWidth) const;
   std::string text_;
-  Font font_;
+  std::optional<AttributedString> attributedText_;
+  Font font_ = Font::preferred(TextStyle::Body);
   Color textColor_ = Color::black();
   TextAlignment alignment_ = TextAlignment::Natural;
-  int maxLines_ = 1;
+  int numberOfLines_ = 1;
 };
 
 }  // namespace vaelo

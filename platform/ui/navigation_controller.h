@@ -1,14 +1,18 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <functional>
+#include <memory>
 #include <vector>
 
+#include "platform/ui/navigation_host.h"
 #include "platform/ui/view_controller.h"
 
 namespace vaelo {
 
-using ViewControllerList = std::vector<ViewControllerRef>;
+class NavigationController;
 
+/// Is told which screen of the stack is shown. Main thread.
 class NavigationControllerDelegate {
  public:
   virtual ~NavigationControllerDelegate() = default;
@@ -16,50 +20,77 @@ class NavigationControllerDelegate {
   virtual void navigationControllerDidShowViewControllerAnimated(NavigationController&, const ViewControllerRef&, bool) {}
 };
 
-/// Mirrors a stack of screens; the host installs one. Main thread.
-class NavigationHost {
- public:
-  virtual ~NavigationHost() = default;
-  /// Shows the last of `stack` and calls `done` once when it stands still. A later call ends an earlier one's animation.
-  virtual void showStack(const ViewControllerList& stack, bool animated, std::function<void()> done) = 0;
-  virtual void setToolbarHidden(bool hidden) = 0;
-};
-
-/// A stack of screens of which the top one shows. Main thread.
+/// A stack of screens of which the top one is shown. Main thread.
 ///
-/// Each change of the top screen calls, in this order: the old one's viewWillDisappear, the new one's viewWillAppear, the delegate's
-/// will-show; when the transition has ended viewDidDisappear, viewDidAppear and the delegate's did-show.
+/// Every change of the top goes: delegate willShow, viewWillDisappear and viewWillAppear, the host's transition, viewDidDisappear
+/// and viewDidAppear, delegate didShow. Without a host the transition takes no time. Before the controller's own view is
+/// loaded only the delegate is told. A change during a transition ends that transition first.
 class NavigationController : public ViewController {
  public:
+  NavigationController() = default;
+  ~NavigationController() override;
   std::string className() const override { return "NavigationController"; }
 
-  const ViewControllerList& viewControllers() const { return stack_; }
-  void setViewControllers(const ViewControllerList& stack, bool animated);
+  /// From the root to the top.
+  const std::vector<ViewControllerRef>& viewControllers() const { return stack_; }
+  /// An empty list empties the stack.
+  void setViewControllers(std::vector<ViewControllerRef> controllers, bool animated);
   void pushViewController(const ViewControllerRef& controller, bool animated);
-  /// The screen that left; null when only the root is there.
-  ViewControllerRef popViewController(bool animated);
-  void popToRootViewController(bool animated);
+  /// Takes the top away unless it is the root; null when nothing was taken.
+  ViewControllerRef popViewControllerAnimated(bool animated);
+  /// What was taken away, from the lowest up.
+  std::vector<ViewControllerRef> popToRootViewControllerAnimated(bool animated);
+  /// Null for an empty stack.
   ViewControllerRef topViewController() const { return stack_.empty() ? nullptr : stack_.back(); }
-  /// What the user sees: what is presented, else the top screen.
+  /// What the user sees: the last of what is presented over the stack, else the top.
   ViewControllerRef visibleViewController() const;
 
+  std::shared_ptr<NavigationControllerDelegate> delegate() const { return delegate_.lock(); }
   void setDelegate(std::weak_ptr<NavigationControllerDelegate> delegate) { delegate_ = std::move(delegate); }
-  bool isToolbarHidden() const { return toolbarHidden_; }
-  void setToolbarHidden(bool hidden);
 
-  /// Null detaches; without a host every transition ends at once.
-  void setNavigationHost(NavigationHost* host);
-  /// For the host: a gesture went back until `count` screens are left.
-  void userWentBack(std::size_t count);
+  bool toolbarHidden() const { return toolbarHidden_; }
+  void setToolbarHidden(bool hidden, bool animated = false);
+  double navigationBarHeight() const { return navigationBarHeight_; }
+  double toolbarHeight() const { return toolbarHeight_; }
+  /// For the host: the real heights of the bars, in points.
+  void setBarHeights(double navigationBar, double toolbar);
+
+  /// For the host: it shows the stack from now on, or with null no more; not owned. It begins with viewControllers().
+  void setHost(NavigationHost* host);
+  NavigationHost* host() const { return host_; }
+  /// For the host: the user went back (swipe, key or button) until `count` screens were left, which the host shows already.
+  void userWentBackTo(std::size_t count);
+
+  void viewDidLoad() override;
+  void viewWillAppear(bool animated) override;
+  void viewDidAppear(bool animated) override;
+  void viewWillDisappear(bool animated) override;
+  void viewDidDisappear(bool animated) override;
+  void viewWillLayoutSubviews() override;
+  /// The top screen's state, under its restoration identifier or its place in the stack, is the host's to keep; the base of
+  /// the state here is empty.
+  void encodeRestorableStateWithCoder(RestorationCoder& coder) override { ViewController::encodeRestorableStateWithCoder(coder); }
+
+ protected:
+  std::vector<ViewControllerRef> visibleChildren() const override;
 
  private:
-  void show(ViewControllerList stack, bool animated, bool hostKnows);
-  std::shared_ptr<NavigationController> self();
+  struct Transition {
+    ViewControllerRef from;
+    ViewControllerRef to;
+    bool animated = false;
+  };
+  void changeStack(std::vector<ViewControllerRef> next, bool animated, bool hostShowsItAlready);
+  void finishTransition(const std::shared_ptr<Transition>& transition);
+  void attachTopView();
 
-  ViewControllerList stack_;
+  std::vector<ViewControllerRef> stack_;
+  std::shared_ptr<Transition> transition_;
   std::weak_ptr<NavigationControllerDelegate> delegate_;
   NavigationHost* host_ = nullptr;
   bool toolbarHidden_ = true;
+  double navigationBarHeight_ = 44;
+  double toolbarHeight_ = 44;
 };
 
 }  // namespace vaelo

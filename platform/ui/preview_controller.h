@@ -1,7 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include <optional>
+#include <memory>
+#include <vector>
 
 #include "platform/ui/view_controller.h"
 #include "platform/url.h"
@@ -10,7 +11,7 @@ namespace vaelo {
 
 class PreviewController;
 
-/// The documents that a quick preview shows. Main thread.
+/// What a preview shows.
 class PreviewControllerDataSource {
  public:
   virtual ~PreviewControllerDataSource() = default;
@@ -21,38 +22,42 @@ class PreviewControllerDataSource {
 class PreviewControllerDelegate {
  public:
   virtual ~PreviewControllerDelegate() = default;
-  virtual bool previewControllerCanEditItem(PreviewController& controller, const URL& item) = 0;
-  virtual bool previewControllerShouldSaveEditedItem(PreviewController& controller, const URL& item) = 0;
+  virtual bool previewControllerCanEditItem(PreviewController&, const URL&) { return false; }
+  virtual bool previewControllerShouldSaveEditedItem(PreviewController&, const URL&) { return false; }
 };
 
-/// What draws a preview; the host's side of a PreviewController. Main thread.
-class PreviewRenderer {
- public:
-  virtual ~PreviewRenderer() = default;
-  virtual void reloadData() = 0;
-  virtual void refreshCurrentPreviewItem() = 0;
-};
+enum class PreviewChange { AllItems, CurrentItem, BarButtonItems };
 
-/// The platform's quick preview: shows the content of a document. Main thread.
+/// Shows the content of documents. Data source and delegate are held weakly; without them it shows nothing and edits nothing.
+/// Main thread.
 class PreviewController : public ViewController {
  public:
   std::string className() const override { return "PreviewController"; }
-  void setDataSource(PreviewControllerDataSource* source) { dataSource_ = source; }
-  void setDelegate(PreviewControllerDelegate* delegate) { delegate_ = delegate; }
-  PreviewControllerDataSource* dataSource() const { return dataSource_; }
-  PreviewControllerDelegate* delegate() const { return delegate_; }
-  const BarButtonItems& additionalRightBarButtonItems() const { return additionalItems_; }
-  void setAdditionalRightBarButtonItems(BarButtonItems items) { set(additionalItems_, std::move(items)); }
-  /// For the host, while it shows the screen.
-  void setRenderer(PreviewRenderer* renderer) { renderer_ = renderer; }
+  std::shared_ptr<PreviewControllerDataSource> dataSource() const { return dataSource_.lock(); }
+  void setDataSource(std::weak_ptr<PreviewControllerDataSource> source) { dataSource_ = std::move(source); }
+  std::shared_ptr<PreviewControllerDelegate> delegate() const { return delegate_.lock(); }
+  void setDelegate(std::weak_ptr<PreviewControllerDelegate> delegate) { delegate_ = std::move(delegate); }
+  /// Asks the data source anew.
   void reloadData();
+  /// Reads the shown document anew.
   void refreshCurrentPreviewItem();
+  /// Buttons beside the host's own, from the trailing edge inwards.
+  const std::vector<BarButtonItemRef>& additionalRightBarButtonItems() const { return additionalItems_; }
+  void setAdditionalRightBarButtonItems(std::vector<BarButtonItemRef> items);
+
+  // For the host.
+  std::size_t itemCount();
+  /// Index below itemCount().
+  URL itemAtIndex(std::size_t index);
+  bool canEditItem(const URL& item);
+  bool shouldSaveEditedItem(const URL& item);
+  Signal<PreviewController&, PreviewChange>& previewChanged() { return previewChanged_; }
 
  private:
-  PreviewControllerDataSource* dataSource_ = nullptr;
-  PreviewControllerDelegate* delegate_ = nullptr;
-  PreviewRenderer* renderer_ = nullptr;
-  BarButtonItems additionalItems_;
+  std::weak_ptr<PreviewControllerDataSource> dataSource_;
+  std::weak_ptr<PreviewControllerDelegate> delegate_;
+  std::vector<BarButtonItemRef> additionalItems_;
+  Signal<PreviewController&, PreviewChange> previewChanged_;
 };
 
 }  // namespace vaelo

@@ -6,33 +6,51 @@
 #include <optional>
 #include <vector>
 
+#include "platform/ui/device.h"
 #include "platform/ui/document_interaction_controller.h"
 #include "platform/ui/document_list_controller.h"
+#include "platform/ui/document_target_selection_controller.h"
+#include "platform/ui/graphics.h"
+#include "platform/ui/upgrade_button.h"
+#include "platform/ui/upgrade_flow_manager.h"
 #include "platform/ui/window.h"
 
 namespace vaelo {
 
-/// Makes the platform's own screens. Main thread.
+/// Makes the screens that the host provides, and tells of the display. Main thread.
 class ScreenFactory {
  public:
   virtual ~ScreenFactory() = default;
-  /// A window with the main screen's bounds; not shown yet.
-  virtual std::shared_ptr<Window> makeWindow() = 0;
-  virtual InterfaceIdiom idiom() = 0;
-  /// A list of the root of the drive (all containers); null when none can be made.
+
+  virtual Graphics& graphics() = 0;
+  virtual Device& device() = 0;
+  virtual WindowRef makeWindow(const Rect& bounds) = 0;
+
+  /// The list of the drive's root, with all containers; null when it can't be made.
   virtual DocumentListControllerRef makeRootList() = 0;
+  /// A list of one folder; null when it can't be made.
   virtual DocumentListControllerRef makeList(const URL& folder) = 0;
-  /// The lists from the drive's root down to `folder`, one a level; nothing when the folder is not in the drive.
-  virtual std::optional<std::vector<DocumentListControllerRef>> makeListHierarchyDownTo(const URL& folder) = 0;
-  /// The list that is shown as the peek of a folder; it has no search.
-  virtual DocumentListControllerRef makePeekFolderViewController(const URL& folder) = 0;
-  /// The screen for a drive without an account; null when the platform has none.
-  virtual ViewControllerRef makeDriveUnavailableController() = 0;
-  virtual std::shared_ptr<DocumentInteractionController> makeDocumentInteractionController(const URL& url) = 0;
-  /// Whether the quick preview can show the item.
+  /// One list for each folder from the drive's root down to `folder`; nothing when `folder` is not in the drive.
+  virtual std::optional<std::vector<DocumentListControllerRef>> hierarchyTo(const URL& folder) = 0;
+  /// The screen that says that no account is signed in; null when the host has none.
+  virtual ViewControllerRef makeDriveUnavailable() = 0;
+  /// Whether the quick preview can show the item; judged without reading its content.
   virtual bool canPreviewItem(const URL& url) = 0;
-  /// Says what the user must know before another application opens the document, then runs `action` once when it may.
-  virtual void presentPreOpenAlertIfNeeded(const URL& url, const ViewControllerRef& over, std::function<void()> action) = 0;
+  /// The folder picker. `crossContainer`: folders of other libraries may be picked as well.
+  virtual std::shared_ptr<DocumentTargetSelectionController> makeTargetSelection(const std::vector<URL>& itemsToMove,
+                                                                                 bool crossContainer) = 0;
+  virtual std::shared_ptr<DocumentInteractionController> makeDocumentInteraction(const URL& url) = 0;
+
+  /// `offer` may be null.
+  virtual std::shared_ptr<UpgradeButton> makeUpgradeButton(StorageOfferRef offer) = 0;
+  /// True when a button is to be shown for the offer.
+  virtual bool shouldShowUpgradeButton(const StorageOfferRef& offer) = 0;
+  /// `offer` may be null.
+  virtual std::shared_ptr<UpgradeFlowManager> makeUpgradeFlow(StorageOfferRef offer) = 0;
+
+  /// Asks or tells the user what must be settled before the document is opened elsewhere, then runs `open` once, or never.
+  /// With nothing to settle `open` has run when this returns.
+  virtual void runPreOpenAlert(const URL& url, const ViewControllerRef& presenter, std::function<void()> open) = 0;
 };
 
 }  // namespace vaelo

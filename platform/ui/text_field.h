@@ -1,86 +1,98 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include <functional>
+#include <memory>
+#include <string>
 
-#include "platform/ui/font.h"
-#include "platform/ui/view.h"
+#include "platform/ui/control.h"
+#include "platform/ui/label.h"
+#include "platform/ui/text_field_delegate.h"
 
 namespace vaelo {
 
-class TextField;
+enum class ClearButtonMode { Never, WhileEditing, Always };
+enum class ReturnKeyType { Default, Done, Search };
+enum class AutocapitalizationType { None, Words, Sentences };
+enum class AutocorrectionType { Default, No, Yes };
 
-/// Asked and told about editing, in this order: should begin, did begin, should change (each edit), should return, should
-/// end, did end.
-class TextFieldDelegate {
+/// One line of text that the user edits. Main thread.
+///
+/// The host reports with userReplace, pressReturn, becomeFirstResponder and resignFirstResponder; when one of them answers
+/// false the widget must go back to what the model says.
+class TextField : public Control {
  public:
-  virtual ~TextFieldDelegate() = default;
-  virtual bool textFieldShouldBeginEditing(TextField&) { return true; }
-  virtual void textFieldDidBeginEditing(TextField&) {}
-  /// `start` and `length` count characters of the text that `replacement` would replace.
-  virtual bool textFieldShouldChangeCharactersInRangeReplacementString(TextField&, std::size_t, std::size_t,
-                                                                       const std::string&) {
-    return true;
-  }
-  virtual bool textFieldShouldReturn(TextField&) { return true; }
-  virtual bool textFieldShouldEndEditing(TextField&) { return true; }
-  virtual void textFieldDidEndEditing(TextField&) {}
-};
-
-/// One line of text that the user edits.
-class TextField : public View {
- public:
-  enum class Capitalization { None, Words, Sentences };
-  struct Selection {
-    std::size_t start = 0;  ///< in characters from the start
-    std::size_t length = 0;
-    friend bool operator==(const Selection&, const Selection&) = default;
-  };
+  explicit TextField(const Rect& frame = {}) : Control(frame) {}
 
   const std::string& text() const { return text_; }
-  void setText(std::string text) { set(text_, std::move(text)); }
+  /// Sets the text from code: no delegate is asked, no action is sent. The caret goes to the end.
+  void setText(std::string text);
   const std::string& placeholder() const { return placeholder_; }
-  void setPlaceholder(std::string text) { set(placeholder_, std::move(text)); }
+  void setPlaceholder(std::string placeholder);
   const Font& font() const { return font_; }
-  void setFont(Font font) { set(font_, font); }
-  const std::optional<Selection>& selection() const { return selection_; }
-  void setSelection(Selection selection) { set(selection_, std::optional(selection)); }
-  Capitalization capitalization() const { return capitalization_; }
-  void setCapitalization(Capitalization capitalization) { set(capitalization_, capitalization); }
-  bool autocorrects() const { return autocorrects_; }
-  void setAutocorrects(bool autocorrects) { set(autocorrects_, autocorrects); }
-  bool showsClearButtonWhileEditing() const { return clearButton_; }
-  void setShowsClearButtonWhileEditing(bool shows) { set(clearButton_, shows); }
-  /// The keyboard's return key.
-  bool isReturnKeyEnabled() const { return returnKeyEnabled_; }
-  void setReturnKeyEnabled(bool enabled) { set(returnKeyEnabled_, enabled); }
+  void setFont(const Font& font);
+  const Color& textColor() const { return textColor_; }
+  void setTextColor(const Color& color);
+  TextAlignment textAlignment() const { return alignment_; }
+  void setTextAlignment(TextAlignment alignment);
+  /// An empty selection is the caret.
+  const TextRange& selectedRange() const { return selectedRange_; }
+  /// Ranges beyond the text are cut to it.
+  void setSelectedRange(const TextRange& range);
+
+  ClearButtonMode clearButtonMode() const { return clearButtonMode_; }
+  void setClearButtonMode(ClearButtonMode mode);
+  ReturnKeyType returnKeyType() const { return returnKeyType_; }
+  void setReturnKeyType(ReturnKeyType type);
+  /// The return key works only when there is text.
+  bool enablesReturnKeyAutomatically() const { return enablesReturnKeyAutomatically_; }
+  void setEnablesReturnKeyAutomatically(bool enables);
+  /// The state that code gives the return key of the keyboard while the field is edited.
+  bool returnKeyEnabled() const { return returnKeyEnabled_; }
+  void setReturnKeyEnabled(bool enabled);
+  AutocapitalizationType autocapitalizationType() const { return autocapitalization_; }
+  void setAutocapitalizationType(AutocapitalizationType type);
+  AutocorrectionType autocorrectionType() const { return autocorrection_; }
+  void setAutocorrectionType(AutocorrectionType type);
+
+  std::shared_ptr<TextFieldDelegate> delegate() const { return delegate_.lock(); }
   void setDelegate(std::weak_ptr<TextFieldDelegate> delegate) { delegate_ = std::move(delegate); }
-  /// Called after the user changed the text.
-  void setOnEditingChanged(std::function<void(TextField&)> changed) { editingChanged_ = std::move(changed); }
 
   bool isEditing() const { return editing_; }
-  /// Asks the delegate; true when editing began (or goes on).
+  bool isFirstResponder() const { return editing_; }
+  /// Begins editing when enabled and the delegate allows; true when the field is being edited afterwards.
   bool becomeFirstResponder();
-  /// Asks the delegate; true when editing ended.
+  /// Ends editing when the delegate allows; true when the field is not being edited afterwards.
   bool resignFirstResponder();
+  /// As resignFirstResponder; with `force` the delegate is asked but can't refuse.
+  bool endEditing(bool force) override;
 
-  /// For the host: the user replaced the characters of `range`; false when the delegate refused.
-  bool userReplaced(Selection range, const std::string& replacement, std::string newText);
-  /// For the host: the user pressed return.
-  bool userPressedReturn();
+  /// For the host: the user replaces characters. Asks the delegate, changes the text, puts the caret behind the
+  /// replacement and sends EditingChanged. False when refused.
+  bool userReplace(const TextRange& range, const std::string& replacement);
+  /// For the host: the user made the whole text this, by typing, pasting or the clear button.
+  bool userSetText(const std::string& text);
+  /// For the host: the return key. False when the key is disabled or the delegate answers false.
+  bool pressReturn();
+
+  Size intrinsicContentSize() const override;
 
  private:
+  bool finishEditing(bool force);
   std::string text_;
   std::string placeholder_;
-  Font font_;
-  std::optional<Selection> selection_;
-  Capitalization capitalization_ = Capitalization::Sentences;
-  bool autocorrects_ = true;
-  bool clearButton_ = false;
+  Font font_ = Font::preferred(TextStyle::Body);
+  Color textColor_ = Color::black();
+  TextAlignment alignment_ = TextAlignment::Natural;
+  TextRange selectedRange_;
+  ClearButtonMode clearButtonMode_ = ClearButtonMode::Never;
+  ReturnKeyType returnKeyType_ = ReturnKeyType::Default;
+  AutocapitalizationType autocapitalization_ = AutocapitalizationType::Sentences;
+  AutocorrectionType autocorrection_ = AutocorrectionType::Default;
+  bool enablesReturnKeyAutomatically_ = false;
   bool returnKeyEnabled_ = true;
   bool editing_ = false;
+  bool ending_ = false;
   std::weak_ptr<TextFieldDelegate> delegate_;
-  std::function<void(TextField&)> editingChanged_;
 };
 
 }  // namespace vaelo

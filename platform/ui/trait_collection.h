@@ -3,16 +3,17 @@
 
 namespace vaelo {
 
-enum class SizeClass { Unspecified, Compact, Regular };
+enum class SizeClass { Compact, Regular };
+enum class LayoutDirection { LeftToRight, RightToLeft };
 enum class InterfaceIdiom { Phone, Slate, Desktop };
 
-/// The room and the kind of device that a screen finds itself in.
+/// What a screen knows of the room that it is shown in.
 struct TraitCollection {
-  SizeClass horizontalSizeClass = SizeClass::Unspecified;
-  SizeClass verticalSizeClass = SizeClass::Unspecified;
+  SizeClass horizontalSizeClass = SizeClass::Compact;
+  SizeClass verticalSizeClass = SizeClass::Regular;
+  LayoutDirection layoutDirection = LayoutDirection::LeftToRight;
   InterfaceIdiom idiom = InterfaceIdiom::Phone;
   double displayScale = 1;
-  bool rightToLeft = false;
   friend bool operator==(const TraitCollection&, const TraitCollection&) = default;
 };
 
