@@ -21,8 +21,8 @@ std::string wordsOf(const std::optional<Error>& error) {
 
 void UIUtils::showAlertMessageParentViewController(const std::string& title, const std::string& message,
                                                    const ViewControllerRef& parent) {
-  auto alert = std::make_shared<AlertController>(title, message, AlertController::Style::Alert);
-  alert->addAction(std::make_shared<AlertAction>(localized("OK"), AlertAction::Style::Default));
+  auto alert = AlertController::make(AlertStyle::Alert, title, message);
+  alert->addAction(AlertAction::make(localized("OK"), AlertActionStyle::Default));
   if (parent) parent->presentViewController(alert, true);
 }
 
@@ -97,6 +97,6 @@ std::string UIUtils::bestMessage(const std::optional<Error>& error) {
   return wordsOf(error);
 }
 
-bool UIUtils::slateMode() { return Platform::current().screens.idiom() == InterfaceIdiom::Slate; }
+bool UIUtils::slateMode() { return Platform::current().screens.device().userInterfaceIdiom() == InterfaceIdiom::Slate; }
 
 }  // namespace vaelo

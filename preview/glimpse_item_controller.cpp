@@ -8,19 +8,26 @@
 
 namespace vaelo {
 
-const std::shared_ptr<GlimpseItemController>& GlimpseItemController::defaultController() {
-  static const auto shared = std::make_shared<GlimpseItemController>();
-  return shared;
+namespace {
+
+/// The screen is its own data source and delegate, which it can only say once somebody owns it.
+std::shared_ptr<GlimpseItemController> makeController() {
+  auto controller = std::make_shared<GlimpseItemController>();
+  controller->setDelegate(controller);
+  controller->setDataSource(controller);
+  return controller;
 }
 
-GlimpseItemController::GlimpseItemController() {
-  setDelegate(this);
-  setDataSource(this);
+}  // namespace
+
+const std::shared_ptr<GlimpseItemController>& GlimpseItemController::defaultController() {
+  static const std::shared_ptr<GlimpseItemController> shared = makeController();
+  return shared;
 }
 
 std::shared_ptr<GlimpseItemController> GlimpseItemController::initWithItemManager(
     const std::shared_ptr<PreviewItemManager>& manager) {
-  auto controller = std::make_shared<GlimpseItemController>();
+  std::shared_ptr<GlimpseItemController> controller = makeController();
   controller->takeDocumentsOf(manager);
   return controller;
 }

@@ -33,7 +33,7 @@ class GlimpseItemController : public PreviewController, public PreviewController
   bool previewControllerCanEditItem(PreviewController& controller, const URL& item) override;
   bool previewControllerShouldSaveEditedItem(PreviewController& controller, const URL& item) override;
 
-  GlimpseItemController();
+  GlimpseItemController() = default;
 
  private:
   static bool glPreviewItemIsPDFKind(const URL& item);

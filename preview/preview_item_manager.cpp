@@ -4,6 +4,7 @@
 #include "items/vlo_log.h"
 #include "platform/platform.h"
 #include "platform/ui/screen_factory.h"
+#include "platform/ui/search_controller.h"
 #include "preview/glimpse_item_controller.h"
 
 namespace vaelo {
@@ -102,13 +103,13 @@ bool PreviewItemManager::isPreviewControllerDisplayed(const ViewControllerRef& s
 void PreviewItemManager::replaceLastViewController(const ViewControllerRef& screen) {
   const std::shared_ptr<NavigationController> navigation = navigationController_.lock();
   if (!navigation) return;
-  ViewControllerList stack = navigation->viewControllers();
+  std::vector<ViewControllerRef> stack = navigation->viewControllers();
   if (!stack.empty() && isPreviewControllerDisplayed(stack.back())) {
     stack.back() = screen;
     navigation->setViewControllers(stack, false);
   } else if (std::dynamic_pointer_cast<SearchController>(navigation->presentedViewController())) {
     const std::weak_ptr<NavigationController> weakNavigation = navigation;
-    navigation->dismissViewController(true, [weakNavigation, screen] {
+    navigation->dismissViewControllerAnimated(true, [weakNavigation, screen] {
       if (const auto alive = weakNavigation.lock()) alive->pushViewController(screen, true);
     });
   } else {
@@ -206,7 +207,7 @@ void PreviewItemManager::accommodatePresentedItemDeletionWithCompletionHandler(C
   completion(std::nullopt);
   unregisterAsFilePresenter();
   Platform::current().queues.main().async([self = shared_from_this()] {
-    if (const auto navigation = self->navigationController_.lock()) navigation->popViewController(true);
+    if (const auto navigation = self->navigationController_.lock()) navigation->popViewControllerAnimated(true);
   });
 }
 
@@ -228,7 +229,7 @@ void PreviewItemManager::accommodatePresentedSubitemDeletionAtURL(const URL& url
 bool PreviewItemManager::warpToNewURL(const URL& url) {
   const std::optional<std::vector<DocumentListControllerRef>> lists = dlcStackForURL(url);
   if (!lists) return false;
-  ViewControllerList stack(lists->begin(), lists->end());
+  std::vector<ViewControllerRef> stack(lists->begin(), lists->end());
   VLO_DEBUG("New VC stack of DLCs: %@", stack);
   unregisterAsFilePresenter();
   const std::shared_ptr<DRItem> item = DRItem::initWithURL(url);
@@ -237,7 +238,7 @@ bool PreviewItemManager::warpToNewURL(const URL& url) {
     if (const ViewControllerRef screen = prepareToPreviewItem(item)) stack.push_back(screen);
   }
   if (const auto navigation = navigationController_.lock()) {
-    if (navigation->presentedViewController()) navigation->dismissViewController(false);
+    navigation->dismissViewControllerAnimated(false);
     navigation->setViewControllers(stack, true);
   }
   setItemUpdatePreview(item, false);
@@ -252,7 +253,7 @@ std::optional<std::vector<DocumentListControllerRef>> PreviewItemManager::dlcSta
     item = DRItem::initWithURL(folder);
   }
   if (item && item->isDirectory()) {
-    auto lists = Platform::current().screens.makeListHierarchyDownTo(folder);
+    auto lists = Platform::current().screens.hierarchyTo(folder);
     if (!lists) VLO_ERROR(": Couldn't build DLC stack for %@.", folder);
     return lists;
   }

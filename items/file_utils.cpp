@@ -1,0 +1,148 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "items/file_utils.h"
+
+#include "items/vlo_log.h"
+#include "platform/platform.h"
+
+namespace vaelo {
+
+namespace {
+
+bool existsAs(const URL& url, bool directory) {
+  bool isDirectory = false;
+  return Platform::current().fileManager.fileExistsAtPath(url.path(), &isDirectory) && isDirectory == directory;
+}
+
+Error baseError(int code) { return Error{FileErrorDomain, code, {}, {}, {}}; }
+
+std::unique_ptr<FileCoordinator> freshCoordinator() { return Platform::current().fileCoordination.makeCoordinator(); }
+
+}  // namespace
+
+bool FileUtils::exists(const URL& url) { return Platform::current().fileManager.fileExistsAtPath(url.path()); }
+
+bool FileUtils::isFile(const URL& url) { return existsAs(url, false); }
+
+bool FileUtils::isDir(const URL& url) { return existsAs(url, true); }
+
+std::optional<Error> FileUtils::mkdir(const URL& url) {
+  VLO_DEBUG("Creating directory: '%@'", url);
+  std::optional<Error> failure;
+  std::optional<Error> error = freshCoordinator()->coordinateWriting(url, WritingDefault, [&](const URL& newURL) {
+    failure = Platform::current().fileManager.createDirectoryAtURL(newURL);
+    if (failure) {
+      VLO_ERROR("failed to create directory:'%@': %@", newURL, *failure);
+    } else {
+      VLO_INFO("Created directory: '%@'", newURL);
+    }
+  });
+  if (!error) error = failure;
+  VLO_DEBUG("Coordinated Write returned %@", error);
+  return error;
+}
+
+std::optional<Error> FileUtils::remove(const URL& url) {
+  VLO_DEBUG("Removing item: '%@'", url);
+  const Value before = getResourceValueForURL(ResourceKey::ContentModificationDate, url);
+  std::optional<Error> failure;
+  std::optional<Error> error = freshCoordinator()->coordinateWriting(url, WritingForDeleting, [&](const URL& newURL) {
+    const Value now = getResourceValueForURL(ResourceKey::ContentModificationDate, newURL);
+    if (!before.isPresent() || !now.isPresent() || !(before == now)) {
+      VLO_INFO("Date changed during delete (user chose Keep?) -- preserving document: '%@'", newURL);
+      failure = baseError(FileErrorCode::UserCancelled);
+      return;
+    }
+    failure = Platform::current().fileManager.removeItemAtURL(newURL);
+    if (failure) {
+      VLO_ERROR("failed to delete item:'%@': %@", newURL, *failure);
+    } else {
+      VLO_INFO("Deleted item: '%@'", newURL);
+    }
+  });
+  if (!error) error = failure;
+  VLO_INFO("Coordinated Write returned %@", error);
+  return error;
+}
+
+std::optional<Error> FileUtils::moveTo(const URL& source, const URL& destination) {
+  VLO_DEBUG("Moving src1:  '%@'", source);
+  VLO_DEBUG("Moving dest1: '%@'", destination);
+  if (source.path() == destination.path()) {
+    VLO_DEBUG("Move: src and dest are the same");
+    return std::nullopt;
+  }
+  if (!exists(source)) VLO_INFO("Move: source filename does not exist, must be a fault.");
+  if (isFile(source) && isDir(destination)) {
+    VLO_ERROR("Move: must move a file to a file (dest is a dir)");
+    return baseError(FileErrorCode::FeatureUnsupported);
+  }
+  if (isDir(source) && isFile(destination)) {
+    VLO_ERROR("Move: must move a dir to a dir (dest is a file)");
+    return baseError(FileErrorCode::FeatureUnsupported);
+  }
+  const std::unique_ptr<FileCoordinator> coordinator = freshCoordinator();
+  std::optional<Error> failure;
+  std::optional<Error> error = coordinator->coordinateWriting(
+      source, WritingForMoving, destination, WritingForReplacing, [&](const URL& newSource, const URL& newDestination) {
+        coordinator->itemWillMove(newSource, newDestination);
+        VLO_DEBUG("Moving src2:  '%@'", newSource);
+        VLO_DEBUG("Moving dest2: '%@'", newDestination);
+        failure = Platform::current().fileManager.moveItemAtURL(newSource, newDestination);
+        if (failure) {
+          VLO_WARNING("KX Move failed: %@", *failure);
+        } else {
+          VLO_INFO("Move successful");
+          coordinator->itemDidMove(newSource, newDestination);
+        }
+      });
+  if (!error) error = failure;
+  if (error) VLO_WARNING("Move failed: %@", *error);
+  return error;
+}
+
+std::optional<URL> FileUtils::docDir() {
+  FileManager& files = Platform::current().fileManager;
+  const std::vector<std::string> found = files.userDocumentsDirectories();
+  if (found.empty()) return std::nullopt;
+  return URL(files.expandingTilde(found.front()), true);
+}
+
+bool FileUtils::evictDocument(const URL& url) {
+  const std::optional<Error> error = Platform::current().cloudDocuments.evict(url);
+  if (error) VLO_WARNING("Evict error: %@", *error);
+  return !error;
+}
+
+Value FileUtils::getResourceValueForURL(ResourceKey key, const std::optional<URL>& url) {
+  if (!url) return {};
+  ResourceValues& resources = Platform::current().resourceValues;
+  for (const bool promised : {true, false}) {
+    const Result<ResourceMap> values =
+        promised ? resources.promisedItemResourceValues(*url, {key}) : resources.resourceValues(*url, {key});
+    if (!values.value) continue;
+    const auto found = values.value->find(key);
+    if (found != values.value->end() && found->second.isPresent()) return found->second;
+  }
+  return {};
+}
+
+void FileUtils::dumpURLResourceValues(const URL&) {}
+
+void FileUtils::logFileAttributes(const std::string& path) {
+  const Result<FileAttributes> attributes = Platform::current().fileManager.attributesOfItemAtPath(path);
+  if (!attributes.value) {
+    VLO_ERROR("Cannot get attributes of %@: %@", path,
+              attributes.error ? attributes.error->description() : std::string("(null)"));
+    return;
+  }
+  const Date now = Platform::current().queues.now();
+  const auto age = [&](const std::optional<Date>& date) {
+    return date ? std::chrono::duration<double>(now - *date).count() : 0.0;
+  };
+  VLO_DEBUG("Date Created: %@ (%lf seconds ago)", attributes.value->creationDate, age(attributes.value->creationDate));
+  VLO_DEBUG("Date Modified: %@ (%lf seconds ago)", attributes.value->modificationDate,
+            age(attributes.value->modificationDate));
+  VLO_DEBUG("Size: %@ bytes", attributes.value->size);
+}
+
+}  // namespace vaelo
