@@ -1,0 +1,28 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/drive/bookmark_file.h"
+
+#include "host/drive/small_file.h"
+
+namespace vaelo {
+
+namespace {
+constexpr std::string_view suffix = ".vaelobookmark";
+constexpr const char* group = "Bookmark";
+}  // namespace
+
+bool isBookmarkName(std::string_view name) { return name.size() > suffix.size() && name.ends_with(suffix); }
+
+Result<URL> readBookmarkFile(const std::string& path) {
+  const Result<KeyFile> file = readKeyFile(path);
+  if (!file) return *file.error;
+  if (const std::optional<URL> url = keyFileURL(file.value->get(), group, "URL")) return *url;
+  return fileError(FileErrorCode::ReadUnknown, path, "the bookmark does not name a file");
+}
+
+std::optional<Error> writeBookmarkFile(const std::string& path, const URL& target) {
+  const KeyFile file(g_key_file_new());
+  g_key_file_set_string(file.get(), group, "URL", target.absoluteString().c_str());
+  return writeSmallFile(path, keyFileText(file.get()));
+}
+
+}  // namespace vaelo

@@ -1,0 +1,63 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <mutex>
+#include <string>
+
+#include "host/drive/drive_layout.h"
+#include "platform/logging.h"
+#include "platform/result.h"
+
+
+namespace vaelo {
+
+/// A document that the index knows, where it stands now.
+struct IndexedDocument {
+  std::int64_t id = 0;
+  std::string path;  ///< physical: a promise's own path while the item is not downloaded
+  std::uint64_t device = 0;
+  std::uint64_t inode = 0;
+};
+
+/// Document identifiers, which stay with a document when it is renamed or moved, by this program or another.
+///
+/// The item itself carries its identifier (extended attribute, or in its promise); the database remembers where it was seen
+/// last, and alone holds the identifiers of items that can carry none (links, file systems without attributes), told apart by
+/// device, inode and time of birth. So a lost or damaged database costs a walk of the mirror, not the identifiers.
+///
+/// Blocking; safe from any thread. The database is opened by the first call. Errors are those of FileManager: 640 for a full
+/// disk, 642 read-only, 513 no permission, 512 anything else the database says.
+class DocumentIndex {
+ public:
+  DocumentIndex(const DriveLayout& layout, LogSink& log);
+  ~DocumentIndex();
+  DocumentIndex(const DocumentIndex&) = delete;
+  DocumentIndex& operator=(const DocumentIndex&) = delete;
+
+  /// Opens the database, makes it when there is none, and moves a damaged one aside and rebuilds it.
+  std::optional<Error> open();
+  /// The identifier of the item at `path` (logical or physical, final link not followed), above 0; one is made when it has none
+  /// and `create` is true, else 0. A copy that another program made with its attributes gets an identifier of its own while
+  /// the original exists. Error 4 when nothing is there.
+  Result<std::int64_t> documentIDFor(const std::string& path, bool create);
+  /// Where the document is now: where it was seen last, else the mirror is walked for it. Error 4 when it is nowhere.
+  Result<IndexedDocument> resolve(std::int64_t id);
+  /// The document with that inode, as last seen; error 4 when it is not known.
+  Result<IndexedDocument> documentWithInode(std::uint64_t device, std::uint64_t inode);
+  /// True once a damaged database was moved aside and rebuilt since the program started.
+  bool wasRebuilt() const;
+
+ private:
+  struct Row;
+  struct Database;
+
+  const DriveLayout& layout_;
+  LogSink& log_;
+  mutable std::mutex mutex_;
+  std::unique_ptr<Database> database_;  // guarded by mutex_
+  bool wasRebuilt_ = false;             // guarded by mutex_
+};
+
+}  // namespace vaelo
