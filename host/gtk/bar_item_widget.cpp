@@ -1,0 +1,103 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/gtk/bar_item_widget.h"
+
+#include <memory>
+
+#include "platform/ui/label.h"
+
+namespace vaelo {
+
+namespace {
+
+struct SystemLook {
+  const char* icon;
+  const char* label;
+};
+
+SystemLook lookOf(SystemItem item) {
+  switch (item) {
+    case SystemItem::Cancel: return {nullptr, "Cancel"};
+    case SystemItem::Done: return {nullptr, "Done"};
+    case SystemItem::Trash: return {"user-trash-symbolic", "Delete"};
+    case SystemItem::Action: return {"emblem-shared-symbolic", "Share"};
+    case SystemItem::Organize: return {"folder-symbolic", "Move"};
+    case SystemItem::FlexibleSpace:
+    case SystemItem::FixedSpace: break;
+  }
+  return {nullptr, nullptr};
+}
+
+/// Keeps a model's signal connected for as long as a widget lives.
+void keepWithWidget(GtkWidget* widget, std::shared_ptr<void> token) {
+  g_object_set_data_full(G_OBJECT(widget), "vaelo-token", new std::shared_ptr<void>(std::move(token)),
+                         [](gpointer held) { delete static_cast<std::shared_ptr<void>*>(held); });
+}
+
+/// Mirrors the text of one label.
+class LabelMirror : public ViewObserver {
+ public:
+  LabelMirror(std::shared_ptr<Label> label, GtkLabel* widget) : label_(std::move(label)), widget_(widget) {
+    label_->setObserver(this);
+    show();
+  }
+  ~LabelMirror() override {
+    if (label_->observer() == this) label_->setObserver(nullptr);
+  }
+  void viewChanged(View&, ViewChange change) override {
+    if (change == ViewChange::Content) show();
+  }
+  void animationWillBegin(View&, const Animation&) override {}
+  void animationDidEnd(View&) override {}
+  void viewWillBeDestroyed(View&) override {}
+
+ private:
+  void show() { gtk_label_set_text(widget_, label_->text().c_str()); }
+  std::shared_ptr<Label> label_;
+  GtkLabel* widget_;
+};
+
+GtkWidget* makeLabel(const std::shared_ptr<Label>& label) {
+  GtkWidget* widget = gtk_label_new(nullptr);
+  gtk_label_set_ellipsize(GTK_LABEL(widget), PANGO_ELLIPSIZE_END);
+  gtk_widget_add_css_class(widget, "caption");
+  keepWithWidget(widget, std::make_shared<LabelMirror>(label, GTK_LABEL(widget)));
+  return widget;
+}
+
+}  // namespace
+
+GtkWidget* makeBarItemWidget(const BarButtonItemRef& item) {
+  const std::optional<SystemItem>& system = item->systemItem();
+  if (system == SystemItem::FlexibleSpace || system == SystemItem::FixedSpace) {
+    GtkWidget* space = gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 0);
+    gtk_widget_set_hexpand(space, system == SystemItem::FlexibleSpace);
+    if (system == SystemItem::FixedSpace) gtk_widget_set_size_request(space, 12, -1);
+    return space;
+  }
+  if (const auto label = std::dynamic_pointer_cast<Label>(item->customView())) return makeLabel(label);
+
+  GtkWidget* button = gtk_button_new();
+  const SystemLook look = system ? lookOf(*system) : SystemLook{nullptr, nullptr};
+  if (look.icon) {
+    gtk_button_set_icon_name(GTK_BUTTON(button), look.icon);
+    gtk_widget_set_tooltip_text(button, look.label);
+    gtk_accessible_update_property(GTK_ACCESSIBLE(button), GTK_ACCESSIBLE_PROPERTY_LABEL, look.label, -1);
+  }
+  const auto show = [button, look, weak = std::weak_ptr(item)] {
+    const BarButtonItemRef shown = weak.lock();
+    if (!shown) return;
+    gtk_widget_set_sensitive(button, shown->enabled());
+    if (!look.icon) gtk_button_set_label(GTK_BUTTON(button), look.label ? look.label : shown->title().c_str());
+  };
+  show();
+  keepWithWidget(button, item->changed().connect([show](BarButtonItem&) { show(); }));
+  g_signal_connect_data(
+      button, "clicked", G_CALLBACK(+[](GtkButton*, gpointer held) {
+        if (const BarButtonItemRef pressed = static_cast<std::weak_ptr<BarButtonItem>*>(held)->lock()) pressed->press();
+      }),
+      new std::weak_ptr<BarButtonItem>(item),
+      [](gpointer held, GClosure*) { delete static_cast<std::weak_ptr<BarButtonItem>*>(held); }, GConnectFlags(0));
+  return button;
+}
+
+}  // namespace vaelo

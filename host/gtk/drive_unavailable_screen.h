@@ -1,0 +1,21 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include "host/gtk/host_screen.h"
+#include "platform/ui/view_controller.h"
+
+namespace vaelo {
+
+/// Says that no account is signed in. Main thread.
+class DriveUnavailableController : public ViewController, public HostScreen {
+ public:
+  DriveUnavailableController();
+  ~DriveUnavailableController() override;
+  std::string className() const override { return "DriveUnavailableController"; }
+  GtkWidget* contentWidget() override { return page_; }
+
+ private:
+  GtkWidget* page_;
+};
+
+}  // namespace vaelo

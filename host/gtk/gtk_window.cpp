@@ -1,0 +1,174 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/gtk/gtk_window.h"
+
+#include <algorithm>
+
+#include "host/gtk/alert_dialog.h"
+#include "host/gtk/host_screen.h"
+
+namespace vaelo {
+
+GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds)
+    : Window(bounds),
+      window_(ADW_APPLICATION_WINDOW(adw_application_window_new(application))),
+      toasts_(adw_toast_overlay_new()),
+      menu_(g_menu_new()) {
+  gtk_window_set_title(widget(), "Vaelo Drive");
+  gtk_window_set_icon_name(widget(), "com.marrow.VaeloDrive");
+  gtk_window_set_default_size(widget(), static_cast<int>(bounds.width), static_cast<int>(bounds.height));
+  gtk_widget_set_size_request(GTK_WIDGET(window_), 360, 294);
+  adw_toast_overlay_set_child(ADW_TOAST_OVERLAY(toasts_), stack_.widget());
+  adw_application_window_set_content(window_, toasts_);
+  g_menu_append(menu_, "_Refresh", "win.refresh");
+  g_menu_append(menu_, "_About Vaelo Drive", "app.about");
+  addActions();
+  stack_.onSwipedBack([this](std::size_t left) {
+    if (const auto controller = navigation()) controller->userWentBackTo(left);
+  });
+  for (const char* property : {"notify::default-width", "notify::default-height"}) {
+    g_signal_connect_swapped(window_, property, G_CALLBACK(+[](GtkWindowHost* self) { self->sizeChanged(); }), this);
+  }
+  setTraitCollection(traitsFor(static_cast<int>(bounds.width), static_cast<int>(bounds.height)));
+  setPresentationHost(this);
+}
+
+GtkWindowHost::~GtkWindowHost() {
+  setPresentationHost(nullptr);
+  if (const auto controller = navigation()) controller->setHost(nullptr);
+  g_signal_handlers_disconnect_by_data(window_, this);
+  stack_.setPages({}, false, nullptr);
+  pages_.clear();
+  g_object_unref(menu_);
+  gtk_window_destroy(widget());
+}
+
+void GtkWindowHost::addActions() {
+  static const GActionEntry entries[] = {
+      {"refresh", [](GSimpleAction*, GVariant*, gpointer self) {
+         ScreenPage* page = static_cast<GtkWindowHost*>(self)->topPage();
+         if (page && page->hostScreen()) page->hostScreen()->refresh();
+       }, nullptr, nullptr, nullptr, {0, 0, 0}},
+      {"search", [](GSimpleAction*, GVariant*, gpointer self) {
+         ScreenPage* page = static_cast<GtkWindowHost*>(self)->topPage();
+         if (page && page->hostScreen()) page->hostScreen()->toggleSearch();
+       }, nullptr, nullptr, nullptr, {0, 0, 0}},
+      {"back", [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkWindowHost*>(self)->goBack(); }, nullptr,
+       nullptr, nullptr, {0, 0, 0}},
+      {"escape", [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkWindowHost*>(self)->escape(); }, nullptr,
+       nullptr, nullptr, {0, 0, 0}},
+  };
+  g_action_map_add_action_entries(G_ACTION_MAP(window_), entries, G_N_ELEMENTS(entries), this);
+  GtkEventController* shortcuts = gtk_shortcut_controller_new();
+  gtk_shortcut_controller_set_scope(GTK_SHORTCUT_CONTROLLER(shortcuts), GTK_SHORTCUT_SCOPE_GLOBAL);
+  constexpr const char* keys[][2] = {
+      {"F5|<Control>r", "win.refresh"}, {"<Control>f", "win.search"}, {"<Alt>Left|Back", "win.back"}, {"Escape", "win.escape"}};
+  for (const auto& [trigger, action] : keys) {
+    gtk_shortcut_controller_add_shortcut(
+        GTK_SHORTCUT_CONTROLLER(shortcuts),
+        gtk_shortcut_new(gtk_shortcut_trigger_parse_string(trigger), gtk_named_action_new(action)));
+  }
+  gtk_widget_add_controller(GTK_WIDGET(window_), shortcuts);
+
+  GtkGesture* backButton = gtk_gesture_click_new();
+  gtk_gesture_single_set_button(GTK_GESTURE_SINGLE(backButton), 8);
+  gtk_event_controller_set_propagation_phase(GTK_EVENT_CONTROLLER(backButton), GTK_PHASE_CAPTURE);
+  g_signal_connect_swapped(backButton, "pressed", G_CALLBACK(+[](GtkWindowHost* self) { self->goBack(); }), this);
+  gtk_widget_add_controller(GTK_WIDGET(window_), GTK_EVENT_CONTROLLER(backButton));
+}
+
+std::shared_ptr<NavigationController> GtkWindowHost::navigation() const {
+  return std::dynamic_pointer_cast<NavigationController>(rootViewController());
+}
+
+ScreenPage* GtkWindowHost::topPage() const {
+  const auto controller = navigation();
+  const ViewControllerRef top = controller ? controller->topViewController() : nullptr;
+  const auto found = pages_.find(top.get());
+  return found == pages_.end() ? nullptr : found->second.get();
+}
+
+void GtkWindowHost::makeKeyAndVisible() {
+  Window::makeKeyAndVisible();
+  if (const auto controller = navigation()) controller->setHost(this);
+  gtk_window_present(widget());
+}
+
+void GtkWindowHost::stackChanged(const Stack&, const Stack& newStack, bool animated, std::function<void()> done) {
+  const auto controller = navigation();
+  std::vector<GtkWidget*> widgets;
+  for (const ViewControllerRef& screen : newStack) {
+    std::unique_ptr<ScreenPage>& page = pages_[screen.get()];
+    if (!page) {
+      page = std::make_unique<ScreenPage>(screen, [this] { goBack(); }, G_MENU_MODEL(menu_));
+      page->setToolbarHidden(!controller || controller->toolbarHidden());
+    }
+    page->setCanGoBack(!widgets.empty());
+    widgets.push_back(page->widget());
+  }
+  stack_.setPages(widgets, animated, [this, newStack, done = std::move(done)] {
+    std::erase_if(pages_, [&](const auto& entry) {
+      return std::none_of(newStack.begin(), newStack.end(),
+                          [&](const ViewControllerRef& screen) { return screen.get() == entry.first; });
+    });
+    done();
+  });
+}
+
+void GtkWindowHost::toolbarHiddenChanged(bool hidden, bool) {
+  for (const auto& [screen, page] : pages_) page->setToolbarHidden(hidden);
+}
+
+void GtkWindowHost::present(const ViewControllerRef&, const ViewControllerRef& presented, bool, std::function<void()> done) {
+  if (const auto alert = std::dynamic_pointer_cast<AlertController>(presented)) {
+    dialogs_[presented.get()] = showAlertDialog(alert, widget(), std::move(done));
+  } else if (done) {
+    // A search shows itself within its list.
+    done();
+  }
+}
+
+void GtkWindowHost::dismiss(const ViewControllerRef& presented, bool, std::function<void()> done) {
+  const auto dialog = dialogs_.find(presented.get());
+  if (dialog != dialogs_.end()) {
+    gtk_window_destroy(dialog->second);
+    dialogs_.erase(dialog);
+  }
+  if (done) done();
+}
+
+void GtkWindowHost::goBack() {
+  if (const auto controller = navigation()) controller->popViewControllerAnimated(true);
+}
+
+void GtkWindowHost::escape() {
+  ScreenPage* page = topPage();
+  if (page && page->hostScreen() && page->hostScreen()->closeSearch()) return;
+  goBack();
+}
+
+void GtkWindowHost::showToast(const std::string& text) {
+  adw_toast_overlay_add_toast(ADW_TOAST_OVERLAY(toasts_), adw_toast_new(text.c_str()));
+}
+
+TraitCollection GtkWindowHost::traitsFor(int width, int height) const {
+  constexpr int compactBelow = 600;
+  TraitCollection traits;
+  traits.horizontalSizeClass = width < compactBelow ? SizeClass::Compact : SizeClass::Regular;
+  traits.verticalSizeClass = height < compactBelow ? SizeClass::Compact : SizeClass::Regular;
+  traits.idiom = width < compactBelow || height < compactBelow ? InterfaceIdiom::Phone : InterfaceIdiom::Slate;
+  traits.displayScale = gtk_widget_get_scale_factor(GTK_WIDGET(window_));
+  traits.layoutDirection = gtk_widget_get_default_direction() == GTK_TEXT_DIR_RTL ? LayoutDirection::RightToLeft
+                                                                                  : LayoutDirection::LeftToRight;
+  return traits;
+}
+
+void GtkWindowHost::sizeChanged() {
+  int width = 0;
+  int height = 0;
+  gtk_window_get_default_size(widget(), &width, &height);
+  if (width <= 0 || height <= 0) return;
+  setTraitCollection(traitsFor(width, height));
+  resize(Size{static_cast<double>(width), static_cast<double>(height)}, false);
+}
+
+}  // namespace vaelo

@@ -1,0 +1,52 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <adwaita.h>
+
+#include <map>
+#include <memory>
+
+#include "host/gtk/page_stack.h"
+#include "host/gtk/screen_page.h"
+#include "platform/ui/navigation_controller.h"
+#include "platform/ui/window.h"
+
+namespace vaelo {
+
+/// The application's window on the display: one page for each screen of the root navigation controller's stack, alerts over
+/// it, and the keys and buttons that go back, search and refresh. Main thread.
+class GtkWindowHost : public Window, private NavigationHost, private PresentationHost {
+ public:
+  GtkWindowHost(GtkApplication* application, const Rect& bounds);
+  ~GtkWindowHost() override;
+
+  void makeKeyAndVisible() override;
+  GtkWindow* widget() const { return GTK_WINDOW(window_); }
+  /// A short message at the bottom of the window.
+  void showToast(const std::string& text);
+
+ private:
+  void stackChanged(const Stack& oldStack, const Stack& newStack, bool animated, std::function<void()> done) override;
+  void toolbarHiddenChanged(bool hidden, bool animated) override;
+  void present(const ViewControllerRef& presenter, const ViewControllerRef& presented, bool animated,
+               std::function<void()> done) override;
+  void dismiss(const ViewControllerRef& presented, bool animated, std::function<void()> done) override;
+
+  std::shared_ptr<NavigationController> navigation() const;
+  void goBack();
+  /// Escape: leaves a search first, else goes back.
+  void escape();
+  ScreenPage* topPage() const;
+  void addActions();
+  void sizeChanged();
+  TraitCollection traitsFor(int width, int height) const;
+
+  AdwApplicationWindow* window_;
+  GtkWidget* toasts_;
+  GMenu* menu_;
+  PageStack stack_;
+  std::map<ViewController*, std::unique_ptr<ScreenPage>> pages_;
+  std::map<ViewController*, GtkWindow*> dialogs_;
+};
+
+}  // namespace vaelo

@@ -1,0 +1,24 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <gtk/gtk.h>
+
+#include <vector>
+
+namespace vaelo {
+
+/// The widgets that a screen of the host's own brings along. Main thread.
+class HostScreen {
+ public:
+  virtual ~HostScreen() = default;
+  /// What fills the page between its bars; made on first use, owned by the screen.
+  virtual GtkWidget* contentWidget() = 0;
+  /// Widgets for the end of the header bar, from the outer edge inwards; made anew for each call.
+  virtual std::vector<GtkWidget*> headerWidgets() { return {}; }
+  /// The user went to the page's own search, or left it: Ctrl+F, and Escape. False when there is nothing to do.
+  virtual bool toggleSearch() { return false; }
+  virtual bool closeSearch() { return false; }
+  virtual void refresh() {}
+};
+
+}  // namespace vaelo

@@ -1,0 +1,92 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/gtk/screen_page.h"
+
+#include "host/gtk/bar_item_widget.h"
+#include "host/gtk/host_screen.h"
+
+namespace vaelo {
+
+ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, GMenuModel* menu)
+    : screen_(std::move(screen)),
+      hostScreen_(dynamic_cast<HostScreen*>(screen_.get())),
+      box_(GTK_WIDGET(g_object_ref_sink(gtk_box_new(GTK_ORIENTATION_VERTICAL, 0)))),
+      header_(adw_header_bar_new()),
+      title_(adw_window_title_new(nullptr, nullptr)),
+      back_(gtk_button_new_from_icon_name("go-previous-symbolic")),
+      toolbar_(gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 6)),
+      goBack_(std::move(goBack)) {
+  adw_header_bar_set_title_widget(ADW_HEADER_BAR(header_), title_);
+  gtk_widget_set_tooltip_text(back_, "Back");
+  gtk_accessible_update_property(GTK_ACCESSIBLE(back_), GTK_ACCESSIBLE_PROPERTY_LABEL, "Back", -1);
+  g_signal_connect_swapped(back_, "clicked", G_CALLBACK(+[](ScreenPage* self) { self->goBack_(); }), this);
+  adw_header_bar_pack_start(ADW_HEADER_BAR(header_), back_);
+  if (menu) {
+    GtkWidget* button = gtk_menu_button_new();
+    gtk_menu_button_set_icon_name(GTK_MENU_BUTTON(button), "open-menu-symbolic");
+    gtk_menu_button_set_menu_model(GTK_MENU_BUTTON(button), menu);
+    gtk_widget_set_tooltip_text(button, "Main Menu");
+    gtk_accessible_update_property(GTK_ACCESSIBLE(button), GTK_ACCESSIBLE_PROPERTY_LABEL, "Main Menu", -1);
+    adw_header_bar_pack_end(ADW_HEADER_BAR(header_), button);
+  }
+  gtk_box_append(GTK_BOX(box_), header_);
+  if (hostScreen_) {
+    for (GtkWidget* widget : hostScreen_->headerWidgets()) adw_header_bar_pack_end(ADW_HEADER_BAR(header_), widget);
+    GtkWidget* content = hostScreen_->contentWidget();
+    gtk_widget_set_vexpand(content, TRUE);
+    gtk_box_append(GTK_BOX(box_), content);
+  }
+  gtk_widget_add_css_class(toolbar_, "toolbar");
+  gtk_widget_set_size_request(toolbar_, -1, 46);
+  gtk_box_append(GTK_BOX(box_), toolbar_);
+
+  barToken_ = screen_->navigationItem().changed().connect([this](NavigationItem&) { showBar(); });
+  screenToken_ = screen_->changed().connect([this](ViewController&, ViewControllerChange change) {
+    if (change == ViewControllerChange::ToolbarItems) showToolbar();
+    if (change == ViewControllerChange::Title) showBar();
+  });
+  showBar();
+  showToolbar();
+}
+
+ScreenPage::~ScreenPage() {
+  g_signal_handlers_disconnect_by_data(back_, this);
+  if (hostScreen_ && gtk_widget_get_parent(hostScreen_->contentWidget()) == box_) {
+    gtk_box_remove(GTK_BOX(box_), hostScreen_->contentWidget());
+  }
+  g_object_unref(box_);
+}
+
+void ScreenPage::setCanGoBack(bool can) {
+  canGoBack_ = can;
+  showBar();
+}
+
+void ScreenPage::setToolbarHidden(bool hidden) {
+  toolbarHidden_ = hidden;
+  showToolbar();
+}
+
+void ScreenPage::showBar() {
+  NavigationItem& item = screen_->navigationItem();
+  adw_window_title_set_title(ADW_WINDOW_TITLE(title_), item.title().c_str());
+  const bool leftTakesPlace = !item.leftBarButtonItems().empty() && !item.leftItemsSupplementBackButton();
+  gtk_widget_set_visible(back_, canGoBack_ && !item.hidesBackButton() && !leftTakesPlace);
+  for (GtkWidget* widget : barWidgets_) adw_header_bar_remove(ADW_HEADER_BAR(header_), widget);
+  barWidgets_.clear();
+  for (const BarButtonItemRef& left : item.leftBarButtonItems()) {
+    barWidgets_.push_back(makeBarItemWidget(left));
+    adw_header_bar_pack_start(ADW_HEADER_BAR(header_), barWidgets_.back());
+  }
+  for (const BarButtonItemRef& right : item.rightBarButtonItems()) {
+    barWidgets_.push_back(makeBarItemWidget(right));
+    adw_header_bar_pack_end(ADW_HEADER_BAR(header_), barWidgets_.back());
+  }
+}
+
+void ScreenPage::showToolbar() {
+  while (GtkWidget* child = gtk_widget_get_first_child(toolbar_)) gtk_box_remove(GTK_BOX(toolbar_), child);
+  for (const BarButtonItemRef& item : screen_->toolbarItems()) gtk_box_append(GTK_BOX(toolbar_), makeBarItemWidget(item));
+  gtk_widget_set_visible(toolbar_, !toolbarHidden_ && !screen_->toolbarItems().empty());
+}
+
+}  // namespace vaelo

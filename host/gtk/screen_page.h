@@ -1,0 +1,49 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <adwaita.h>
+
+#include <functional>
+#include <memory>
+
+#include "platform/ui/view_controller.h"
+
+namespace vaelo {
+
+class HostScreen;
+
+/// One page of the window: a screen's header bar, its content and its toolbar, which follow the screen. Main thread.
+class ScreenPage {
+ public:
+  /// `goBack` is what the back button does; `menu` is shown at the end of the header bar (a reference is taken).
+  ScreenPage(ViewControllerRef screen, std::function<void()> goBack, GMenuModel* menu);
+  ~ScreenPage();
+  ScreenPage(const ScreenPage&) = delete;
+  ScreenPage& operator=(const ScreenPage&) = delete;
+
+  GtkWidget* widget() const { return box_; }
+  const ViewControllerRef& screen() const { return screen_; }
+  HostScreen* hostScreen() const { return hostScreen_; }
+  void setCanGoBack(bool can);
+  void setToolbarHidden(bool hidden);
+
+ private:
+  void showBar();
+  void showToolbar();
+
+  ViewControllerRef screen_;
+  HostScreen* hostScreen_;
+  GtkWidget* box_;
+  GtkWidget* header_;
+  GtkWidget* title_;
+  GtkWidget* back_;
+  GtkWidget* toolbar_;
+  std::vector<GtkWidget*> barWidgets_;
+  std::function<void()> goBack_;
+  bool canGoBack_ = false;
+  bool toolbarHidden_ = true;
+  std::shared_ptr<void> barToken_;
+  std::shared_ptr<void> screenToken_;
+};
+
+}  // namespace vaelo
