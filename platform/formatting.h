@@ -23,6 +23,8 @@ class Formatting {
   virtual std::string localizedString(const std::string& key) = 0;
   /// The text for a key that ends in a count's format (".DICT.ITEMS.%d"), plural by the count, with the count filled in.
   virtual std::string localizedCount(const std::string& key, std::int64_t count) = 0;
+  /// The text for a key that ends in "%g", plural by the number, with the number's own text filled in.
+  virtual std::string localizedAmount(const std::string& key, double number, const std::string& text) = 0;
   /// Fills "%@", "%1$@" ... of an already localized format.
   virtual std::string filled(const std::string& format, const std::vector<std::string>& arguments) = 0;
 };

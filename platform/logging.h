@@ -13,6 +13,8 @@ class LogSink {
   virtual ~LogSink() = default;
   /// `line` is whole: prefix, level, function, source line and message.
   virtual void write(LogType type, const std::string& line) = 0;
+  /// False when debug lines go nowhere, so that long ones need not be made.
+  virtual bool wantsDebug() { return true; }
 };
 
 /// Records what the user did, for tracing tools. Safe from any thread.

@@ -30,6 +30,8 @@ class ScreenFactory {
   virtual DocumentListControllerRef makeRootList() = 0;
   /// A list of one folder; null when it can't be made.
   virtual DocumentListControllerRef makeList(const URL& folder) = 0;
+  /// The list that is shown while a folder is firmly pressed; it has no search.
+  virtual DocumentListControllerRef makePeekFolderViewController(const URL& folder) = 0;
   /// One list for each folder from the drive's root down to `folder`; nothing when `folder` is not in the drive.
   virtual std::optional<std::vector<DocumentListControllerRef>> hierarchyTo(const URL& folder) = 0;
   /// The screen that says that no account is signed in; null when the host has none.
