@@ -44,6 +44,7 @@ class AlertController : public ViewController {
   /// For the host: the user waved the alert away (Escape, a click beside it): performs the cancel action. False when there
   /// is none; the alert stays.
   bool cancel();
+  void viewDidLoad() override;
 
  private:
   AlertStyle style_;

@@ -66,10 +66,6 @@ class NavigationController : public ViewController {
   void viewDidAppear(bool animated) override;
   void viewWillDisappear(bool animated) override;
   void viewDidDisappear(bool animated) override;
-  void viewWillLayoutSubviews() override;
-  /// The top screen's state, under its restoration identifier or its place in the stack, is the host's to keep; the base of
-  /// the state here is empty.
-  void encodeRestorableStateWithCoder(RestorationCoder& coder) override { ViewController::encodeRestorableStateWithCoder(coder); }
 
  protected:
   std::vector<ViewControllerRef> visibleChildren() const override;

@@ -140,7 +140,7 @@ class View : public std::enable_shared_from_this<View> {
   void setObserver(ViewObserver* observer) { observer_ = observer; }
 
  protected:
-  /// Tells the observer; changes that affect the size also invalidate the natural size.
+  /// Tells the observer.
   void notify(ViewChange change);
   /// Called when the view, or a view above it, came into a window or left it.
   virtual void didMoveToWindow() {}
@@ -156,6 +156,7 @@ class View : public std::enable_shared_from_this<View> {
   void resizeSubviews(const Size& oldSize);
   void keepFrame(const Rect& frame);
   void dropConstraintsReaching(const View& leaving);
+  void remember(const LayoutConstraintRef& constraint);
 
   View* superview_ = nullptr;
   std::vector<std::shared_ptr<View>> subviews_;

@@ -59,7 +59,7 @@ class ViewController : public std::enable_shared_from_this<ViewController> {
   virtual void viewDidLayoutSubviews() {}
   /// Children and presented screens are told too; overrides call the base.
   virtual void viewWillTransitionToSize(const Size& size, TransitionCoordinator& coordinator);
-  /// The traits of the window that the screen is in, or was last in; else those of a phone.
+  /// The traits of the window that the screen is in; else those of a phone.
   TraitCollection traitCollection() const;
 
   // Bars.
@@ -118,11 +118,13 @@ class ViewController : public std::enable_shared_from_this<ViewController> {
   /// A container says which of its children take part when sizes and appearance change.
   virtual std::vector<ViewControllerRef> visibleChildren() const { return children_; }
   void notify(ViewControllerChange change) { changed_.emit(*this, change); }
+  /// Takes this screen away when it is presented, with everything above it.
+  void dismissSelf(bool animated, std::function<void()> completion = nullptr);
 
  private:
   friend class Window;
   ViewController* outermost() const;
-  void finishPresented(const ViewControllerRef& presented, bool animated, std::function<void()> completion);
+  void finishPresented(bool animated, std::function<void()> completion);
 
   ViewRef view_;
   bool loading_ = false;
