@@ -2,11 +2,12 @@
 #pragma once
 
 #include <cstdint>
-#include <memory>
-#include <mutex>
+#include <optional>
 #include <string>
 
+#include "host/drive/document_database.h"
 #include "host/drive/drive_layout.h"
+#include "host/drive/item_identity.h"
 #include "platform/logging.h"
 #include "platform/result.h"
 
@@ -32,12 +33,9 @@ struct IndexedDocument {
 class DocumentIndex {
  public:
   DocumentIndex(const DriveLayout& layout, LogSink& log);
-  ~DocumentIndex();
-  DocumentIndex(const DocumentIndex&) = delete;
-  DocumentIndex& operator=(const DocumentIndex&) = delete;
 
   /// Opens the database, makes it when there is none, and moves a damaged one aside and rebuilds it.
-  std::optional<Error> open();
+  std::optional<Error> open() { return database_.open(); }
   /// The identifier of the item at `path` (logical or physical, final link not followed), above 0; one is made when it has none
   /// and `create` is true, else 0. A copy that another program made with its attributes gets an identifier of its own while
   /// the original exists. Error 4 when nothing is there.
@@ -47,17 +45,17 @@ class DocumentIndex {
   /// The document with that inode, as last seen; error 4 when it is not known.
   Result<IndexedDocument> documentWithInode(std::uint64_t device, std::uint64_t inode);
   /// True once a damaged database was moved aside and rebuilt since the program started.
-  bool wasRebuilt() const;
+  bool wasRebuilt() const { return database_.wasRebuilt(); }
 
  private:
-  struct Row;
-  struct Database;
+  Result<std::int64_t> makeID(const std::string& path, bool replacing);
+  Result<std::int64_t> carriedIDOf(const std::string& path, const ItemIdentity& item, bool create);
+  /// The item that `row` is about where it stands now; nothing when it is neither at its place nor in the mirror.
+  std::optional<IndexedDocument> locate(const DocumentRow& row);
 
   const DriveLayout& layout_;
   LogSink& log_;
-  mutable std::mutex mutex_;
-  std::unique_ptr<Database> database_;  // guarded by mutex_
-  bool wasRebuilt_ = false;             // guarded by mutex_
+  DocumentDatabase database_;  // has its own lock; none is held while the mirror is walked
 };
 
 }  // namespace vaelo

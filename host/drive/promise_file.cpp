@@ -166,4 +166,11 @@ std::optional<Error> writePromise(const std::string& folder, const PromiseInfo& 
   return writeSmallFile(path, keyFileText(file.get()));
 }
 
+std::optional<Error> setPromiseDocumentID(const std::string& promisePath, std::int64_t documentID) {
+  const Result<KeyFile> file = readKeyFile(promisePath);
+  if (!file) return file.error;
+  g_key_file_set_int64(file.value->get(), group, "DocumentID", documentID);
+  return writeSmallFile(promisePath, keyFileText(file.value->get()));
+}
+
 }  // namespace vaelo

@@ -1,0 +1,103 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/drive/drive_layout.h"
+
+#include <limits.h>
+#include <unistd.h>
+
+#include <vector>
+
+namespace vaelo {
+
+namespace {
+
+// As many as the kernel follows.
+constexpr int linkLimit = 40;
+
+bool isUsable(const std::string& path) {
+  return !path.empty() && path.front() == '/' && path.find('\0') == std::string::npos;
+}
+
+std::vector<std::string> components(const std::string& path) {
+  std::vector<std::string> parts;
+  for (std::size_t start = 0; start < path.size();) {
+    const std::size_t end = std::min(path.find('/', start), path.size());
+    if (end > start) parts.push_back(path.substr(start, end - start));
+    start = end + 1;
+  }
+  return parts;
+}
+
+std::string parent(const std::string& folder) { return folder.substr(0, folder.rfind('/')); }
+
+std::optional<std::string> linkTarget(const std::string& path) {
+  char target[PATH_MAX];
+  const ssize_t length = ::readlink(path.c_str(), target, sizeof target);
+  if (length <= 0) return std::nullopt;
+  return std::string(target, static_cast<std::size_t>(length));
+}
+
+// Where `name` in the real folder `from` leads; "" stands for the root. Nothing for a circle.
+std::optional<std::string> follow(const std::string& from, const std::string& name) {
+  std::string place = from;
+  std::vector<std::string> pending = {name};  // the next component last
+  int links = 0;
+  while (!pending.empty()) {
+    const std::string next = std::move(pending.back());
+    pending.pop_back();
+    if (next == ".") continue;
+    if (next == "..") {
+      place = parent(place);
+      continue;
+    }
+    const std::optional<std::string> target = linkTarget(place + "/" + next);
+    if (!target) {
+      place += "/" + next;
+      continue;
+    }
+    if (++links > linkLimit) return std::nullopt;
+    if (target->front() == '/') place.clear();
+    const std::vector<std::string> parts = components(*target);
+    pending.insert(pending.end(), parts.rbegin(), parts.rend());
+  }
+  return place;
+}
+
+}  // namespace
+
+std::string realLocation(const std::string& path) {
+  if (!isUsable(path)) return path;
+  std::string place;
+  for (const std::string& name : components(path)) {
+    const std::optional<std::string> next = follow(place, name);
+    place = next ? *next : place + "/" + name;
+  }
+  return place.empty() ? "/" : place;
+}
+
+DriveLayout::DriveLayout(const std::string& dataFolder)
+    : dataFolder_(realLocation(dataFolder)),
+      mirrorRoot_(realLocation(dataFolder_ + "/mirror")),
+      trashFolder_(mirrorRoot_ + "/.Trash") {}
+
+std::optional<std::string> DriveLayout::relativeToMirror(const std::string& path) const {
+  if (!isUsable(path)) return std::nullopt;
+  const std::string place = realLocation(path);
+  if (place == mirrorRoot_) return std::string();
+  if (place.compare(0, mirrorRoot_.size(), mirrorRoot_) != 0 || place[mirrorRoot_.size()] != '/') return std::nullopt;
+  return place.substr(mirrorRoot_.size() + 1);
+}
+
+bool DriveLayout::isInMirror(const std::string& path) const { return relativeToMirror(path).has_value(); }
+
+bool DriveLayout::isInTrash(const std::string& path) const {
+  const std::optional<std::string> relative = relativeToMirror(path);
+  return relative && relative->substr(0, relative->find('/')) == ".Trash";
+}
+
+std::optional<std::string> DriveLayout::containerOf(const std::string& path) const {
+  const std::optional<std::string> relative = relativeToMirror(path);
+  if (!relative || relative->empty() || relative->front() == '.') return std::nullopt;
+  return relative->substr(0, relative->find('/'));
+}
+
+}  // namespace vaelo

@@ -1,0 +1,15 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <sys/stat.h>
+
+#include <functional>
+#include <string>
+
+namespace vaelo {
+
+/// Visits everything below `root`, hidden files and the trash too, parents first, until `visit` returns false. Links are not
+/// followed; folders that can't be read are passed over. Paths are physical. Blocking; any thread.
+void walkTree(const std::string& root, const std::function<bool(const std::string& path, const struct stat& status)>& visit);
+
+}  // namespace vaelo
