@@ -1,70 +1,112 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <cstdint>
 #include <memory>
 #include <optional>
 #include <string>
 #include <vector>
 
+#include "app/document_list_controller_status_bar.h"
 #include "app/quota_fetcher.h"
-#include "items/dr_item.h"
-#include "platform/cloud_documents.h"
+#include "platform/date.h"
 #include "platform/notifications.h"
-#include "platform/storage_quota.h"
-#include "platform/ui/document_list_controller.h"
+#include "platform/ui/document_list_controller_delegate.h"
 #include "platform/ui/navigation_controller.h"
+#include "platform/ui/upgrade_flow_manager.h"
 
 namespace vaelo {
 
+class DRItem;
 class PreviewItemManager;
+struct UbiquityIdentityToken;
 
-/// The spine of the application: a stack of lists, one a folder level, with a preview on top. Every selection in a list, every way in
-/// from outside and every change of the account comes here. Main thread.
+/// The root of the window: the stack of folder lists with the previews on top. It is its own delegate and that of every list
+/// it shows, routes what is chosen, jumps to items from outside, and follows the account, its free space and its storage
+/// offer. Owned by a shared_ptr. Main thread.
 class NavController : public NavigationController,
                       public NavigationControllerDelegate,
                       public DocumentListControllerDelegate,
-                      public QuotaFetcherDelegate {
+                      public QuotaFetcherDelegate,
+                      public DocumentListControllerStatusBarDelegate {
  public:
-  ~NavController() override;
+  using NavigationController::NavigationController;
   std::string className() const override { return "NavController"; }
 
+  // What it knows.
+  /// Several items of the visible list can be selected.
   bool editMode() const { return editMode_; }
-  void setEditMode(bool editMode) { editMode_ = editMode; }
-  /// False until the first list has reported its items; the status line waits for it.
+  /// False until a list reports its items; the status line waits for that.
   bool pickerIsAlive() const { return pickerIsAlive_; }
+  std::shared_ptr<ViewController> splitViewController() const { return splitViewController_.lock(); }
+  void setSplitViewController(std::weak_ptr<ViewController> split) { splitViewController_ = std::move(split); }
+  /// The title of the list configured last.
   const std::string& viewTitle() const { return viewTitle_; }
+  /// Free bytes of the account, and when they were learnt.
   std::uint64_t quotaBytes() const { return quotaBytes_; }
   const std::optional<Date>& lastQuotaFetch() const { return lastQuotaFetch_; }
+  /// Null while no account is signed in.
   const std::shared_ptr<QuotaFetcher>& quotaFetcher() const { return quotaFetcher_; }
+  /// Of the document being previewed; null for none.
   const std::shared_ptr<PreviewItemManager>& itemManager() const { return itemManager_; }
+  const std::shared_ptr<UpgradeFlowManager>& upgradeFlowMgr() const { return upgradeFlowMgr_; }
   const StorageOfferRef& upgradeOffer() const { return upgradeOffer_; }
 
-  void viewDidLoad() override;
-  void viewWillDisappear(bool animated) override;
-  /// Builds the stack from the root: the drive's list, or the unavailable screen when no account is signed in.
+  // The stack.
+  /// Builds the stack anew: the drive's root, or the unavailable screen without an account.
   void setupInitialViewController();
-  /// Makes a list ready to be shown.
   void initNewListController(const DocumentListControllerRef& list);
-  /// The top screen when it is a list, else null.
-  DocumentListControllerRef getTopDocumentListController() const;
-  /// Replaces the stack by the lists down to the URL; false when there is no such place.
+  /// The top of the stack when it is a list, else null.
+  DocumentListControllerRef getTopDocumentListController();
+  /// Replaces the stack by the lists down to the folder of `url`; false when they can't be made.
   bool warpToFolderForURL(const URL& url);
-  /// Jumps to an item from outside; mode 0 is the quick preview, 1 the details. False leaves the stack as it was.
+  /// Goes to an item from outside and shows a document in the mode (0: quick preview). False, with the stack as it was, when
+  /// there is no such item in the drive. What is presented goes away in any case.
   bool warpToNewURLPreviewMode(const std::optional<URL>& url, long mode);
   void showPreviewPreviewMode(const std::shared_ptr<DRItem>& item, long mode);
-  /// Commits a peek.
+  /// Goes on from the peek of an item to the item.
   void orbPopToURL(const URL& url);
-  /// Opens the root list's search with the query.
+  /// Searches the whole drive; an empty query opens an empty search field.
   void startSearch(const std::string& query);
-  /// For diagnostics.
-  void logContainerURL() const;
+  /// Logs where the drive's own container is; a diagnostic.
+  void logContainerURL();
+
+  // Modes and bars.
+  /// The one place where the mode changes.
+  void setEditModeAndUpdateUIForViewController(bool edit, const DocumentListControllerRef& list);
+  void configureVisibleControllerForMode();
+  void configureNavBar(const DocumentListControllerRef& list);
+  void configureToolbar(const DocumentListControllerRef& list);
+
+  // The status line.
+  /// A value was fetched once, be it 0.
+  bool okToShowQuota() const { return lastQuotaFetch_.has_value(); }
+  std::string quotaAvailableString() const;
+  std::string toolbarStatusText(std::size_t itemCount) const;
+  /// Null: the top list.
+  void updateStatusUI(DocumentListControllerRef list);
+  void quotaFetcherDidUpdateValue(QuotaFetcher& fetcher, std::uint64_t freeBytes) override;
+
+  // The account and its offer.
+  /// An account is signed in.
+  bool checkVaeloState() const;
+  void handleAccountChanges();
+  void saveVaeloToken(const std::optional<UbiquityIdentityToken>& token);
+  void upgradeStorageButtonPressed() override;
+
+  // ViewController
+  void viewDidLoad() override;
+  void viewWillDisappear(bool animated) override;
   void encodeRestorableStateWithCoder(RestorationCoder& coder) override;
   void decodeRestorableStateWithCoder(const RestorationCoder& coder) override;
 
-  void navigationControllerWillShowViewControllerAnimated(NavigationController&, const ViewControllerRef&, bool) override {}
-  void navigationControllerDidShowViewControllerAnimated(NavigationController& navigation, const ViewControllerRef& screen,
+  // NavigationControllerDelegate
+  void navigationControllerWillShowViewControllerAnimated(NavigationController& navigation, const ViewControllerRef& shown,
+                                                          bool animated) override;
+  void navigationControllerDidShowViewControllerAnimated(NavigationController& navigation, const ViewControllerRef& shown,
                                                          bool animated) override;
 
+  // DocumentListControllerDelegate
   void documentListControllerDidSelectContainerWithViewController(const DocumentListControllerRef& list,
                                                                   const DocumentListControllerRef& chosen) override;
   void documentListControllerDidSelectItemAtURL(const DocumentListControllerRef& list, const URL& url) override;
@@ -76,43 +118,32 @@ class NavController : public NavigationController,
   void documentListControllerPerformActionURL(const DocumentListControllerRef& list, int action, const URL& url) override;
   ViewControllerRef documentListControllerViewControllerForPreviewingItemAtURL(const DocumentListControllerRef& list,
                                                                                const URL& url) override;
-
-  /// True exactly when an account is signed in.
-  bool checkVaeloState() const;
-  /// Rebuilds the stack when the account is another one than the last time.
-  void handleAccountChanges();
-  void saveVaeloToken(const std::optional<UbiquityIdentityToken>& token);
-
-  void configureNavBar(const DocumentListControllerRef& list);
-  void configureToolbar(const DocumentListControllerRef& list);
-  /// Brings the status line of the list, or of the top one, up to date.
-  void updateStatusUI(DocumentListControllerRef list);
-  bool okToShowQuota() const { return lastQuotaFetch_.has_value(); }
-  std::string toolbarStatusText(std::size_t itemCount) const;
-  std::string quotaAvailableString() const;
-  void quotaFetcherDidUpdateValue(QuotaFetcher& fetcher, std::uint64_t freeBytes) override;
+  void documentInteractionControllerDidDismissOptionsMenu() {}
 
  private:
-  void observe();
+  void observeNotifications();
   void didBecomeActiveNotification(const Notification& notification);
   void vaeloAccountAvailabilityChanged();
   void offerChangedNotification();
-  std::string offerLevel() const;
-  void showDrive();
+  std::string offerLevelText() const;
   void showDriveUnavailable();
-  void newItemManager(long mode);
-  /// Replaces the stack, animated, by the lists down to the item's URL.
-  void switchToFolderOf(const DRItem& item);
-  /// The item that a link leads to; null when it leads out of the drive or nowhere.
+  bool replaceStackDownToFolder(const URL& url, bool animated);
+  void chosenItemIsGone();
+  void showPreviewSoon(const std::shared_ptr<DRItem>& item, long mode);
   std::shared_ptr<DRItem> targetOfLink(const DRItem& link) const;
+  bool openInDefaultApp(const std::shared_ptr<DRItem>& item);
+  /// A new manager in the place of the present one, which no longer follows its document.
+  std::shared_ptr<PreviewItemManager> replaceItemManager(long mode);
 
   bool editMode_ = false;
   bool pickerIsAlive_ = false;
+  std::weak_ptr<ViewController> splitViewController_;
   std::string viewTitle_;
   std::uint64_t quotaBytes_ = 0;
   std::optional<Date> lastQuotaFetch_;
   std::shared_ptr<QuotaFetcher> quotaFetcher_;
   std::shared_ptr<PreviewItemManager> itemManager_;
+  std::shared_ptr<UpgradeFlowManager> upgradeFlowMgr_;
   StorageOfferRef upgradeOffer_;
   std::vector<NotificationCenter::Token> observations_;
 };

@@ -1,61 +1,37 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
-// The bars of a list: title, back button, and the status line.
-#include <cstdlib>
+#include <charconv>
 
 #include "app/nav_controller.h"
-#include "app/status_bar.h"
 #include "items/vlo_log.h"
 #include "platform/platform.h"
 
 namespace vaelo {
 
-void NavController::configureNavBar(const DocumentListControllerRef& list) {
-  NavigationItem& item = list->navigationItem();
-  item.setHidesBackButton(editMode_, false);
-  item.setTitle(editMode_ ? Platform::current().formatting.localizedString("Select Items") : viewTitle_);
+namespace {
+
+/// As a translation's "%g" shows it, whatever the process's locale.
+std::string plainNumber(const std::string& text) {
+  double number = 0;
+  std::from_chars(text.data(), text.data() + text.size(), number);
+  char digits[32];
+  const auto end = std::to_chars(digits, digits + sizeof digits, number, std::chars_format::general, 6).ptr;
+  return {digits, end};
 }
 
-void NavController::configureToolbar(const DocumentListControllerRef& list) {
-  std::shared_ptr<DocumentListControllerStatusBar> statusBar = DocumentListControllerStatusBar::of(*list);
-  if (!statusBar) {
-    statusBar = std::make_shared<DocumentListControllerStatusBar>();
-    DocumentListControllerStatusBar::attachTo(*list, statusBar);
-  }
-  if (list->toolbarItems() != statusBar->toolbarItems()) list->setToolbarItems(statusBar->toolbarItems());
-  updateStatusUI(list);
-}
-
-void NavController::documentListControllerItemsChanged(const DocumentListControllerRef& list) {
-  pickerIsAlive_ = true;
-  if (list != topViewController()) return;
-  if (editMode_) {
-    VLO_DEBUG("DLC selected item count is %{public}@", list->selectedItems().size());
-  } else {
-    // One count for all lists: only a change is worth a line.
-    static std::size_t lastLoggedCount = 0;
-    const std::size_t count = list->containedItems().size();
-    if (count != lastLoggedCount) {
-      lastLoggedCount = count;
-      VLO_DEBUG("DLC items changed, count is %{public}@", count);
-    }
-  }
-  updateStatusUI(list);
-}
-
-void NavController::updateStatusUI(DocumentListControllerRef list) {
-  if (!pickerIsAlive_) return;
-  if (!list) list = getTopDocumentListController();
-  if (!list) return;
-  if (const auto statusBar = DocumentListControllerStatusBar::of(*list)) {
-    statusBar->setStatusText(toolbarStatusText(list->containedItems().size()));
-  }
-}
+}  // namespace
 
 void NavController::quotaFetcherDidUpdateValue(QuotaFetcher&, std::uint64_t freeBytes) {
   quotaBytes_ = freeBytes;
   lastQuotaFetch_ = Platform::current().queues.now();
   VLO_DEBUG("updated quota at %{public}@: %{public}@ bytes avail", *lastQuotaFetch_, freeBytes);
   updateStatusUI(nullptr);
+}
+
+std::string NavController::quotaAvailableString() const {
+  Formatting& formatting = Platform::current().formatting;
+  const std::string withUnit = formatting.byteCount(quotaBytes_, ByteCountStyle::Binary);
+  const std::string number = plainNumber(formatting.byteCount(quotaBytes_, ByteCountStyle::Binary, false));
+  return formatting.filled(formatting.localizedString(".DICT.AVAILABLE.%g"), {number, withUnit});
 }
 
 std::string NavController::toolbarStatusText(std::size_t itemCount) const {
@@ -65,11 +41,34 @@ std::string NavController::toolbarStatusText(std::size_t itemCount) const {
   return formatting.filled(formatting.localizedString("%1$@, %2$@"), {items, quotaAvailableString()});
 }
 
-std::string NavController::quotaAvailableString() const {
+void NavController::documentListControllerItemsChanged(const DocumentListControllerRef& list) {
+  // One for all lists: it only keeps the log from repeating itself.
+  static std::size_t lastLoggedCount = 0;
+  pickerIsAlive_ = true;
+  if (list != getTopDocumentListController()) return;
+  if (editMode_) {
+    VLO_DEBUG("DLC selected item count is %{public}@", list->selectedItems().size());
+  } else if (list->containedItems().size() != lastLoggedCount) {
+    lastLoggedCount = list->containedItems().size();
+    VLO_DEBUG("DLC items changed, count is %{public}@", lastLoggedCount);
+  }
+  updateStatusUI(list);
+}
+
+void NavController::updateStatusUI(DocumentListControllerRef list) {
+  if (!pickerIsAlive_) return;
+  if (!list) list = getTopDocumentListController();
+  if (!list) return;
+  if (const StatusBarRef bar = statusBarOf(*list)) {
+    bar->setStatusText(toolbarStatusText(list->containedItems().size()));
+    bar->showUpgradeOffer(upgradeOffer_);
+  }
+  if (!editMode_) return;
   Formatting& formatting = Platform::current().formatting;
-  const std::string withUnit = formatting.byteCount(quotaBytes_, ByteCountStyle::Binary);
-  const std::string number = formatting.byteCount(quotaBytes_, ByteCountStyle::Binary, false);
-  return formatting.localizedAmount(".DICT.AVAILABLE.%g", std::strtod(number.c_str(), nullptr), withUnit);
+  const std::size_t selected = list->selectedItems().size();
+  list->navigationItem().setTitle(selected > 0 ? formatting.localizedCount(".DICT.ITEMS_SELECTED.%d",
+                                                                           static_cast<std::int64_t>(selected))
+                                               : formatting.localizedString("Select Items"));
 }
 
 }  // namespace vaelo
