@@ -55,8 +55,9 @@ class DocumentDatabase::Statement {
   int bound_ = 0;
 };
 
-DocumentDatabase::DocumentDatabase(std::string file, LogSink& log, std::function<std::vector<DocumentRow>()> remembered)
-    : file_(std::move(file)), log_(log), remembered_(std::move(remembered)) {}
+DocumentDatabase::DocumentDatabase(std::string file, LogSink& log, std::function<std::vector<DocumentRow>()> remembered,
+                                   std::function<void()> rebuilt)
+    : file_(std::move(file)), log_(log), remembered_(std::move(remembered)), rebuilt_(std::move(rebuilt)) {}
 
 DocumentDatabase::~DocumentDatabase() { close(); }
 
@@ -151,6 +152,7 @@ std::optional<Error> DocumentDatabase::rebuild() {
   }
   // What does not fit now is found again when it is asked for: the items carry it.
   sqlite3_exec(connection_, "COMMIT", nullptr, nullptr, nullptr);
+  if (rebuilt_) rebuilt_();
   return std::nullopt;
 }
 

@@ -30,8 +30,10 @@ struct DocumentRow {
 /// the first call. Errors as those of DocumentIndex.
 class DocumentDatabase {
  public:
-  /// `remembered` gives the rows to fill a new database with after damage; it is called under the lock.
-  DocumentDatabase(std::string file, LogSink& log, std::function<std::vector<DocumentRow>()> remembered);
+  /// `remembered` gives the rows to fill a new database with after damage; `rebuilt`, which may be empty, is told that it was
+  /// done. Both are called under the lock, so they must not call back.
+  DocumentDatabase(std::string file, LogSink& log, std::function<std::vector<DocumentRow>()> remembered,
+                   std::function<void()> rebuilt);
   ~DocumentDatabase();
   DocumentDatabase(const DocumentDatabase&) = delete;
   DocumentDatabase& operator=(const DocumentDatabase&) = delete;
@@ -66,6 +68,7 @@ class DocumentDatabase {
   const std::string file_;
   LogSink& log_;
   const std::function<std::vector<DocumentRow>()> remembered_;
+  const std::function<void()> rebuilt_;
   mutable std::mutex mutex_;
   sqlite3* connection_ = nullptr;  // guarded by mutex_
   bool wasRebuilt_ = false;        // guarded by mutex_

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <optional>
 #include <string>
 
@@ -32,7 +33,8 @@ struct IndexedDocument {
 /// disk, 642 read-only, 513 no permission, 512 anything else the database says.
 class DocumentIndex {
  public:
-  DocumentIndex(const DriveLayout& layout, LogSink& log);
+  /// `rebuilt` is told, on any thread, when a damaged database was replaced; it must not call the index.
+  DocumentIndex(const DriveLayout& layout, LogSink& log, std::function<void()> rebuilt = {});
 
   /// Opens the database, makes it when there is none, and moves a damaged one aside and rebuilds it.
   std::optional<Error> open() { return database_.open(); }

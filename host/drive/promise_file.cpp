@@ -6,7 +6,6 @@
 #include <charconv>
 #include <cmath>
 #include <cstdio>
-#include <sstream>
 
 #include "host/drive/small_file.h"
 #include "platform/resource_values.h"
@@ -68,15 +67,6 @@ std::string text(Date moment) {
   char fraction[16];
   std::snprintf(fraction, sizeof fraction, ".%06d", static_cast<int>(microseconds));
   return std::to_string(whole.time_since_epoch().count()) + (microseconds ? fraction : "");
-}
-
-std::vector<std::string> list(const std::optional<std::string>& joined) {
-  std::vector<std::string> items;
-  std::istringstream stream(joined.value_or(""));
-  for (std::string item; std::getline(stream, item, ';');) {
-    if (!item.empty()) items.push_back(item);
-  }
-  return items;
 }
 
 }  // namespace
@@ -141,7 +131,7 @@ Result<PromiseInfo> readPromise(const std::string& promisePath) {
   info.package = keyFileBool(keys, group, "Package", false);
   const std::optional<std::string> share = value("Share");
   if (share == SharedItemRoleOwner || share == SharedItemRoleParticipant) info.share = share;
-  info.tags = list(value("Tags"));
+  info.tags = keyFileList(keys, group, "Tags").value_or(std::vector<std::string>());
   info.documentID = integer<std::int64_t>(value("DocumentID"));
   return info;
 }
@@ -159,9 +149,9 @@ std::optional<Error> writePromise(const std::string& folder, const PromiseInfo& 
   if (info.created) set("Created", text(*info.created));
   set("Package", info.package ? "true" : "false");
   if (info.share) set("Share", *info.share);
-  std::string tags;
-  for (const std::string& tag : info.tags) tags += (tags.empty() ? "" : ";") + tag;
-  if (!tags.empty()) set("Tags", tags);
+  std::vector<const char*> tags;
+  for (const std::string& tag : info.tags) tags.push_back(tag.c_str());
+  if (!tags.empty()) g_key_file_set_string_list(file.get(), group, "Tags", tags.data(), tags.size());
   if (info.documentID) set("DocumentID", std::to_string(*info.documentID));
   return writeSmallFile(path, keyFileText(file.get()));
 }

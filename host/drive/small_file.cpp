@@ -71,6 +71,31 @@ std::string temporaryPathFor(const std::string& path) {
   return path.substr(0, path.rfind('/') + 1) + name;
 }
 
+std::optional<std::string> rawValue(GKeyFile* file, const char* group, const char* key) {
+  gchar* raw = g_key_file_get_value(file, group, key, nullptr);
+  if (!raw) return std::nullopt;
+  std::string value(raw);
+  g_free(raw);
+  return value;
+}
+
+// The library's own unescaping refuses what is not UTF-8, which names need not be.
+std::optional<std::string> unescaped(const std::string& escaped) {
+  std::string value;
+  for (std::size_t i = 0; i < escaped.size(); ++i) {
+    if (escaped[i] != '\\') {
+      value.push_back(escaped[i]);
+      continue;
+    }
+    if (++i == escaped.size()) return std::nullopt;
+    constexpr std::string_view letters = "sntr\\;";
+    const std::size_t at = letters.find(escaped[i]);
+    if (at == std::string_view::npos) return std::nullopt;
+    value.push_back(" \n\t\r\\;"[at]);
+  }
+  return value;
+}
+
 }  // namespace
 
 Error errorFromErrno(int number, const std::string& path, FileAccess access) {
@@ -137,24 +162,29 @@ Result<KeyFile> readKeyFile(const std::string& path) {
 }
 
 std::optional<std::string> keyFileBytes(GKeyFile* file, const char* group, const char* key) {
-  gchar* raw = g_key_file_get_value(file, group, key, nullptr);
-  if (!raw) return std::nullopt;
-  const std::string escaped(raw);
-  g_free(raw);
-  // The library's own unescaping refuses what is not UTF-8, which names need not be.
-  std::string value;
-  for (std::size_t i = 0; i < escaped.size(); ++i) {
-    if (escaped[i] != '\\') {
-      value.push_back(escaped[i]);
+  const std::optional<std::string> escaped = rawValue(file, group, key);
+  return escaped ? unescaped(*escaped) : std::nullopt;
+}
+
+std::optional<std::vector<std::string>> keyFileList(GKeyFile* file, const char* group, const char* key) {
+  const std::optional<std::string> escaped = rawValue(file, group, key);
+  if (!escaped) return std::nullopt;
+  std::vector<std::string> items;
+  std::string item;
+  const auto finish = [&] {
+    if (!item.empty()) items.push_back(unescaped(item).value_or(item));
+    item.clear();
+  };
+  for (std::size_t i = 0; i < escaped->size(); ++i) {
+    if ((*escaped)[i] == ';') {
+      finish();
       continue;
     }
-    if (++i == escaped.size()) return std::nullopt;
-    constexpr std::string_view letters = "sntr\\;";
-    const std::size_t at = letters.find(escaped[i]);
-    if (at == std::string_view::npos) return std::nullopt;
-    value.push_back(" \n\t\r\\;"[at]);
+    item.push_back((*escaped)[i]);
+    if ((*escaped)[i] == '\\' && i + 1 < escaped->size()) item.push_back((*escaped)[++i]);
   }
-  return value;
+  finish();
+  return items;
 }
 
 bool keyFileBool(GKeyFile* file, const char* group, const char* key, bool otherwise) {

@@ -6,6 +6,7 @@
 #include <memory>
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "platform/result.h"
 
@@ -37,6 +38,8 @@ using KeyFile = std::unique_ptr<GKeyFile, KeyFileFree>;
 Result<KeyFile> readKeyFile(const std::string& path);
 /// The unescaped value, whose bytes need not be UTF-8; nothing when the key is absent or its escapes are broken.
 std::optional<std::string> keyFileBytes(GKeyFile* file, const char* group, const char* key);
+/// The values of a list, which semicolons end; nothing when the key is absent. Broken escapes stay as they are.
+std::optional<std::vector<std::string>> keyFileList(GKeyFile* file, const char* group, const char* key);
 /// "true" and "false"; anything else, and an absent key, is `otherwise`.
 bool keyFileBool(GKeyFile* file, const char* group, const char* key, bool otherwise);
 /// A file URL; nothing when it is absent, of another scheme or host, relative, wrongly encoded or holds a NUL.

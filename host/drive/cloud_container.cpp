@@ -1,0 +1,95 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/drive/cloud_container.h"
+
+#include <fts.h>
+#include <sys/stat.h>
+
+#include <cerrno>
+#include <cstdio>
+#include <memory>
+
+#include "host/drive/small_file.h"
+
+namespace vaelo {
+
+namespace {
+
+constexpr const char* group = "Container";
+
+bool isFolder(const std::string& path) {
+  struct stat status = {};
+  return ::lstat(path.c_str(), &status) == 0 && S_ISDIR(status.st_mode);
+}
+
+bool isIdentifier(const std::string& text) {
+  return !text.empty() && text.front() != '.' && text.find('/') == std::string::npos && text.find('\0') == std::string::npos;
+}
+
+std::string displayName(const std::string& identifier) {
+  if (identifier == DriveLayout::DefaultContainer) return "Vaelo Drive";
+  gchar* name = g_filename_display_name(identifier.c_str());
+  std::string text(name);
+  g_free(name);
+  return text;
+}
+
+}  // namespace
+
+CloudContainerRef LocalContainer::read(const DriveLayout& layout, const std::string& identifier, LogSink& log) {
+  if (!isIdentifier(identifier)) return nullptr;
+  const std::string folder = layout.containerFolder(identifier);
+  if (!isFolder(folder)) return nullptr;
+  std::shared_ptr<LocalContainer> container(new LocalContainer);
+  container->identifier_ = identifier;
+  container->folder_ = folder;
+  container->localizedName_ = displayName(identifier);
+  const bool isDefault = identifier == DriveLayout::DefaultContainer;
+  const std::string documents = isDefault ? folder : folder + "/Documents";
+  if (isDefault || isFolder(documents)) container->documentsFolder_ = URL(documents, true);
+  container->readManifest(folder + "/" + ContainerManifestName, log);
+  return container;
+}
+
+void LocalContainer::readManifest(const std::string& path, LogSink& log) {
+  const Result<KeyFile> file = readKeyFile(path);
+  if (!file && file.error->code == FileErrorCode::ReadNoSuchFile) return;
+  if (!file || !g_key_file_has_group(file.value->get(), group)) {
+    const std::string reason = file.error ? file.error->description() : "it has no container in it";
+    log.write(LogType::Error, "drive: the manifest of " + localizedName_ + " is broken: " + reason);
+    return;
+  }
+  GKeyFile* keys = file.value->get();
+  if (gchar* name = g_key_file_get_locale_string(keys, group, "Name", nullptr, nullptr)) {
+    if (*name) localizedName_ = name;
+    g_free(name);
+  }
+  if (const auto types = keyFileList(keys, group, "DocumentTypes")) {
+    Array identifiers;
+    for (const std::string& type : *types) identifiers.emplace_back(type);
+    documentTypes_.emplace();
+    if (!identifiers.empty()) documentTypes_->push_back({Value(std::move(identifiers))});
+  }
+  folderLevels_ = keyFileBytes(keys, group, "FolderLevels");
+  owners_ = keyFileList(keys, group, "Owners").value_or(std::vector<std::string>());
+}
+
+std::optional<Error> LocalContainer::deleteAllContents() {
+  std::string root = folder_;
+  char* const roots[] = {root.data(), nullptr};
+  const std::unique_ptr<FTS, int (*)(FTS*)> walk(::fts_open(roots, FTS_PHYSICAL | FTS_NOCHDIR | FTS_NOSTAT, nullptr),
+                                                 ::fts_close);
+  if (!walk) return errorFromErrno(errno, folder_, FileAccess::Write);
+  const std::string manifest = folder_ + "/" + ContainerManifestName;
+  std::optional<Error> first;
+  while (const FTSENT* entry = ::fts_read(walk.get())) {
+    const std::string path = entry->fts_path;
+    if (entry->fts_info == FTS_D || entry->fts_level == FTS_ROOTLEVEL) continue;
+    if (path == manifest || (documentsFolder_ && path == documentsFolder_->path())) continue;
+    const bool unreadable = entry->fts_info == FTS_ERR || entry->fts_info == FTS_DNR;
+    const int number = unreadable ? entry->fts_errno : ::remove(path.c_str()) == 0 ? 0 : errno;
+    if (number != 0 && number != ENOENT && !first) first = errorFromErrno(number, path, FileAccess::Write);
+  }
+  return first;
+}
+
+}  // namespace vaelo
