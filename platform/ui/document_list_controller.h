@@ -22,8 +22,8 @@ enum class DocumentListChange { Items, Selection, Editing, AvailableActions, Sea
 /// host" are what the user and the folder do; tests use them as well. The delegate is held weakly.
 class DocumentListController : public ViewController {
  public:
-  /// A list of the folder; `allContainers` makes it the drive's root list, which also shows the libraries. Use ScreenFactory,
-  /// so that the host knows of the list, except in subclasses.
+  /// A list of the folder; `allContainers` makes it the drive's root list, which also shows the libraries. Use
+  /// ScreenFactory, so that the host knows of the list, except in subclasses.
   explicit DocumentListController(std::optional<URL> presentedURL, bool allContainers = false);
   ~DocumentListController() override;
   std::string className() const override { return "DocumentListController"; }

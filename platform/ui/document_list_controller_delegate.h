@@ -41,11 +41,10 @@ class DocumentListControllerDelegate {
                                                                                int action, const URL& url,
                                                                                const ViewRef& view,
                                                                                Completion completion) = 0;
-  virtual void documentListControllerPerformActionURL(const DocumentListControllerRef& list, int action,
-                                                      const URL& url) = 0;
+  virtual void documentListControllerPerformActionURL(const DocumentListControllerRef& list, int action, const URL& url) = 0;
   /// The screen to show while the item is firmly pressed; null for none.
-  virtual ViewControllerRef documentListControllerViewControllerForPreviewingItemAtURL(
-      const DocumentListControllerRef& list, const URL& url) = 0;
+  virtual ViewControllerRef documentListControllerViewControllerForPreviewingItemAtURL(const DocumentListControllerRef& list,
+                                                                                       const URL& url) = 0;
 };
 
 }  // namespace vaelo

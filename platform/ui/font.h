@@ -5,7 +5,17 @@ namespace vaelo {
 
 /// The roles that text plays; the host picks the face for each.
 enum class TextStyle {
-  LargeTitle, Title1, Title2, Title3, Headline, Subheadline, Body, Callout, Footnote, Caption1, Caption2,
+  LargeTitle,
+  Title1,
+  Title2,
+  Title3,
+  Headline,
+  Subheadline,
+  Body,
+  Callout,
+  Footnote,
+  Caption1,
+  Caption2,
 };
 
 /// Distances of a font's lines, in points. The descender is negative: it lies below the baseline.

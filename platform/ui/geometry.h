@@ -46,9 +46,7 @@ struct Rect {
             std::max(0.0, height - insets.top - insets.bottom)};
   }
   Rect insetBy(double dx, double dy) const { return insetBy(EdgeInsets{dy, dx, dy, dx}); }
-  bool contains(const Point& point) const {
-    return point.x >= x && point.x < maxX() && point.y >= y && point.y < maxY();
-  }
+  bool contains(const Point& point) const { return point.x >= x && point.x < maxX() && point.y >= y && point.y < maxY(); }
   friend bool operator==(const Rect&, const Rect&) = default;
 };
 

@@ -13,7 +13,17 @@ class LayoutConstraint;
 using LayoutConstraintRef = std::shared_ptr<LayoutConstraint>;
 
 enum class LayoutAttribute {
-  NotAnAttribute, Left, Right, Top, Bottom, Leading, Trailing, Width, Height, CenterX, CenterY,
+  NotAnAttribute,
+  Left,
+  Right,
+  Top,
+  Bottom,
+  Leading,
+  Trailing,
+  Width,
+  Height,
+  CenterX,
+  CenterY,
 };
 enum class LayoutRelation { LessThanOrEqual, Equal, GreaterThanOrEqual };
 enum class LayoutAxis { Horizontal, Vertical };
@@ -27,7 +37,8 @@ inline constexpr float DefaultLow = 250;
 /// first.attribute (relation) second.attribute * multiplier + constant, or a plain constant without a second item.
 ///
 /// An active constraint is kept alive by the nearest common superview of its items (by the first item when they have none),
-/// which View::constraints lists. Items aren't kept alive; one that is gone is null, and the constraint inactive. Main thread.
+/// which View::constraints lists. Items aren't kept alive; one that is gone is null, and the constraint inactive. Main
+/// thread.
 class LayoutConstraint : public std::enable_shared_from_this<LayoutConstraint> {
  public:
   static LayoutConstraintRef make(View& first, LayoutAttribute firstAttribute, LayoutRelation relation, View* second,

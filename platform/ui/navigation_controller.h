@@ -22,9 +22,9 @@ class NavigationControllerDelegate {
 
 /// A stack of screens of which the top one is shown. Main thread.
 ///
-/// Every change of the top goes: delegate willShow, viewWillDisappear and viewWillAppear, the host's transition, viewDidDisappear
-/// and viewDidAppear, delegate didShow. Without a host the transition takes no time. Before the controller's own view is
-/// loaded only the delegate is told. A change during a transition ends that transition first.
+/// Every change of the top goes: delegate willShow, viewWillDisappear and viewWillAppear, the host's transition,
+/// viewDidDisappear and viewDidAppear, delegate didShow. Without a host the transition takes no time. Before the
+/// controller's own view is loaded only the delegate is told. A change during a transition ends that transition first.
 class NavigationController : public ViewController {
  public:
   NavigationController() = default;

@@ -28,8 +28,8 @@ class PreviewControllerDelegate {
 
 enum class PreviewChange { AllItems, CurrentItem, BarButtonItems };
 
-/// Shows the content of documents. Data source and delegate are held weakly; without them it shows nothing and edits nothing.
-/// Main thread.
+/// Shows the content of documents. Data source and delegate are held weakly; without them it shows nothing and edits
+/// nothing. Main thread.
 class PreviewController : public ViewController {
  public:
   std::string className() const override { return "PreviewController"; }

@@ -159,7 +159,9 @@ bool TextField::userSetText(const std::string& text) {
   const std::size_t shorter = std::min(text.size(), text_.size());
   std::size_t head = 0;
   while (head < shorter && text[head] == text_[head]) ++head;
-  const auto splits = [](const std::string& whole, std::size_t at) { return at < whole.size() && !beginsCharacter(whole[at]); };
+  const auto splits = [](const std::string& whole, std::size_t at) {
+    return at < whole.size() && !beginsCharacter(whole[at]);
+  };
   while (head > 0 && (splits(text, head) || splits(text_, head))) --head;
   std::size_t tail = 0;
   while (tail < shorter - head && text[text.size() - 1 - tail] == text_[text_.size() - 1 - tail]) ++tail;

@@ -31,8 +31,8 @@ enum AutoresizingMask : unsigned {
   FlexibleBottomMargin = 32,
 };
 
-/// A rectangle on the screen: properties that a host mirrors, and subviews that it owns. It draws nothing itself and solves no
-/// constraints; the host (or a test) reports the resulting frames with applyLayoutFrame. Main thread.
+/// A rectangle on the screen: properties that a host mirrors, and subviews that it owns. It draws nothing itself and solves
+/// no constraints; the host (or a test) reports the resulting frames with applyLayoutFrame. Main thread.
 class View : public std::enable_shared_from_this<View> {
  public:
   /// A size without a natural width or height has this in its place.

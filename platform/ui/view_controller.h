@@ -21,7 +21,14 @@ class ViewController;
 class Window;
 using ViewControllerRef = std::shared_ptr<ViewController>;
 
-enum class PresentationStyle { Automatic = -2, FullScreen = 0, PageSheet = 1, FormSheet = 2, OverCurrentContext = 6, Popover = 7 };
+enum class PresentationStyle {
+  Automatic = -2,
+  FullScreen = 0,
+  PageSheet = 1,
+  FormSheet = 2,
+  OverCurrentContext = 6,
+  Popover = 7
+};
 enum class ViewControllerChange { Title, ToolbarItems, View, Children, Presentation };
 enum class AppearanceState { Disappeared, Appearing, Appeared, Disappearing };
 

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "platform/ui/visual_format.h"
 
-#include <charconv>
 #include <cctype>
+#include <charconv>
 #include <optional>
 
 #include "platform/ui/view.h"
@@ -143,8 +143,7 @@ class Parser {
 
   std::string takeName() {
     std::size_t length = 0;
-    while (length < rest_.size() &&
-           (std::isalnum(static_cast<unsigned char>(rest_[length])) || rest_[length] == '_')) {
+    while (length < rest_.size() && (std::isalnum(static_cast<unsigned char>(rest_[length])) || rest_[length] == '_')) {
       ++length;
     }
     const std::string name(rest_.substr(0, length));
@@ -182,8 +181,7 @@ class Parser {
 
 }  // namespace
 
-std::vector<LayoutConstraintRef> constraintsWithVisualFormat(std::string_view format,
-                                                             const VisualFormatBindings& bindings) {
+std::vector<LayoutConstraintRef> constraintsWithVisualFormat(std::string_view format, const VisualFormatBindings& bindings) {
   return Parser(format, bindings).run();
 }
 

@@ -9,8 +9,8 @@
 
 namespace vaelo {
 
-/// The application's window. Main thread. Made by ScreenFactory::makeWindow, so that the host can show it; a plain one is shown
-/// by nobody and serves tests.
+/// The application's window. Main thread. Made by ScreenFactory::makeWindow, so that the host can show it; a plain one is
+/// shown by nobody and serves tests.
 class Window : public std::enable_shared_from_this<Window> {
  public:
   explicit Window(const Rect& bounds = {});
