@@ -112,8 +112,8 @@ Result<std::int64_t> DocumentIndex::makeID(const std::string& path, bool replaci
       if (!rows) return *rows.error;
       for (const DocumentRow& other : *rows.value) {
         if (!itemOf(other).isSameFile(*item)) continue;
-        if (!replacing || other.id != item->carriedID) return other.id;
-        if (auto error = database_.remove(other.id)) return *error;
+        if (replacing) carryID(path, other.id, true);
+        return other.id;
       }
       continue;
     }
@@ -131,6 +131,7 @@ Result<std::int64_t> DocumentIndex::makeID(const std::string& path, bool replaci
       case Carrying::CarriesAnother:
         if (auto error = database_.remove(row.id)) return *error;
         if (const auto now = identityOf(path); now && now->carriedID != 0) return carriedIDOf(path, *now, true);
+        replacing = true;  // what it carries is no identifier
         break;
     }
   }

@@ -57,7 +57,7 @@ std::optional<Date> date(const std::optional<std::string>& text) {
   const double seconds = g_ascii_strtod(text->c_str(), &end);
   // Beyond this a date does not fit into the clock's nanoseconds.
   if (end != text->c_str() + text->size() || !std::isfinite(seconds) || std::fabs(seconds) > 9e9) return std::nullopt;
-  return Date(std::chrono::duration_cast<Date::duration>(std::chrono::duration<double>(seconds)));
+  return Date(std::chrono::round<std::chrono::microseconds>(std::chrono::duration<double>(seconds)));
 }
 
 std::string text(Date moment) {
