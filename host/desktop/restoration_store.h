@@ -1,0 +1,22 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <string>
+
+#include "platform/ui/restoration_coder.h"
+
+namespace vaelo {
+
+/// Keeps a screen's state between two runs, in a key file. Blocks; the file is small. Main thread.
+class RestorationStore {
+ public:
+  explicit RestorationStore(std::string path) : path_(std::move(path)) {}
+  /// Only URLs and integers are kept.
+  void save(const Dictionary& values);
+  Dictionary load() const;
+
+ private:
+  std::string path_;
+};
+
+}  // namespace vaelo

@@ -1,0 +1,185 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/files/glib_queues.h"
+
+#include <glib.h>
+
+#include <atomic>
+#include <condition_variable>
+#include <deque>
+#include <mutex>
+#include <thread>
+#include <vector>
+
+namespace vaelo {
+
+namespace {
+
+gboolean runBlock(gpointer held) {
+  (*static_cast<Block*>(held))();
+  return G_SOURCE_REMOVE;
+}
+
+void post(GMainContext* context, std::chrono::nanoseconds delay, Block block) {
+  const auto milliseconds = std::chrono::ceil<std::chrono::milliseconds>(delay).count();
+  GSource* source = delay.count() > 0 ? g_timeout_source_new(static_cast<guint>(milliseconds)) : g_idle_source_new();
+  g_source_set_priority(source, G_PRIORITY_DEFAULT);
+  g_source_set_callback(source, runBlock, new Block(std::move(block)), [](gpointer held) { delete static_cast<Block*>(held); });
+  g_source_attach(source, context);
+  g_source_unref(source);
+}
+
+class MainQueue : public DispatchQueue {
+ public:
+  void async(Block block) override { post(nullptr, {}, std::move(block)); }
+  void after(std::chrono::nanoseconds delay, Block block) override { post(nullptr, delay, std::move(block)); }
+  std::string label() const override { return "main"; }
+};
+
+/// One thread with a main context of its own, begun by the first block.
+class SerialQueue : public DispatchQueue {
+ public:
+  explicit SerialQueue(std::string label) : label_(std::move(label)), context_(g_main_context_new()) {}
+  ~SerialQueue() override {
+    *stopping_ = true;
+    g_main_context_wakeup(context_);
+    if (thread_.joinable()) {
+      // A block may hold the last reference to its own queue.
+      if (thread_.get_id() == std::this_thread::get_id()) {
+        thread_.detach();
+      } else {
+        thread_.join();
+      }
+    }
+    g_main_context_unref(context_);
+  }
+  void async(Block block) override { after({}, std::move(block)); }
+  void after(std::chrono::nanoseconds delay, Block block) override {
+    const std::lock_guard lock(mutex_);
+    if (!thread_.joinable()) {
+      thread_ = std::thread([context = g_main_context_ref(context_), stopping = stopping_] {
+        while (!*stopping) g_main_context_iteration(context, TRUE);
+        g_main_context_unref(context);
+      });
+    }
+    post(context_, delay, std::move(block));
+  }
+  std::string label() const override { return label_; }
+
+ private:
+  std::string label_;
+  GMainContext* context_;
+  std::shared_ptr<std::atomic<bool>> stopping_ = std::make_shared<std::atomic<bool>>(false);
+  std::mutex mutex_;  // guards thread_
+  std::thread thread_;
+};
+
+class ThreadedOperations : public OperationQueue {
+ public:
+  ThreadedOperations(std::string name, QualityOfService quality) : name_(std::move(name)), quality_(quality) {}
+  ~ThreadedOperations() override {
+    std::vector<std::thread> threads;
+    {
+      const std::lock_guard lock(shared_->mutex);
+      shared_->stopping = true;
+      threads.swap(threads_);
+    }
+    shared_->changed.notify_all();
+    for (std::thread& thread : threads) {
+      if (thread.get_id() == std::this_thread::get_id()) {
+        thread.detach();
+      } else {
+        thread.join();
+      }
+    }
+  }
+  void addOperation(Block operation) override {
+    const std::lock_guard lock(shared_->mutex);
+    shared_->waiting.push_back(std::move(operation));
+    constexpr std::size_t limit = 2;
+    if (shared_->idle == 0 && threads_.size() < limit) threads_.emplace_back([shared = shared_] { work(*shared); });
+    shared_->changed.notify_one();
+  }
+  std::string name() const override { return name_; }
+  QualityOfService qualityOfService() const override { return quality_; }
+
+ private:
+  struct Shared {
+    std::mutex mutex;  // guards all below
+    std::condition_variable changed;
+    std::deque<Block> waiting;
+    std::size_t idle = 0;
+    bool stopping = false;
+  };
+  static void work(Shared& shared) {
+    std::unique_lock lock(shared.mutex);
+    for (;;) {
+      ++shared.idle;
+      shared.changed.wait(lock, [&] { return shared.stopping || !shared.waiting.empty(); });
+      --shared.idle;
+      if (shared.waiting.empty()) return;
+      Block operation = std::move(shared.waiting.front());
+      shared.waiting.pop_front();
+      lock.unlock();
+      operation();
+      operation = nullptr;
+      lock.lock();
+    }
+  }
+  std::string name_;
+  QualityOfService quality_;
+  std::shared_ptr<Shared> shared_ = std::make_shared<Shared>();
+  std::vector<std::thread> threads_;  // guarded by shared_->mutex
+};
+
+/// Posts its handler to the queue again and again until it is gone.
+class QueueTimer : public TimerSource {
+ public:
+  QueueTimer(std::shared_ptr<DispatchQueue> queue, std::chrono::nanoseconds interval, Block handler)
+      : alive_(std::make_shared<State>()) {
+    alive_->queue = std::move(queue);
+    alive_->interval = interval;
+    alive_->handler = std::move(handler);
+    alive_->queue->async([state = alive_] { fire(state); });
+  }
+  ~QueueTimer() override { alive_->running = false; }
+
+ private:
+  struct State {
+    std::shared_ptr<DispatchQueue> queue;
+    std::chrono::nanoseconds interval;
+    Block handler;
+    std::atomic<bool> running = true;
+  };
+  static void fire(const std::shared_ptr<State>& state) {
+    if (!state->running) return;
+    state->handler();
+    // Weak, so that a stopped timer does not keep its queue for a whole interval.
+    const std::weak_ptr<State> weak = state;
+    state->queue->after(state->interval, [weak] {
+      if (const auto again = weak.lock()) fire(again);
+    });
+  }
+  std::shared_ptr<State> alive_;
+};
+
+}  // namespace
+
+GLibQueues::GLibQueues() : main_(std::make_unique<MainQueue>()) {}
+GLibQueues::~GLibQueues() = default;
+
+DispatchQueue& GLibQueues::main() { return *main_; }
+
+std::shared_ptr<DispatchQueue> GLibQueues::makeSerialQueue(const std::string& label) {
+  return std::make_shared<SerialQueue>(label);
+}
+
+std::shared_ptr<OperationQueue> GLibQueues::makeOperationQueue(const std::string& name, QualityOfService quality) {
+  return std::make_shared<ThreadedOperations>(name, quality);
+}
+
+std::unique_ptr<TimerSource> GLibQueues::makeTimer(std::shared_ptr<DispatchQueue> queue, std::chrono::nanoseconds interval,
+                                                   std::chrono::nanoseconds, Block handler) {
+  return std::make_unique<QueueTimer>(std::move(queue), interval, std::move(handler));
+}
+
+}  // namespace vaelo

@@ -1,0 +1,157 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/files/local_resource_values.h"
+
+#include <fcntl.h>
+#include <glib.h>
+#include <sys/stat.h>
+
+#include <cerrno>
+
+#include "host/drive/alias_file.h"
+#include "host/drive/item_attributes.h"
+#include "host/drive/packages.h"
+#include "host/drive/promise_file.h"
+#include "host/files/file_times.h"
+#include "host/files/system_error.h"
+
+namespace vaelo {
+
+/// Answers keys for one item, either from what stands on the disk or from a promise.
+class LocalResourceValues::Reader {
+ public:
+  Reader(LocalResourceValues& owner, const URL& url) : owner_(owner), url_(url), name_(url.lastPathComponent()) {}
+
+  int readFile(const std::string& path) {
+    return statx(AT_FDCWD, path.c_str(), AT_SYMLINK_NOFOLLOW, STATX_BASIC_STATS | STATX_BTIME, &info_) == 0 ? 0 : errno;
+  }
+  void usePromise(PromiseInfo promise) { promise_ = std::move(promise); }
+
+  Value valueOf(ResourceKey key) {
+    switch (key) {
+      case ResourceKey::Name: return name_;
+      case ResourceKey::LocalizedName: return takenDisplayName();
+      case ResourceKey::TypeIdentifier: return typeIdentifier();
+      case ResourceKey::LocalizedTypeDescription: return typeDescription();
+      case ResourceKey::FileSize:
+      case ResourceKey::TotalFileSize: return size();
+      case ResourceKey::CreationDate: return creationDate();
+      case ResourceKey::ContentModificationDate: return modificationDate();
+      case ResourceKey::IsDirectory: return isFolder();
+      case ResourceKey::IsPackage: return isPackage();
+      case ResourceKey::IsRegularFile: return promise_ ? !promise_->package : S_ISREG(info_.stx_mode);
+      case ResourceKey::HasHiddenExtension: return false;
+      case ResourceKey::ParentDirectoryURL: return url_.deletingLastPathComponent();
+      case ResourceKey::IsShared: return role().has_value();
+      case ResourceKey::SharedItemRole: return role() ? Value(*role()) : Value();
+      case ResourceKey::DownloadingStatus: return downloadingStatus();
+      case ResourceKey::DocumentIdentifier: return documentIdentifier();
+      case ResourceKey::ThumbnailDictionary: return {};
+    }
+    return {};
+  }
+
+ private:
+  bool isFolder() const { return promise_ ? promise_->package : S_ISDIR(info_.stx_mode); }
+  bool isPackage() const { return promise_ ? promise_->package : S_ISDIR(info_.stx_mode) && isPackageName(name_); }
+  bool isAlias() const {
+    return !promise_ && S_ISREG(info_.stx_mode) && isAliasName(name_) && readAliasFile(url_.path()).value;
+  }
+  /// A person reads text, whatever bytes the name has.
+  std::string takenDisplayName() const {
+    char* text = g_filename_display_name(name_.c_str());
+    std::string result = text;
+    g_free(text);
+    return result;
+  }
+  std::string typeIdentifier() const {
+    if (!promise_ && S_ISLNK(info_.stx_mode)) return "public.symlink";
+    if (isFolder() && !isPackage()) return "public.folder";
+    const auto type = owner_.types_.preferredIdentifierForExtension(url_.pathExtension());
+    return type.value_or(isPackage() ? "com.marrow.package" : "public.data");
+  }
+  Value typeDescription() const {
+    if (isAlias()) return "Alias";
+    const auto text = owner_.types_.description(typeIdentifier());
+    return text ? Value(*text) : Value();
+  }
+  Value size() const {
+    if (promise_) return Value(promise_->size);
+    if (S_ISDIR(info_.stx_mode)) return {};
+    return Value(static_cast<std::uint64_t>(info_.stx_size));
+  }
+  Value creationDate() const {
+    if (promise_) return promise_->created ? Value(*promise_->created) : Value();
+    return info_.stx_mask & STATX_BTIME ? Value(dateOf(info_.stx_btime)) : Value();
+  }
+  Value modificationDate() const {
+    if (promise_) return promise_->modified ? Value(*promise_->modified) : Value();
+    return dateOf(info_.stx_mtime);
+  }
+  const std::optional<std::string>& role() {
+    if (!roleRead_) {
+      roleRead_ = true;
+      role_ = promise_ ? promise_->share : sharedItemRoleOf(url_.path());
+    }
+    return role_;
+  }
+  Value downloadingStatus() const {
+    if (promise_) return DownloadingStatusNotDownloaded;
+    return owner_.layout_.isInMirror(url_.path()) ? Value(DownloadingStatusCurrent) : Value();
+  }
+  Value documentIdentifier() const {
+    const Result<std::int64_t> id = owner_.index_.documentIDFor(url_.path(), true);
+    return id.value && *id.value != 0 ? Value(*id.value) : Value();
+  }
+
+  LocalResourceValues& owner_;
+  const URL& url_;
+  std::string name_;
+  struct statx info_ {};
+  std::optional<PromiseInfo> promise_;
+  std::optional<std::string> role_;
+  bool roleRead_ = false;
+};
+
+LocalResourceValues::LocalResourceValues(const DriveLayout& layout, DocumentIndex& index, TypeIdentifiers& types)
+    : layout_(layout), index_(index), types_(types) {}
+
+namespace {
+
+template <typename Reader>
+ResourceMap valuesFor(Reader& reader, const std::vector<ResourceKey>& keys) {
+  ResourceMap values;
+  for (const ResourceKey key : keys) {
+    Value value = reader.valueOf(key);
+    if (value.isPresent()) values.emplace(key, std::move(value));
+  }
+  return values;
+}
+
+}  // namespace
+
+Result<ResourceMap> LocalResourceValues::resourceValues(const URL& url, const std::vector<ResourceKey>& keys) {
+  Reader reader(*this, url);
+  if (const int failure = reader.readFile(url.path())) return errorFromErrno(failure, url.path(), false);
+  return valuesFor(reader, keys);
+}
+
+Result<ResourceMap> LocalResourceValues::promisedItemResourceValues(const URL& url, const std::vector<ResourceKey>& keys) {
+  Reader reader(*this, url);
+  const int failure = reader.readFile(url.path());
+  if (failure == 0) return valuesFor(reader, keys);
+  if (failure != ENOENT) return errorFromErrno(failure, url.path(), false);
+  const std::optional<std::string> physical = physicalPathOf(url.path());
+  if (!physical) return errorFromErrno(ENOENT, url.path(), false);
+  Result<PromiseInfo> promise = readPromise(*physical);
+  if (!promise.value) return *promise.error;
+  reader.usePromise(std::move(*promise.value));
+  return valuesFor(reader, keys);
+}
+
+bool LocalResourceValues::promisedItemIsReachable(const URL& url) { return physicalPathOf(url.path()).has_value(); }
+
+URL LocalResourceValues::resolvingSymlinks(const URL& url) { return URL(realLocation(url.path())); }
+
+Result<URL> LocalResourceValues::resolveAliasFile(const URL& url) { return readAliasFile(url.path()); }
+
+}  // namespace vaelo
