@@ -52,7 +52,7 @@ void NavController::setupInitialViewController() {
     VLO_DEBUG("Vaelo is enabled");
     setToolbarHidden(false);
     const DocumentListControllerRef root = Platform::current().screens.makeRootList();
-    VLO_DEBUG("Contained items: %@", root ? root->containedItems() : std::vector<URL>());
+    VLO_DEBUG("Contained items: %@", root ? std::optional(root->containedItems()) : std::nullopt);
     if (root) {
       initNewListController(root);
       setViewControllers({root}, false);

@@ -109,14 +109,12 @@ ViewControllerRef NavController::documentListControllerViewControllerForPreviewi
     const DocumentListControllerRef&, const URL& url) {
   VLO_USER_ACTION("DLC Action Firmpress Peek");
   VLO_DEBUG("DLC asking for PeekVC for %@", url);
-  const Result<ResourceMap> read = Platform::current().resourceValues.promisedItemResourceValues(
+  Result<ResourceMap> read = Platform::current().resourceValues.promisedItemResourceValues(
       url, {ResourceKey::IsPackage, ResourceKey::IsRegularFile, ResourceKey::IsDirectory});
-  const auto flag = [&read](ResourceKey key) {
-    const auto found = read.value ? read.value->find(key) : ResourceMap::const_iterator();
-    return read.value && found != read.value->end() && found->second.boolValue();
-  };
+  ResourceMap values = std::move(read.value).value_or(ResourceMap());
+  const auto flag = [&values](ResourceKey key) { return values[key].boolValue(); };
   if (flag(ResourceKey::IsPackage) || flag(ResourceKey::IsRegularFile)) {
-    // The manager of what is shown below the peek goes on following its document.
+    // Not by replaceItemManager: a peek does not tell the present manager to stop following its document.
     const std::shared_ptr<DRItem> item = DRItem::initWithURL(url);
     itemManager_ = PreviewItemManager::newItemManagerWithModeNavController(0, sharedSelf(this));
     return itemManager_->prepareToPreviewItem(item);
