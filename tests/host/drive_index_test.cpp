@@ -93,6 +93,7 @@ TEST_F(DriveIndexTest, ACopyInTheOldPlaceOfAMovedDocumentIsStillACopy) {
   const std::int64_t id = idOf(drive + "/a.txt");
   rename(drive + "/a.txt", drive + "/moved.txt");
   copyWithAttributes(drive + "/moved.txt", drive + "/a.txt");
+  for (int i = 0; i < 10; ++i) copyWithAttributes(drive + "/moved.txt", drive + "/copy" + std::to_string(i));
   EXPECT_EQ(placeOf(id), drive + "/moved.txt");
   EXPECT_NE(idOf(drive + "/a.txt"), id);
   EXPECT_EQ(idOf(drive + "/moved.txt"), id);
@@ -205,6 +206,19 @@ TEST_F(DriveIndexTest, ADatabaseDamagedInTheMiddleIsRebuilt) {
   damage(bytes);
   EXPECT_EQ(placeOf(id), drive + "/f7");
   EXPECT_TRUE(index->wasRebuilt());
+}
+
+TEST_F(DriveIndexTest, WhatACrashLeftInTheLogIsKept) {
+  link("a.txt", drive + "/link");  // only the database knows a link's identifier
+  const std::int64_t id = idOf(drive + "/link");
+  const std::string database = read(data + "/index.sqlite");
+  const std::string writeAheadLog = read(data + "/index.sqlite-wal");
+  index.reset();
+  write(data + "/index.sqlite", database);
+  write(data + "/index.sqlite-wal", writeAheadLog);
+  reopen();
+  EXPECT_TRUE(placeOf(id) == drive + "/link");
+  EXPECT_FALSE(index->wasRebuilt());
 }
 
 TEST_F(DriveIndexTest, AnEmptyOrLostDatabaseCostsNoIdentifier) {

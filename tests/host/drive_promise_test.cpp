@@ -95,7 +95,8 @@ TEST_F(DrivePromiseTest, DamagedPromisesAreErrorsOrGaps) {
   write(path, std::string(70 * 1024, '#'));
   EXPECT_EQ(readPromise(path).error->code, FileErrorCode::ReadUnknown);
   std::filesystem::remove(path);
-  link("/etc/passwd", path);
+  write(root + "/elsewhere", "[Promise]\nSize=1\n");
+  link(root + "/elsewhere", path);
   EXPECT_FALSE(readPromise(path));
   std::filesystem::remove(path);
   ASSERT_EQ(::mkfifo(path.c_str(), 0600), 0);
