@@ -1,12 +1,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/drive/document_database.h"
 
-#include <fcntl.h>
 #include <sqlite3.h>
 #include <stdio.h>
 
 #include <cerrno>
-#include <cstring>
 
 #include "host/drive/small_file.h"
 
@@ -120,24 +118,24 @@ std::optional<Error> DocumentDatabase::openLocked() {
   return error;
 }
 
-bool DocumentDatabase::moveAside() {
+int DocumentDatabase::moveAside() {
   std::string aside;
-  int number = 0;
-  do {
-    aside = file_ + ".damaged-" + std::to_string(++number);
-    if (::renameat2(AT_FDCWD, file_.c_str(), AT_FDCWD, aside.c_str(), RENAME_NOREPLACE) == 0) break;
-    if (errno != EEXIST) return false;
-  } while (true);
+  int status = EEXIST;
+  for (int number = 1; status == EEXIST; ++number) {
+    aside = file_ + ".damaged-" + std::to_string(number);
+    status = renameWithoutReplacing(file_, aside);
+  }
+  if (status != 0) return status;
   // The log belongs to the database and would otherwise be played into the new one.
   ::rename((file_ + "-wal").c_str(), (aside + "-wal").c_str());
   ::remove((file_ + "-shm").c_str());
   log_.write(LogType::Error, "drive: the document index is damaged; moved aside to " + aside + " and rebuilt from the mirror");
-  return true;
+  return 0;
 }
 
 std::optional<Error> DocumentDatabase::rebuild() {
   close();
-  if (!moveAside()) return errorFromErrno(errno, file_, FileAccess::Write);
+  if (const int status = moveAside()) return errorFromErrno(status, file_, FileAccess::Write);
   if (const int status = tryOpen()) {
     Error error = errorFor(status);
     close();

@@ -57,7 +57,8 @@ class DocumentDatabase {
   std::optional<Error> openLocked();
   int tryOpen();
   std::optional<Error> rebuild();
-  bool moveAside();
+  /// Returns 0 or the error number.
+  int moveAside();
   void close();
   Error errorFor(int status) const;
   /// Runs `work`, which returns a SQLite status, and once more on a rebuilt database when that one turns out to be damaged.

@@ -140,8 +140,11 @@ std::optional<Error> writeSmallFile(const std::string& path, std::string_view by
     if (!writeAll(handle.get(), bytes) || ::fsync(handle.get()) != 0) failed = errno;
   }
   if (failed == 0) {
-    const int flag = replacing ? 0 : RENAME_NOREPLACE;
-    if (::renameat2(AT_FDCWD, temporary.c_str(), AT_FDCWD, path.c_str(), static_cast<unsigned>(flag)) != 0) failed = errno;
+    if (!replacing) {
+      failed = renameWithoutReplacing(temporary, path);
+    } else if (::rename(temporary.c_str(), path.c_str()) != 0) {
+      failed = errno;
+    }
   }
   if (failed != 0) {
     ::unlink(temporary.c_str());
@@ -149,6 +152,14 @@ std::optional<Error> writeSmallFile(const std::string& path, std::string_view by
   }
   if (!flushFolder(path.substr(0, path.rfind('/') + 1))) return errorFromErrno(errno, path, FileAccess::Write);
   return std::nullopt;
+}
+
+int renameWithoutReplacing(const std::string& from, const std::string& to) {
+  if (::renameat2(AT_FDCWD, from.c_str(), AT_FDCWD, to.c_str(), RENAME_NOREPLACE) == 0) return 0;
+  if (errno != EINVAL) return errno;
+  // Network file systems don't know the flag; a second name that is there fails as well.
+  if (::link(from.c_str(), to.c_str()) != 0) return errno;
+  return ::unlink(from.c_str()) == 0 ? 0 : errno;
 }
 
 Result<KeyFile> readKeyFile(const std::string& path) {

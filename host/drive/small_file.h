@@ -29,6 +29,9 @@ Result<std::string> readSmallFile(const std::string& path);
 /// With `replacing` false an existing file stays and the error is 516. Any thread.
 std::optional<Error> writeSmallFile(const std::string& path, std::string_view bytes, bool replacing = true);
 
+/// Renames a regular file and fails with EEXIST rather than replace one. Returns 0 or the error number.
+int renameWithoutReplacing(const std::string& from, const std::string& to);
+
 struct KeyFileFree {
   void operator()(GKeyFile* file) const { g_key_file_free(file); }
 };
