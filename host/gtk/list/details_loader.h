@@ -1,0 +1,41 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <functional>
+#include <string>
+#include <vector>
+
+#include "host/gtk/list/folder_model.h"
+#include "host/gtk/list/worker.h"
+
+namespace vaelo {
+
+/// Fills in the details of the rows that are seen. Main thread.
+///
+/// Rows ask when they are drawn. The names go to a worker in small batches, the ones asked for last first, since they are
+/// what is on screen now; a row that shows something else by the time its turn comes costs nothing.
+class DetailsLoader {
+ public:
+  /// `loaded` is called for each item whose details came.
+  DetailsLoader(FolderModel& model, std::function<void(FolderItem&)> loaded);
+
+  /// The folder of the names; empty where names are paths. What is on its way for another folder is dropped.
+  void setFolder(const std::string& folder);
+  void setThumbnailPixels(int pixels) { thumbnailPixels_ = pixels; }
+  /// Does nothing when the details are fresh or already asked for.
+  void request(FolderItem& item);
+
+ private:
+  void readNext();
+
+  FolderModel& model_;
+  std::function<void(FolderItem&)> loaded_;
+  std::string folder_;
+  int thumbnailPixels_ = 48;
+  unsigned generation_ = 0;
+  bool reading_ = false;
+  std::vector<std::string> wanted_;
+  Worker worker_;
+};
+
+}  // namespace vaelo

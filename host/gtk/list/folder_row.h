@@ -1,0 +1,42 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <gtk/gtk.h>
+
+#include <functional>
+#include <unordered_set>
+
+#include "host/gtk/list/folder_item.h"
+#include "host/gtk/list/icon_table.h"
+
+namespace vaelo {
+
+/// What all rows of a list share. Outlives them.
+struct RowContext {
+  GtkWidget* list = nullptr;  ///< the scrolled list; rows well outside of what it shows don't draw
+  bool grid = false;
+  bool editing = false;  ///< check marks are shown
+  IconTable* icons = nullptr;
+  std::function<bool(const FolderItem&)> isSelected;
+  std::function<void(FolderItem&)> drawn;  ///< the item is on screen or about to be
+  std::unordered_set<GtkWidget*> rows;
+};
+
+constexpr int ListIconSize = 40;
+constexpr int GridIconSize = 64;
+
+/// A row or grid cell: icon or thumbnail, name, second line, check mark, and a cloud for what is not downloaded. One widget
+/// that draws all of it: a list makes two hundred rows before it shows the first, and labels would be most of that time.
+/// Main thread.
+GtkWidget* folderRowNew(RowContext& context);
+/// Shows `item` (a FolderItem object) from now on; null shows nothing.
+void folderRowSetItem(GtkWidget* row, GObject* item);
+GObject* folderRowItem(GtkWidget* row);
+/// The item's details or kind changed.
+void folderRowItemChanged(GtkWidget* row);
+/// The list scrolled or grew: rows that didn't draw while far away look again.
+void folderRowsScrolled(RowContext& context);
+/// The row at or above `widget`, or null.
+GtkWidget* folderRowAt(GtkWidget* widget);
+
+}  // namespace vaelo

@@ -1,0 +1,139 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <adwaita.h>
+
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "host/gtk/list/details_loader.h"
+#include "host/gtk/list/folder_model.h"
+#include "host/gtk/list/folder_monitor.h"
+#include "host/gtk/list/folder_row.h"
+#include "host/gtk/list/icon_table.h"
+#include "host/gtk/list/type_ahead.h"
+#include "host/gtk/list/worker.h"
+
+namespace vaelo {
+
+/// What a FolderView tells its owner. All on the main thread; unset ones are not called. Names are bytes as they stand in
+/// the folder (for promises the item's name), or the paths of supplied entries.
+struct FolderViewEvents {
+  /// A row was pressed, or Enter on it, outside of editing.
+  std::function<void(const std::string& name)> activated;
+  /// The list has other items, or others in another order, than before; also after the first reading.
+  std::function<void()> itemsChanged;
+  /// The user chose other rows, or selected ones are gone. Not called for setSelection().
+  std::function<void()> selectionChanged;
+  /// The folder was removed or moved away; the list keeps what it shows.
+  std::function<void()> folderRemoved;
+  /// The folder could not be read; the view shows that as well.
+  std::function<void(int errorNumber)> readFailed;
+  /// A secondary click, a long press or the menu key on a row, at a place in `view`'s coordinates.
+  std::function<void(const std::string& name, GtkWidget* view, const GdkRectangle& at)> contextRequested;
+};
+
+/// A list or icon grid of one folder, or of entries that the owner supplies. Main thread.
+///
+/// The phases of opening a folder: (1) a worker reads the names and sorts them, nothing else, 100,000 in some 60 ms; (2)
+/// they are shown in their final order; (3) rows that are drawn ask for their details and icons, in batches on workers,
+/// visible ones first; (4) what other programs do is gathered for 100 ms, looked up and merged on a worker, and comes as
+/// splices. The main thread never touches the disk.
+class FolderView {
+ public:
+  enum class Mode { List, Grid };
+
+  FolderView();
+  ~FolderView();
+  FolderView(const FolderView&) = delete;
+  FolderView& operator=(const FolderView&) = delete;
+
+  /// Takes part in a container like any other; owned by this.
+  GtkWidget* widget() const { return GTK_WIDGET(pages_); }
+  void setEvents(FolderViewEvents events) { events_ = std::move(events); }
+
+  /// Shows the folder at an absolute path: reads it, and follows its changes until another call.
+  void setFolder(const std::string& path);
+  /// Shows these entries in this order, until another call.
+  void setEntries(std::vector<FolderEntry> entries);
+  /// What the page says when there is nothing to list; the default is of an empty folder.
+  void setEmptyText(const std::string& title, const std::string& description);
+  /// Reads the folder and the rows' details again. Rows keep their place and selection.
+  void refresh();
+
+  void setMode(Mode mode);
+  Mode mode() const { return mode_; }
+  /// Rows have check marks, and a press selects instead of opening. Leaving unselects all, without an event.
+  void setEditing(bool editing);
+  bool editing() const { return context_.editing; }
+
+  std::size_t itemCount() const { return model_.itemCount(); }
+  std::string nameAt(std::size_t i) const { return std::string(model_.nameAt(i)); }
+  EntryKind kindAt(std::size_t i) const { return model_.kindAt(i); }
+  /// True once the folder was read, or entries were supplied.
+  bool loaded() const { return loaded_; }
+  std::vector<std::string> selection() const { return model_.selectedNames(); }
+  void setSelection(const std::vector<std::string>& names);
+
+  /// Brings the row on screen; false when it isn't listed.
+  bool scrollTo(const std::string& name);
+  /// Pixels from the top, for taking a place up again.
+  double scrollPosition() const;
+  void setScrollPosition(double position);
+  /// Moves the keyboard's focus to the list.
+  void grabFocus();
+  /// The model behind the rows, for the owner's own tests and measurements.
+  FolderModel& model() { return model_; }
+
+ private:
+  void makeList();
+  void makePages();
+  void connectKeys();
+  void connectContextGestures();
+  void showPage();
+  void read();
+  void folderRead(std::shared_ptr<const FolderSnapshot> next, const std::vector<Splice>& splices, int errorNumber);
+  void folderChanged(FolderChanges changes);
+  void lookUpChanges();
+  void pressed(guint position);
+  bool keyPressed(guint key, GdkModifierType modifiers);
+  void requestContext(double x, double y);
+  void requestContextAtFocus();
+  void detailsAreOld(FolderItem& item);
+  void allDetailsAreOld();
+  void redrawRows();
+  GtkAdjustment* adjustment() const;
+  FolderItem* focusedItem() const;
+
+  FolderViewEvents events_;
+  std::string folder_;  // empty: entries
+  unsigned generation_ = 0;
+  bool loaded_ = false;
+  bool settingSelection_ = false;
+  int errorNumber_ = 0;
+  FolderChanges pending_;
+  bool updating_ = false;
+  Mode mode_ = Mode::List;
+
+  FolderModel model_;
+  IconTable icons_;
+  RowContext context_;
+  DetailsLoader details_;
+  FolderMonitor monitor_;
+  TypeAhead typeAhead_;
+  Worker reader_;
+
+  GtkStack* pages_;
+  GtkWidget* scroller_;
+  GtkWidget* list_ = nullptr;
+  GtkWidget* spinner_;
+  AdwStatusPage* emptyPage_;
+  AdwStatusPage* errorPage_;
+  guint spinnerTimer_ = 0;
+  gint64 lastPull_ = 0;
+};
+
+}  // namespace vaelo

@@ -1,0 +1,110 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+// Keys and gestures of FolderView.
+#include <array>
+
+#include "host/gtk/list/folder_view.h"
+
+namespace vaelo {
+namespace {
+
+/// The row below a list's own item widget, or null.
+GtkWidget* rowInside(GtkWidget* widget) {
+  if (!widget) return nullptr;
+  if (GtkWidget* row = folderRowAt(widget)) return row;
+  GtkWidget* child = gtk_widget_get_first_child(widget);
+  return child ? folderRowAt(child) : nullptr;
+}
+
+FolderItem* itemOfRow(GtkWidget* row) {
+  GObject* item = row ? folderRowItem(row) : nullptr;
+  return item ? &folderItemOf(item) : nullptr;
+}
+
+}  // namespace
+
+FolderItem* FolderView::focusedItem() const {
+  GtkRoot* root = gtk_widget_get_root(list_);
+  GtkWidget* focus = root ? gtk_root_get_focus(root) : nullptr;
+  if (!focus || focus == list_ || !gtk_widget_is_ancestor(focus, list_)) return nullptr;
+  return itemOfRow(rowInside(focus));
+}
+
+void FolderView::connectKeys() {
+  GtkEventController* keys = gtk_event_controller_key_new();
+  // Before the rows, which would take the space bar for themselves.
+  gtk_event_controller_set_propagation_phase(keys, GTK_PHASE_CAPTURE);
+  g_signal_connect(keys, "key-pressed",
+                   G_CALLBACK(+[](GtkEventControllerKey*, guint key, guint, GdkModifierType modifiers, FolderView* self) {
+                     return static_cast<gboolean>(self->keyPressed(key, modifiers));
+                   }),
+                   this);
+  gtk_widget_add_controller(widget(), keys);
+}
+
+bool FolderView::keyPressed(guint key, GdkModifierType modifiers) {
+  const bool plain = !(modifiers & (GDK_CONTROL_MASK | GDK_ALT_MASK | GDK_SUPER_MASK | GDK_META_MASK));
+  if (key == GDK_KEY_F5) {
+    refresh();
+    return true;
+  }
+  if (key == GDK_KEY_Menu || (key == GDK_KEY_F10 && (modifiers & GDK_SHIFT_MASK))) {
+    requestContextAtFocus();
+    return true;
+  }
+  const gint64 now = g_get_monotonic_time();
+  FolderItem* focused = focusedItem();
+  const std::size_t last = model_.itemCount() - 1;
+  const std::size_t focusedRow = focused ? model_.indexOf(focused->name).value_or(last) : last;
+  if (key == GDK_KEY_space && plain && context_.editing && focused && !typeAhead_.isTyping(now)) {
+    pressed(static_cast<guint>(focusedRow));
+    return true;
+  }
+  const gunichar letter = gdk_keyval_to_unicode(key);
+  if (!plain || !letter || !g_unichar_isprint(letter) || !model_.itemCount()) return false;
+  if (letter == ' ' && !typeAhead_.isTyping(now)) return false;
+  std::array<char, 8> utf8{};
+  g_unichar_to_utf8(letter, utf8.data());
+  const auto found = typeAhead_.type(model_, utf8.data(), now, focusedRow);
+  if (!found) return true;
+  const std::string name = nameAt(*found);
+  scrollTo(name);
+  // The list has a widget for the row at once, which it places with the next frame.
+  if (FolderItem* item = model_.liveItem(name); item && item->row) gtk_widget_grab_focus(gtk_widget_get_parent(item->row));
+  return true;
+}
+
+void FolderView::connectContextGestures() {
+  GtkGesture* click = gtk_gesture_click_new();
+  gtk_gesture_single_set_button(GTK_GESTURE_SINGLE(click), GDK_BUTTON_SECONDARY);
+  g_signal_connect_swapped(click, "pressed",
+                           G_CALLBACK(+[](FolderView* self, int, double x, double y) { self->requestContext(x, y); }), this);
+  gtk_widget_add_controller(scroller_, GTK_EVENT_CONTROLLER(click));
+
+  GtkGesture* press = gtk_gesture_long_press_new();
+  // In the capture phase, so that it can keep the row from taking the same press for an activation.
+  gtk_event_controller_set_propagation_phase(GTK_EVENT_CONTROLLER(press), GTK_PHASE_CAPTURE);
+  g_signal_connect(press, "pressed", G_CALLBACK(+[](GtkGesture* gesture, double x, double y, FolderView* self) {
+                     gtk_gesture_set_state(gesture, GTK_EVENT_SEQUENCE_CLAIMED);
+                     self->requestContext(x, y);
+                   }),
+                   this);
+  gtk_widget_add_controller(scroller_, GTK_EVENT_CONTROLLER(press));
+}
+
+void FolderView::requestContext(double x, double y) {
+  FolderItem* item = itemOfRow(rowInside(gtk_widget_pick(scroller_, x, y, GTK_PICK_DEFAULT)));
+  if (!item || !events_.contextRequested) return;
+  const GdkRectangle at{static_cast<int>(x), static_cast<int>(y), 1, 1};
+  events_.contextRequested(std::string(item->name), scroller_, at);
+}
+
+void FolderView::requestContextAtFocus() {
+  FolderItem* item = focusedItem();
+  graphene_rect_t bounds;
+  if (!item || !events_.contextRequested || !gtk_widget_compute_bounds(item->row, scroller_, &bounds)) return;
+  const GdkRectangle at{static_cast<int>(bounds.origin.x), static_cast<int>(bounds.origin.y),
+                        static_cast<int>(bounds.size.width), static_cast<int>(bounds.size.height)};
+  events_.contextRequested(std::string(item->name), scroller_, at);
+}
+
+}  // namespace vaelo
