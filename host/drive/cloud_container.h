@@ -12,8 +12,8 @@ inline constexpr const char* ContainerManifestName = ".vaelo-container";
 /// A container folder and what its manifest says, as they were when it was read. Immutable, so safe from any thread.
 class LocalContainer : public CloudContainer {
  public:
-  /// Reads a container; null when there is no folder of that name (a link is none). One whose manifest is absent is called by
-  /// its identifier, and so is one whose manifest is broken, which the log tells.
+  /// Reads a container; null when there is no folder of that name (a link is none). One whose manifest is absent is called
+  /// by its identifier, and so is one whose manifest is broken, which the log tells.
   static CloudContainerRef read(const DriveLayout& layout, const std::string& identifier, LogSink& log);
 
   std::string identifier() const override { return identifier_; }

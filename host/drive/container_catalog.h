@@ -11,8 +11,8 @@
 
 namespace vaelo {
 
-/// The containers of the mirror. Cheap enough for the main thread: what was read is kept until the file status of the mirror, a
-/// container or its manifest changes, so a call costs three of them for each container. Safe from any thread.
+/// The containers of the mirror. Cheap enough for the main thread: what was read is kept until the file status of the
+/// mirror, a container or its manifest changes, so a call costs three of them for each container. Safe from any thread.
 class ContainerCatalog {
  public:
   ContainerCatalog(const DriveLayout& layout, LogSink& log) : layout_(layout), log_(log) {}

@@ -43,7 +43,8 @@ class DocumentDatabase::Statement {
   std::int64_t integer(int column) { return sqlite3_column_int64(statement_, column); }
   std::string bytes(int column) {
     const void* data = sqlite3_column_blob(statement_, column);
-    return data ? std::string(static_cast<const char*>(data), static_cast<std::size_t>(sqlite3_column_bytes(statement_, column)))
+    return data ? std::string(static_cast<const char*>(data),
+                              static_cast<std::size_t>(sqlite3_column_bytes(statement_, column)))
                 : std::string();
   }
 
@@ -129,7 +130,8 @@ int DocumentDatabase::moveAside() {
   // The log belongs to the database and would otherwise be played into the new one.
   ::rename((file_ + "-wal").c_str(), (aside + "-wal").c_str());
   ::remove((file_ + "-shm").c_str());
-  log_.write(LogType::Error, "drive: the document index is damaged; moved aside to " + aside + " and rebuilt from the mirror");
+  log_.write(LogType::Error,
+             "drive: the document index is damaged; moved aside to " + aside + " and rebuilt from the mirror");
   return 0;
 }
 
@@ -168,7 +170,8 @@ std::optional<Error> DocumentDatabase::run(const std::function<int()>& work) {
 
 int DocumentDatabase::read(const char* where, const std::function<void(Statement&)>& bind, std::vector<DocumentRow>& rows) {
   rows.clear();
-  Statement statement(connection_, std::string("SELECT id, device, inode, born, path, carried FROM documents WHERE ") + where);
+  Statement statement(connection_,
+                      std::string("SELECT id, device, inode, born, path, carried FROM documents WHERE ") + where);
   bind(statement);
   int status = statement.step();
   for (; status == SQLITE_ROW; status = statement.step()) {
@@ -185,8 +188,9 @@ int DocumentDatabase::read(const char* where, const std::function<void(Statement
 }
 
 int DocumentDatabase::write(const char* verb, const DocumentRow& row) {
-  Statement statement(connection_, std::string(verb) + " INTO documents(id, device, inode, born, path, carried)"
-                                                       " VALUES(?, ?, ?, ?, ?, ?)");
+  Statement statement(connection_, std::string(verb) +
+                                       " INTO documents(id, device, inode, born, path, carried)"
+                                       " VALUES(?, ?, ?, ?, ?, ?)");
   statement.bind(row.id);
   statement.bind(static_cast<std::int64_t>(row.device));
   statement.bind(static_cast<std::int64_t>(row.inode));
@@ -198,7 +202,11 @@ int DocumentDatabase::write(const char* verb, const DocumentRow& row) {
 
 Result<DocumentRow> DocumentDatabase::withID(std::int64_t id) {
   std::vector<DocumentRow> rows;
-  if (auto error = run([&] { return read("id = ?", [id](Statement& at) { at.bind(id); }, rows); })) return *error;
+  if (auto error = run([&] {
+        return read(
+            "id = ?", [id](Statement& at) { at.bind(id); }, rows);
+      }))
+    return *error;
   return rows.empty() ? Result<DocumentRow>() : Result<DocumentRow>(rows.front());
 }
 

@@ -25,13 +25,13 @@ struct DocumentRow {
   bool carried = true;    ///< the item itself carries the identifier too
 };
 
-/// The table of documents: SQLite in WAL mode, so that a crash loses no more than the last rows and several processes may use
-/// it. A damaged database is moved aside to FILE.damaged-N and filled anew. Blocking; safe from any thread; opened by
+/// The table of documents: SQLite in WAL mode, so that a crash loses no more than the last rows and several processes may
+/// use it. A damaged database is moved aside to FILE.damaged-N and filled anew. Blocking; safe from any thread; opened by
 /// the first call. Errors as those of DocumentIndex.
 class DocumentDatabase {
  public:
-  /// `remembered` gives the rows to fill a new database with after damage; `rebuilt`, which may be empty, is told that it was
-  /// done. Both are called under the lock, so they must not call back.
+  /// `remembered` gives the rows to fill a new database with after damage; `rebuilt`, which may be empty, is told that it
+  /// was done. Both are called under the lock, so they must not call back.
   DocumentDatabase(std::string file, LogSink& log, std::function<std::vector<DocumentRow>()> remembered,
                    std::function<void()> rebuilt);
   ~DocumentDatabase();

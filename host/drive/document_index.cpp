@@ -56,7 +56,8 @@ std::vector<DocumentRow> carriedRows(const std::string& mirror) {
 DocumentIndex::DocumentIndex(const DriveLayout& layout, LogSink& log, std::function<void()> rebuilt)
     : layout_(layout),
       log_(log),
-      database_(layout.indexFile(), log, [&layout] { return carriedRows(layout.mirrorRoot()); }, std::move(rebuilt)) {}
+      database_(
+          layout.indexFile(), log, [&layout] { return carriedRows(layout.mirrorRoot()); }, std::move(rebuilt)) {}
 
 Result<std::int64_t> DocumentIndex::documentIDFor(const std::string& path, bool create) {
   if (path.empty() || path.front() != '/' || path.find('\0') != std::string::npos) return notFound(path);

@@ -12,7 +12,6 @@
 #include "platform/logging.h"
 #include "platform/result.h"
 
-
 namespace vaelo {
 
 /// A document that the index knows, where it stands now.
@@ -26,8 +25,8 @@ struct IndexedDocument {
 /// Document identifiers, which stay with a document when it is renamed or moved, by this program or another.
 ///
 /// The item itself carries its identifier (extended attribute, or in its promise); the database remembers where it was seen
-/// last, and alone holds the identifiers of items that can carry none (links, file systems without attributes), told apart by
-/// device, inode and time of birth. So a lost or damaged database costs a walk of the mirror, not the identifiers.
+/// last, and alone holds the identifiers of items that can carry none (links, file systems without attributes), told apart
+/// by device, inode and time of birth. So a lost or damaged database costs a walk of the mirror, not the identifiers.
 ///
 /// Blocking; safe from any thread. The database is opened by the first call. Errors are those of FileManager: 640 for a full
 /// disk, 642 read-only, 513 no permission, 512 anything else the database says.
@@ -38,9 +37,9 @@ class DocumentIndex {
 
   /// Opens the database, makes it when there is none, and moves a damaged one aside and rebuilds it.
   std::optional<Error> open() { return database_.open(); }
-  /// The identifier of the item at `path` (logical or physical, final link not followed), above 0; one is made when it has none
-  /// and `create` is true, else 0. A copy that another program made with its attributes gets an identifier of its own while
-  /// the original exists. Error 4 when nothing is there.
+  /// The identifier of the item at `path` (logical or physical, final link not followed), above 0; one is made when it has
+  /// none and `create` is true, else 0. A copy that another program made with its attributes gets an identifier of its own
+  /// while the original exists. Error 4 when nothing is there.
   Result<std::int64_t> documentIDFor(const std::string& path, bool create);
   /// Where the document is now: where it was seen last, else the mirror is walked for it. Error 4 when it is nowhere.
   Result<IndexedDocument> resolve(std::int64_t id);

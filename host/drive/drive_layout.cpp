@@ -4,6 +4,7 @@
 #include <limits.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <vector>
 
 namespace vaelo {
@@ -42,7 +43,8 @@ std::optional<std::string> follow(const std::string& from, const std::string& na
   std::vector<std::string> pending = {name};  // the next component last
   int links = 0;
   while (!pending.empty()) {
-    const std::string next = std::move(pending.back());
+    std::string next;
+    next.swap(pending.back());
     pending.pop_back();
     if (next == ".") continue;
     if (next == "..") {

@@ -28,8 +28,8 @@ Error cloudError(int code, const std::string& path, const std::string& reason);
 /// The cloud-documents service on a local mirror alone. Nobody signed in: there are no containers to list and no default
 /// one, while the location tests and the container of a given item still answer, since the mirror stays.
 ///
-/// Made and destroyed on the main thread; calls come from any. It has no lock of its own: the layout is immutable, and account,
-/// catalog and index each guard what they keep.
+/// Made and destroyed on the main thread; calls come from any. It has no lock of its own: the layout is immutable, and
+/// account, catalog and index each guard what they keep.
 class LocalCloudDocuments : public CloudDocuments {
  public:
   /// `dataFolder`: absolute. On the first start the local account is made there (see makeLocalAccountIfAbsent); when that

@@ -19,8 +19,8 @@ class LocalFileProvider : public FileProvider {
 
   /// Errors: CloudDocumentsErrorDomain code 7 outside the mirror, FileErrorCode::NoSuchFile when nothing is there.
   void BookmarkableStringFromDocumentURL(const URL& url, std::function<void(Result<std::string>)> done) override;
-  /// Errors: FileErrorCode::Formatting for a string of another make, FileErrorCode::NoSuchFile when neither identifier nor path
-  /// leads to a document in the mirror.
+  /// Errors: FileErrorCode::Formatting for a string of another make, FileErrorCode::NoSuchFile when neither identifier nor
+  /// path leads to a document in the mirror.
   void DocumentURLFromBookmarkableString(const std::string& text, std::function<void(Result<URL>)> done) override;
 
  private:

@@ -7,7 +7,8 @@
 
 namespace vaelo {
 
-void walkTree(const std::string& root, const std::function<bool(const std::string& path, const struct stat& status)>& visit) {
+void walkTree(const std::string& root,
+              const std::function<bool(const std::string& path, const struct stat& status)>& visit) {
   std::string start = root;
   char* const roots[] = {start.data(), nullptr};
   const std::unique_ptr<FTS, int (*)(FTS*)> walk(::fts_open(roots, FTS_PHYSICAL | FTS_NOCHDIR, nullptr), ::fts_close);

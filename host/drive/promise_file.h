@@ -18,13 +18,13 @@ namespace vaelo {
 
 /// What a promise says of the item. Absent fields are not known.
 struct PromiseInfo {
-  std::string name;                     ///< the item's own name, one path component
-  std::uint64_t size = 0;               ///< bytes of the item's content
+  std::string name;        ///< the item's own name, one path component
+  std::uint64_t size = 0;  ///< bytes of the item's content
   std::optional<Date> modified;
   std::optional<Date> created;
-  bool package = false;                 ///< the item is a package (a folder shown as a document)
-  std::optional<std::string> share;     ///< SharedItemRoleOwner or SharedItemRoleParticipant
-  std::vector<std::string> tags;        ///< in the order in which they are kept
+  bool package = false;              ///< the item is a package (a folder shown as a document)
+  std::optional<std::string> share;  ///< SharedItemRoleOwner or SharedItemRoleParticipant
+  std::vector<std::string> tags;     ///< in the order in which they are kept
   std::optional<std::int64_t> documentID;
 };
 
@@ -47,8 +47,8 @@ std::optional<std::string> physicalPathOf(const std::string& path);
 /// Reads at most 64 KiB of a regular file. Errors: 260 no such file, 257 no permission, 256 damaged or anything else.
 /// For a short promise the file's name decides what the item is called, and a Name key that disagrees is ignored.
 Result<PromiseInfo> readPromise(const std::string& promisePath);
-/// Writes the promise of `info.name` into `folder`, replacing one that is there: a temporary name in the same folder, flushed,
-/// renamed, the folder flushed. Either the old or the new promise survives a crash. Errors: those of FileManager.
+/// Writes the promise of `info.name` into `folder`, replacing one that is there: a temporary name in the same folder,
+/// flushed, renamed, the folder flushed. Either the old or the new promise survives a crash. Errors: those of FileManager.
 std::optional<Error> writePromise(const std::string& folder, const PromiseInfo& info);
 /// Writes the identifier into a promise as writePromise does and keeps all else that the file says.
 std::optional<Error> setPromiseDocumentID(const std::string& promisePath, std::int64_t documentID);

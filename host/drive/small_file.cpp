@@ -166,7 +166,8 @@ Result<KeyFile> readKeyFile(const std::string& path) {
   Result<std::string> bytes = readSmallFile(path);
   if (!bytes) return *bytes.error;
   KeyFile file(g_key_file_new());
-  if (!g_key_file_load_from_data(file.get(), bytes.value->data(), bytes.value->size(), G_KEY_FILE_KEEP_TRANSLATIONS, nullptr)) {
+  if (!g_key_file_load_from_data(file.get(), bytes.value->data(), bytes.value->size(), G_KEY_FILE_KEEP_TRANSLATIONS,
+                                 nullptr)) {
     return fileError(FileErrorCode::ReadUnknown, path, "the file is damaged");
   }
   return file;

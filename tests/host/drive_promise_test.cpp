@@ -20,7 +20,8 @@ class DrivePromiseTest : public DriveTest {
 };
 
 TEST_F(DrivePromiseTest, NamesGoBothWays) {
-  for (const std::string name : {"a", "Report.pdf", ".hidden", "two words", "\xff\xfe", "\xf0\x9f\x90\xa6.txt", "a.vlopromise"}) {
+  for (const std::string name :
+       {"a", "Report.pdf", ".hidden", "two words", "\xff\xfe", "\xf0\x9f\x90\xa6.txt", "a.vlopromise"}) {
     const std::string promise = promiseNameFor(name);
     EXPECT_EQ(promise, "." + name + ".vlopromise");
     EXPECT_TRUE(isPromiseName(promise));
@@ -61,8 +62,8 @@ TEST_F(DrivePromiseTest, WhatIsWrittenIsRead) {
 }
 
 TEST_F(DrivePromiseTest, LongAndStrangeNamesSurvive) {
-  for (const std::string& name : {std::string(255, 'x'), std::string(243, 'y'), std::string(244, 'z'), std::string(255, '\xe9'),
-                                  std::string("\xff\xfe"), " " + std::string(250, '\n') + ";\\"}) {
+  for (const std::string& name : {std::string(255, 'x'), std::string(243, 'y'), std::string(244, 'z'),
+                                  std::string(255, '\xe9'), std::string("\xff\xfe"), " " + std::string(250, '\n') + ";\\"}) {
     ASSERT_FALSE(writePromise(drive, named(name)));
     const std::string physical = promisePathFor(drive + "/" + name);
     EXPECT_LE(physical.size() - drive.size() - 1, 255u);
@@ -170,7 +171,8 @@ TEST_F(DrivePromiseTest, PackagesAreKnownByTheirExtension) {
   for (const char* name : {"a.bundle", "a.RTFD", "a b.TextBundle", "x.sketchbundle", "y.y.vlopackage"}) {
     EXPECT_TRUE(isPackageName(name)) << name;
   }
-  for (const char* name : {"bundle", ".bundle", "a.bundles", "a.bundle.txt", "a.", ""}) EXPECT_FALSE(isPackageName(name)) << name;
+  for (const char* name : {"bundle", ".bundle", "a.bundles", "a.bundle.txt", "a.", ""})
+    EXPECT_FALSE(isPackageName(name)) << name;
 }
 
 }  // namespace vaelo::drive_test

@@ -35,7 +35,8 @@ class DriveServiceTest : public DriveTest {
   template <typename Condition>
   bool waitFor(Condition done) {
     bool late = false;
-    const guint timer = g_timeout_add_seconds(10, [](gpointer flag) -> gboolean { return *static_cast<bool*>(flag) = true; }, &late);
+    const guint timer = g_timeout_add_seconds(
+        10, [](gpointer flag) -> gboolean { return *static_cast<bool*>(flag) = true; }, &late);
     while (!done() && !late) {
       g_main_context_iteration(nullptr, TRUE);
       queues.main().drain();
@@ -135,8 +136,9 @@ TEST_F(DriveServiceTest, AServiceThatIsGonePostsNothing) {
 
 TEST_F(DriveServiceTest, ContainersSayWhatTheirManifestsSay) {
   start();
-  addLibrary("org~example~Sketch", "[Container]\nName=Sketchbook\nDocumentTypes=public.image;com.adobe.pdf;\n"
-                                   "FolderLevels=One\nOwners=org.example.Sketch;org.example.SketchLite;\n");
+  addLibrary("org~example~Sketch",
+             "[Container]\nName=Sketchbook\nDocumentTypes=public.image;com.adobe.pdf;\n"
+             "FolderLevels=One\nOwners=org.example.Sketch;org.example.SketchLite;\n");
   const CloudContainerRef sketch = service->containerWithIdentifier("org~example~Sketch");
   ASSERT_TRUE(sketch);
   EXPECT_EQ(sketch->identifier(), "org~example~Sketch");
@@ -263,7 +265,8 @@ TEST_F(DriveServiceTest, BookmarksAndAliasesThatNameNoFileAreRefused) {
     write(alias, "[Desktop Entry]\nType=Link\nURL=" + url + "\n");
     EXPECT_EQ(readAliasFile(alias).error.value_or(Error()).code, FileErrorCode::ReadUnknown) << url;
   }
-  for (const std::string& text : {std::string("garbage"), std::string("[Other]\nURL=file:///etc\n"), std::string(70000, '\n')}) {
+  for (const std::string& text :
+       {std::string("garbage"), std::string("[Other]\nURL=file:///etc\n"), std::string(70000, '\n')}) {
     write(bookmark, text);
     write(alias, text);
     EXPECT_FALSE(readBookmarkFile(bookmark));
@@ -288,7 +291,8 @@ TEST_F(DriveServiceTest, PromisesGoBothWays) {
   info.name = "away.pdf";
   info.tags = {"Red"};
   ASSERT_FALSE(writePromise(drive, info));
-  const URL logical(drive + "/away.pdf"), physical(drive + "/.away.pdf.vlopromise"), plain(drive + "/Welcome to Vaelo Drive.md");
+  const URL logical(drive + "/away.pdf"), physical(drive + "/.away.pdf.vlopromise"),
+      plain(drive + "/Welcome to Vaelo Drive.md");
   EXPECT_TRUE(service->isPromise(physical));
   EXPECT_FALSE(service->isPromise(logical));
   EXPECT_EQ(service->logicalURLOfPromise(physical), logical);
@@ -357,7 +361,8 @@ TEST_F(DriveServiceTest, TheQuotaIsTheSmallerOfAllowanceAndDisk) {
 TEST_F(DriveServiceTest, ARebuiltIndexIsAnnounced) {
   write(data + "/index.sqlite", std::string(5000, 'x'));
   int posted = 0;
-  const auto observation = notifications.addObserver(DocumentIndexRebuiltNotification, [&](const Notification&) { ++posted; });
+  const auto observation =
+      notifications.addObserver(DocumentIndexRebuiltNotification, [&](const Notification&) { ++posted; });
   start();
   EXPECT_EQ(posted, 0);
   queues.main().drain();
@@ -486,13 +491,26 @@ TEST_F(DriveStoreTest, OnlyTheDriveIsBookmarkable) {
 TEST_F(DriveStoreTest, HostileStringsAreRefused) {
   write(root + "/data/secret");
   link(root + "/data", drive + "/out");
-  for (const std::string& text :
-       {std::string(), std::string("vlo1"), std::string("vlo1:"), std::string("vlo1:1"), std::string("vlo1:1:"),
-        std::string("vlo2:1:a"), std::string("vlo1:-1:a"), std::string("vlo1:x:a"), std::string("vlo1: 1:a"),
-        std::string("vlo1:99999999999999999999:com~marrow~Kestrel/doc.txt"), std::string("vlo1:0:/etc/passwd"),
-        std::string("vlo1:0:../secret"), std::string("vlo1:0:%2e%2e/secret"), std::string("vlo1:0:com~marrow~Kestrel/../../secret"),
-        std::string("vlo1:0:a%00b"), std::string("vlo1:0:a%zz"), std::string("vlo1:0:a//b"), std::string("vlo1:0:."),
-        std::string("vlo1:0:a\0b", 10), std::string("http://example.org")}) {
+  for (const std::string& text : {std::string(),
+                                  std::string("vlo1"),
+                                  std::string("vlo1:"),
+                                  std::string("vlo1:1"),
+                                  std::string("vlo1:1:"),
+                                  std::string("vlo2:1:a"),
+                                  std::string("vlo1:-1:a"),
+                                  std::string("vlo1:x:a"),
+                                  std::string("vlo1: 1:a"),
+                                  std::string("vlo1:99999999999999999999:com~marrow~Kestrel/doc.txt"),
+                                  std::string("vlo1:0:/etc/passwd"),
+                                  std::string("vlo1:0:../secret"),
+                                  std::string("vlo1:0:%2e%2e/secret"),
+                                  std::string("vlo1:0:com~marrow~Kestrel/../../secret"),
+                                  std::string("vlo1:0:a%00b"),
+                                  std::string("vlo1:0:a%zz"),
+                                  std::string("vlo1:0:a//b"),
+                                  std::string("vlo1:0:."),
+                                  std::string("vlo1:0:a\0b", 10),
+                                  std::string("http://example.org")}) {
     const Result<URL> url = decoded(text);
     ASSERT_TRUE(url.error) << text;
     EXPECT_EQ(url.error->code, FileErrorCode::Formatting) << text;
