@@ -6,7 +6,6 @@
 #include "platform/document_store.h"
 #include "platform/file_coordinator.h"
 #include "platform/file_manager.h"
-#include "platform/file_progress.h"
 #include "platform/file_provider.h"
 #include "platform/formatting.h"
 #include "platform/launch_services.h"
@@ -16,7 +15,6 @@
 #include "platform/queues.h"
 #include "platform/resource_values.h"
 #include "platform/storage_quota.h"
-#include "platform/synced_key_value_store.h"
 #include "platform/type_identifiers.h"
 #include "platform/user_activity.h"
 
@@ -34,7 +32,6 @@ struct Platform {
   DocumentStore& documentStore;
   FileCoordination& fileCoordination;
   FileManager& fileManager;
-  FileProgress& fileProgress;
   FileProvider& fileProvider;
   Formatting& formatting;
   LaunchServices& launchServices;
@@ -45,9 +42,7 @@ struct Platform {
   Queues& queues;
   ResourceValues& resourceValues;
   ScreenFactory& screens;
-  SyncedKeyValueStore& syncedStore;
   TypeIdentifiers& types;
-  UserActivities& userActivities;
 
   /// The installed platform. Calling it before install() is a programming error and ends the process.
   static Platform& current();

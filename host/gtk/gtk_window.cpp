@@ -5,6 +5,7 @@
 
 #include "host/gtk/alert_dialog.h"
 #include "host/gtk/host_screen.h"
+#include "platform/ui/search_controller.h"
 
 namespace vaelo {
 
@@ -121,10 +122,13 @@ void GtkWindowHost::toolbarHiddenChanged(bool hidden, bool) {
 void GtkWindowHost::present(const ViewControllerRef&, const ViewControllerRef& presented, bool, std::function<void()> done) {
   if (const auto alert = std::dynamic_pointer_cast<AlertController>(presented)) {
     dialogs_[presented.get()] = showAlertDialog(alert, widget(), std::move(done));
-  } else if (done) {
-    // A search shows itself within its list.
-    done();
+    return;
   }
+  if (const auto search = std::dynamic_pointer_cast<SearchController>(presented)) {
+    const auto page = pages_.find(search->list().get());
+    if (page != pages_.end() && page->second->hostScreen()) page->second->hostScreen()->showSearch(search);
+  }
+  if (done) done();
 }
 
 void GtkWindowHost::dismiss(const ViewControllerRef& presented, bool, std::function<void()> done) {
@@ -132,6 +136,10 @@ void GtkWindowHost::dismiss(const ViewControllerRef& presented, bool, std::funct
   if (dialog != dialogs_.end()) {
     gtk_window_destroy(dialog->second);
     dialogs_.erase(dialog);
+  }
+  if (const auto search = std::dynamic_pointer_cast<SearchController>(presented)) {
+    const auto page = pages_.find(search->list().get());
+    if (page != pages_.end() && page->second->hostScreen()) page->second->hostScreen()->hideSearch();
   }
   if (done) done();
 }

@@ -3,9 +3,12 @@
 
 #include <gtk/gtk.h>
 
+#include <memory>
 #include <vector>
 
 namespace vaelo {
+
+class SearchController;
 
 /// The widgets that a screen of the host's own brings along. Main thread.
 class HostScreen {
@@ -19,6 +22,9 @@ class HostScreen {
   virtual bool toggleSearch() { return false; }
   virtual bool closeSearch() { return false; }
   virtual void refresh() {}
+  /// Shows the search that was presented over the screen, and takes it away.
+  virtual void showSearch(const std::shared_ptr<SearchController>& /*search*/) {}
+  virtual void hideSearch() {}
 };
 
 }  // namespace vaelo

@@ -3,6 +3,7 @@
 
 #include "host/gtk/bar_item_widget.h"
 #include "host/gtk/host_screen.h"
+#include "host/gtk/preview_page.h"
 
 namespace vaelo {
 
@@ -34,6 +35,10 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
     GtkWidget* content = hostScreen_->contentWidget();
     gtk_widget_set_vexpand(content, TRUE);
     gtk_box_append(GTK_BOX(box_), content);
+  } else if (const auto preview = std::dynamic_pointer_cast<PreviewController>(screen_)) {
+    preview_ = std::make_unique<PreviewPage>(preview);
+    gtk_widget_set_vexpand(preview_->widget(), TRUE);
+    gtk_box_append(GTK_BOX(box_), preview_->widget());
   }
   gtk_widget_add_css_class(toolbar_, "toolbar");
   gtk_widget_set_size_request(toolbar_, -1, 46);

@@ -11,6 +11,7 @@
 namespace vaelo {
 
 class HostScreen;
+class PreviewPage;
 
 /// One page of the window: a screen's header bar, its content and its toolbar, which follow the screen. Main thread.
 class ScreenPage {
@@ -40,6 +41,7 @@ class ScreenPage {
   GtkWidget* toolbar_;
   std::vector<GtkWidget*> barWidgets_;
   std::function<void()> goBack_;
+  std::unique_ptr<PreviewPage> preview_;
   bool canGoBack_ = false;
   bool toolbarHidden_ = true;
   std::shared_ptr<void> barToken_;

@@ -9,9 +9,7 @@
 #include "platform/ui/device.h"
 #include "platform/ui/document_interaction_controller.h"
 #include "platform/ui/document_list_controller.h"
-#include "platform/ui/document_target_selection_controller.h"
 #include "platform/ui/graphics.h"
-#include "platform/ui/upgrade_button.h"
 #include "platform/ui/upgrade_flow_manager.h"
 #include "platform/ui/window.h"
 
@@ -30,24 +28,15 @@ class ScreenFactory {
   virtual DocumentListControllerRef makeRootList() = 0;
   /// A list of one folder; null when it can't be made.
   virtual DocumentListControllerRef makeList(const URL& folder) = 0;
-  /// The list that is shown while a folder is firmly pressed; it has no search.
-  virtual DocumentListControllerRef makePeekFolderViewController(const URL& folder) = 0;
   /// One list for each folder from the drive's root down to `folder`; nothing when `folder` is not in the drive.
   virtual std::optional<std::vector<DocumentListControllerRef>> hierarchyTo(const URL& folder) = 0;
   /// The screen that says that no account is signed in; null when the host has none.
   virtual ViewControllerRef makeDriveUnavailable() = 0;
   /// Whether the quick preview can show the item; judged without reading its content.
   virtual bool canPreviewItem(const URL& url) = 0;
-  /// The folder picker. `crossContainer`: folders of other libraries may be picked as well.
-  virtual std::shared_ptr<DocumentTargetSelectionController> makeTargetSelection(const std::vector<URL>& itemsToMove,
-                                                                                 bool crossContainer) = 0;
   virtual std::shared_ptr<DocumentInteractionController> makeDocumentInteraction(const URL& url) = 0;
 
-  /// `offer` may be null.
-  virtual std::shared_ptr<UpgradeButton> makeUpgradeButton(StorageOfferRef offer) = 0;
-  /// True when a button is to be shown for the offer.
-  virtual bool shouldShowUpgradeButton(const StorageOfferRef& offer) = 0;
-  /// `offer` may be null.
+  /// `offer` may be null. Null where the platform sells nothing; there is never an offer then.
   virtual std::shared_ptr<UpgradeFlowManager> makeUpgradeFlow(StorageOfferRef offer) = 0;
 
   /// Asks or tells the user what must be settled before the document is opened elsewhere, then runs `open` once, or never.

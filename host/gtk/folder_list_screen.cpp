@@ -1,0 +1,184 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/gtk/folder_list_screen.h"
+
+#include <adwaita.h>
+
+namespace vaelo {
+
+namespace {
+
+GtkWidget* iconButton(const char* icon, const char* label) {
+  GtkWidget* button = gtk_button_new_from_icon_name(icon);
+  gtk_widget_set_tooltip_text(button, label);
+  gtk_accessible_update_property(GTK_ACCESSIBLE(button), GTK_ACCESSIBLE_PROPERTY_LABEL, label, -1);
+  return button;
+}
+
+std::string titleOf(const URL& folder, CloudDocuments& drive) {
+  if (drive.isDocumentsContainer(folder)) {
+    const Result<CloudContainerRef> container = drive.containerForURL(folder);
+    if (container.value) return (*container.value)->localizedName();
+  }
+  char* name = g_filename_display_name(folder.lastPathComponent().c_str());
+  std::string title = name;
+  g_free(name);
+  return title;
+}
+
+}  // namespace
+
+FolderListScreen::FolderListScreen(const URL& folder, CloudDocuments& drive, ScreenFactory& screens, bool allContainers)
+    : DocumentListController(folder, allContainers), drive_(drive), screens_(screens) {
+  setTitle(titleOf(folder, drive));
+}
+
+FolderListScreen::~FolderListScreen() {
+  folderSearch_.stop();
+  if (searchEntry_) g_signal_handlers_disconnect_by_data(searchEntry_, this);
+  view_.reset();
+  results_.reset();
+  if (content_) g_object_unref(content_);
+}
+
+FolderView& FolderListScreen::folderView() {
+  build();
+  return *view_;
+}
+
+GtkWidget* FolderListScreen::contentWidget() {
+  build();
+  return content_;
+}
+
+void FolderListScreen::build() {
+  if (content_) return;
+  view_ = std::make_unique<FolderView>();
+  content_ = GTK_WIDGET(g_object_ref_sink(gtk_box_new(GTK_ORIENTATION_VERTICAL, 0)));
+  stack_ = gtk_stack_new();
+  gtk_stack_add_child(GTK_STACK(stack_), view_->widget());
+  gtk_widget_set_vexpand(stack_, TRUE);
+  gtk_box_append(GTK_BOX(content_), stack_);
+  FolderViewEvents events;
+  events.activated = [this](const std::string& name) { activated(*view_, name, urlOf(name)); };
+  events.itemsChanged = [this] { reportItems(); };
+  events.folderRemoved = [this] { folderWasRemoved(); };
+  view_->setEvents(std::move(events));
+  fill();
+}
+
+void FolderListScreen::fill() { view_->setFolder(presentedURL()->path()); }
+
+URL FolderListScreen::urlOf(const std::string& name) const { return presentedURL()->appendingPathComponent(name); }
+
+std::vector<std::string> FolderListScreen::searchedFolders() const { return {presentedURL()->path()}; }
+
+void FolderListScreen::reportItems() {
+  std::vector<URL> items;
+  const std::size_t count = view_->itemCount();
+  items.reserve(count);
+  for (std::size_t i = 0; i < count; ++i) items.push_back(urlOf(view_->nameAt(i)));
+  itemsLoaded(std::move(items));
+}
+
+void FolderListScreen::activated(FolderView& view, const std::string& name, const URL& url) {
+  const std::optional<std::size_t> row = view.model().indexOf(name);
+  if (row && view.kindAt(*row) == EntryKind::Folder) {
+    userSelectedContainer(screens_.makeList(URL(url.path(), true)));
+  } else {
+    userSelectedItem(url);
+  }
+}
+
+std::vector<GtkWidget*> FolderListScreen::headerWidgets() {
+  GtkWidget* search = iconButton("system-search-symbolic", "Search");
+  gtk_actionable_set_action_name(GTK_ACTIONABLE(search), "win.search");
+  GtkWidget* mode = iconButton("view-grid-symbolic", "View as grid");
+  g_signal_connect(mode, "clicked", G_CALLBACK(+[](GtkButton* button, FolderListScreen* self) {
+                     FolderView& view = self->folderView();
+                     const bool grid = view.mode() != FolderView::Mode::Grid;
+                     view.setMode(grid ? FolderView::Mode::Grid : FolderView::Mode::List);
+                     const char* label = grid ? "View as list" : "View as grid";
+                     gtk_button_set_icon_name(button, grid ? "view-list-symbolic" : "view-grid-symbolic");
+                     gtk_widget_set_tooltip_text(GTK_WIDGET(button), label);
+                     gtk_accessible_update_property(GTK_ACCESSIBLE(button), GTK_ACCESSIBLE_PROPERTY_LABEL, label, -1);
+                   }),
+                   this);
+  return {mode, search};
+}
+
+bool FolderListScreen::toggleSearch() {
+  if (closeSearch()) return true;
+  startSearchWithQueryStringBecomeFirstResponder("", true);
+  return true;
+}
+
+bool FolderListScreen::closeSearch() {
+  if (!search_) return false;
+  dismissViewControllerAnimated(true);
+  return true;
+}
+
+void FolderListScreen::showSearch(const std::shared_ptr<SearchController>& search) {
+  build();
+  search_ = search;
+  if (!searchBar_) {
+    searchBar_ = gtk_search_bar_new();
+    searchEntry_ = gtk_search_entry_new();
+    gtk_accessible_update_property(GTK_ACCESSIBLE(searchEntry_), GTK_ACCESSIBLE_PROPERTY_LABEL, "Search below this folder", -1);
+    GtkWidget* clamp = adw_clamp_new();
+    gtk_widget_set_hexpand(clamp, TRUE);
+    adw_clamp_set_child(ADW_CLAMP(clamp), searchEntry_);
+    gtk_search_bar_set_child(GTK_SEARCH_BAR(searchBar_), clamp);
+    gtk_box_prepend(GTK_BOX(content_), searchBar_);
+    results_ = std::make_unique<FolderView>();
+    gtk_stack_add_child(GTK_STACK(stack_), results_->widget());
+    results_->setEmptyText("Nothing found", "No item below this folder has such a name.");
+    FolderViewEvents events;
+    events.activated = [this](const std::string& path) { activated(*results_, path, URL(path)); };
+    results_->setEvents(std::move(events));
+    g_signal_connect_swapped(searchEntry_, "search-changed",
+                             G_CALLBACK(+[](FolderListScreen* self) { self->queryTyped(); }), this);
+    g_signal_connect_swapped(searchEntry_, "stop-search",
+                             G_CALLBACK(+[](FolderListScreen* self) { self->closeSearch(); }), this);
+  }
+  gtk_editable_set_text(GTK_EDITABLE(searchEntry_), search->query().c_str());
+  gtk_search_bar_set_search_mode(GTK_SEARCH_BAR(searchBar_), TRUE);
+  queryToken_ = search->queryChanged().connect([this](SearchController& changed) {
+    if (changed.query() != gtk_editable_get_text(GTK_EDITABLE(searchEntry_))) {
+      gtk_editable_set_text(GTK_EDITABLE(searchEntry_), changed.query().c_str());
+    }
+    beginSearch();
+  });
+  if (search->wantsFocus()) gtk_widget_grab_focus(searchEntry_);
+  beginSearch();
+}
+
+void FolderListScreen::hideSearch() {
+  folderSearch_.stop();
+  search_.reset();
+  queryToken_.reset();
+  gtk_search_bar_set_search_mode(GTK_SEARCH_BAR(searchBar_), FALSE);
+  gtk_stack_set_visible_child(GTK_STACK(stack_), view_->widget());
+  view_->grabFocus();
+}
+
+void FolderListScreen::queryTyped() {
+  if (search_) search_->setQuery(gtk_editable_get_text(GTK_EDITABLE(searchEntry_)));
+}
+
+void FolderListScreen::beginSearch() {
+  folderSearch_.stop();
+  found_.clear();
+  if (!search_ || search_->query().empty()) {
+    gtk_stack_set_visible_child(GTK_STACK(stack_), view_->widget());
+    return;
+  }
+  folderSearch_.start(searchedFolders(), search_->query(), [this](std::vector<FolderEntry> entries, bool finished) {
+    if (entries.empty() && !finished) return;
+    found_.insert(found_.end(), entries.begin(), entries.end());
+    results_->setEntries(found_);
+    gtk_stack_set_visible_child(GTK_STACK(stack_), results_->widget());
+  });
+}
+
+}  // namespace vaelo

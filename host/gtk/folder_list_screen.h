@@ -1,0 +1,62 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <memory>
+
+#include "host/gtk/folder_search.h"
+#include "host/gtk/host_screen.h"
+#include "host/gtk/list/folder_view.h"
+#include "platform/cloud_documents.h"
+#include "platform/ui/document_list_controller.h"
+#include "platform/ui/screen_factory.h"
+#include "platform/ui/search_controller.h"
+
+namespace vaelo {
+
+/// The list of one folder: its rows, and the search below it. Main thread.
+class FolderListScreen : public DocumentListController, public HostScreen {
+ public:
+  FolderListScreen(const URL& folder, CloudDocuments& drive, ScreenFactory& screens, bool allContainers = false);
+  ~FolderListScreen() override;
+
+  GtkWidget* contentWidget() override;
+  std::vector<GtkWidget*> headerWidgets() override;
+  bool toggleSearch() override;
+  bool closeSearch() override;
+  void refresh() override { folderView().refresh(); }
+  void showSearch(const std::shared_ptr<SearchController>& search) override;
+  void hideSearch() override;
+
+ protected:
+  FolderView& folderView();
+  /// Begins to show the items; the folder's own unless a subclass knows better.
+  virtual void fill();
+  /// The URL that a row's name stands for.
+  virtual URL urlOf(const std::string& name) const;
+  /// Where a search looks.
+  virtual std::vector<std::string> searchedFolders() const;
+  void reportItems();
+  CloudDocuments& drive() const { return drive_; }
+
+ private:
+  void build();
+  /// The row `name` of `view`, which stands for `url`.
+  void activated(FolderView& view, const std::string& name, const URL& url);
+  void queryTyped();
+  void beginSearch();
+
+  CloudDocuments& drive_;
+  ScreenFactory& screens_;
+  std::unique_ptr<FolderView> view_;
+  std::unique_ptr<FolderView> results_;
+  GtkWidget* content_ = nullptr;
+  GtkWidget* searchBar_ = nullptr;
+  GtkWidget* searchEntry_ = nullptr;
+  GtkWidget* stack_ = nullptr;
+  std::vector<FolderEntry> found_;
+  FolderSearch folderSearch_;
+  std::shared_ptr<SearchController> search_;
+  std::shared_ptr<void> queryToken_;
+};
+
+}  // namespace vaelo

@@ -1,0 +1,100 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/gtk/folder_search.h"
+
+#include <chrono>
+#include <thread>
+
+#include "host/gtk/list/folder_reader.h"
+#include "host/support/glib_ptr.h"
+
+namespace vaelo {
+
+namespace {
+
+constexpr std::size_t MostResults = 5000;
+
+/// Comparable form of a name: valid UTF-8, composed, folded.
+std::string folded(const std::string& name) {
+  const std::string valid = takeString(g_utf8_make_valid(name.c_str(), static_cast<gssize>(name.size())));
+  const std::string normal = takeString(g_utf8_normalize(valid.c_str(), -1, G_NORMALIZE_ALL_COMPOSE));
+  return takeString(g_utf8_casefold(normal.c_str(), -1));
+}
+
+struct Batch {
+  std::vector<FolderEntry> entries;
+  bool finished;
+  std::shared_ptr<std::atomic<bool>> stopped;
+  std::shared_ptr<FolderSearch::Found> found;
+};
+
+class Searching {
+ public:
+  Searching(std::string query, std::shared_ptr<std::atomic<bool>> stopped, std::shared_ptr<FolderSearch::Found> found)
+      : query_(std::move(query)), stopped_(std::move(stopped)), found_(std::move(found)) {}
+
+  void run(std::vector<std::string> folders) {
+    // Breadth first: what lies near is found first.
+    for (std::size_t at = 0; at < folders.size() && !*stopped_ && count_ < MostResults; ++at) {
+      const std::string folder = folders[at];
+      const FolderReading reading = readFolder(folder);
+      if (!reading.snapshot) continue;
+      for (std::size_t i = 0; i < reading.snapshot->size() && count_ < MostResults; ++i) {
+        const std::string name(reading.snapshot->name(i));
+        const EntryKind kind = reading.snapshot->kind(i);
+        const std::string path = folder + "/" + name;
+        if (folded(name).find(query_) != std::string::npos) add({takeString(g_filename_display_name(name.c_str())), path, kind, ""});
+        if (kind == EntryKind::Folder) folders.push_back(path);
+      }
+      tellIfDue();
+    }
+    tell(true);
+  }
+
+ private:
+  void add(FolderEntry entry) {
+    ++count_;
+    waiting_.push_back(std::move(entry));
+    tellIfDue();
+  }
+  void tellIfDue() {
+    constexpr std::chrono::milliseconds interval(100);
+    if (!waiting_.empty() && std::chrono::steady_clock::now() - told_ >= interval) tell(false);
+  }
+  void tell(bool finished) {
+    told_ = std::chrono::steady_clock::now();
+    auto* batch = new Batch{std::move(waiting_), finished, stopped_, found_};
+    waiting_.clear();
+    g_main_context_invoke_full(
+        nullptr, G_PRIORITY_DEFAULT,
+        [](gpointer held) -> gboolean {
+          auto* shown = static_cast<Batch*>(held);
+          if (!*shown->stopped) (*shown->found)(std::move(shown->entries), shown->finished);
+          return G_SOURCE_REMOVE;
+        },
+        batch, [](gpointer held) { delete static_cast<Batch*>(held); });
+  }
+
+  std::string query_;
+  std::shared_ptr<std::atomic<bool>> stopped_;
+  std::shared_ptr<FolderSearch::Found> found_;
+  std::vector<FolderEntry> waiting_;
+  std::chrono::steady_clock::time_point told_;
+  std::size_t count_ = 0;
+};
+
+}  // namespace
+
+void FolderSearch::start(std::vector<std::string> folders, const std::string& query, Found found) {
+  stop();
+  stopped_ = std::make_shared<std::atomic<bool>>(false);
+  Searching searching(folded(query), stopped_, std::make_shared<Found>(std::move(found)));
+  // Detached, since a folder on a slow disk may keep it for long; it touches nothing of ours once it is stopped.
+  std::thread([searching = std::move(searching), folders = std::move(folders)]() mutable { searching.run(std::move(folders)); })
+      .detach();
+}
+
+void FolderSearch::stop() {
+  if (stopped_) *stopped_ = true;
+}
+
+}  // namespace vaelo

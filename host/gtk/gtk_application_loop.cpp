@@ -1,0 +1,143 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/gtk/gtk_application_loop.h"
+
+#include "host/drive/local_cloud_documents.h"
+#include "host/gtk/gtk_screens.h"
+#include "host/gtk/gtk_window.h"
+#include "host/support/glib_ptr.h"
+
+namespace vaelo {
+
+GtkApplicationLoop::GtkApplicationLoop(GtkScreens& screens, NotificationCenter& notifications, RestorationStore restoration)
+    : screens_(screens), notifications_(notifications), restoration_(std::move(restoration)), application_(nullptr) {}
+
+GtkApplicationLoop::~GtkApplicationLoop() {
+  if (application_) g_object_unref(application_);
+}
+
+int GtkApplicationLoop::run(int argc, char** argv, std::function<std::shared_ptr<ApplicationDelegate>()> makeDelegate) {
+  makeDelegate_ = std::move(makeDelegate);
+  constexpr auto flags = static_cast<GApplicationFlags>(G_APPLICATION_HANDLES_COMMAND_LINE | G_APPLICATION_HANDLES_OPEN |
+                                                        G_APPLICATION_CAN_OVERRIDE_APP_ID);
+  application_ = adw_application_new("com.marrow.VaeloDrive", flags);
+  screens_.setApplication(GTK_APPLICATION(application_));
+  g_application_set_option_context_parameter_string(G_APPLICATION(application_), "[LINK...]");
+  g_application_set_option_context_summary(G_APPLICATION(application_),
+                                           "Browse and manage the documents of your cloud drive.\n"
+                                           "LINK is one of the vaelodriveapp: scheme and opens that item.");
+  g_signal_connect_swapped(application_, "activate", G_CALLBACK(+[](GtkApplicationLoop* self) { self->activate(); }), this);
+  g_signal_connect(application_, "command-line",
+                   G_CALLBACK(+[](GApplication*, GApplicationCommandLine* line, GtkApplicationLoop* self) -> int {
+                     return self->commandLine(line);
+                   }),
+                   this);
+  g_signal_connect(application_, "open",
+                   G_CALLBACK(+[](GApplication*, GFile** files, int count, const char*, GtkApplicationLoop* self) {
+                     self->activate();
+                     for (int i = 0; i < count; ++i) self->openLink(takeString(g_file_get_uri(files[i])));
+                   }),
+                   this);
+  static const GActionEntry entries[] = {
+      {"about", [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkApplicationLoop*>(self)->showAbout(); }, nullptr,
+       nullptr, nullptr, {0, 0, 0}},
+      {"quit", [](GSimpleAction*, GVariant*, gpointer self) {
+         g_application_quit(G_APPLICATION(static_cast<GtkApplicationLoop*>(self)->application_));
+       }, nullptr, nullptr, nullptr, {0, 0, 0}}};
+  g_action_map_add_action_entries(G_ACTION_MAP(application_), entries, G_N_ELEMENTS(entries), this);
+  const char* quitKeys[] = {"<Control>q", nullptr};
+  gtk_application_set_accels_for_action(GTK_APPLICATION(application_), "app.quit", quitKeys);
+  const int status = g_application_run(G_APPLICATION(application_), argc, argv);
+  if (delegate_) {
+    saveState();
+    delegate_.reset();
+  }
+  return status;
+}
+
+void GtkApplicationLoop::activate() {
+  if (!delegate_) launch();
+  if (const auto window = screens_.window()) gtk_window_present(window->widget());
+}
+
+void GtkApplicationLoop::launch() {
+  delegate_ = makeDelegate_();
+  const LaunchOptions options;
+  delegate_->applicationWillFinishLaunchingWithOptions(options);
+  delegate_->applicationDidFinishLaunchingWithOptions(options);
+  const auto window = screens_.window();
+  if (!window) return;
+  g_signal_connect_swapped(window->widget(), "notify::is-active",
+                           G_CALLBACK(+[](GtkApplicationLoop* self) { self->windowFocusChanged(); }), this);
+  rebuiltToken_ = notifications_.addObserver(DocumentIndexRebuiltNotification, [this](const Notification&) {
+    if (const auto shown = screens_.window()) {
+      shown->showToast("The drive’s index was damaged. It has been rebuilt, and the old one kept.");
+    }
+  });
+}
+
+int GtkApplicationLoop::commandLine(GApplicationCommandLine* line) {
+  int count = 0;
+  char** arguments = g_application_command_line_get_arguments(line, &count);
+  const bool first = !delegate_;
+  activate();
+  int status = 0;
+  for (int i = 1; i < count; ++i) {
+    if (openLink(arguments[i])) continue;
+    g_application_command_line_printerr(line, "vaelo-drive: “%s” leads to nothing in the drive.\n", arguments[i]);
+    status = 1;
+  }
+  if (first && count == 1) restore();
+  g_strfreev(arguments);
+  return status;
+}
+
+bool GtkApplicationLoop::openLink(const std::string& link) {
+  if (delegate_->applicationOpenURLOptions(link, {})) return true;
+  if (const auto window = screens_.window()) window->showToast("The link leads to nothing in this drive.");
+  return false;
+}
+
+void GtkApplicationLoop::windowFocusChanged() {
+  const auto window = screens_.window();
+  const bool active = window && gtk_window_is_active(window->widget());
+  if (active == active_) return;
+  active_ = active;
+  if (active) {
+    notifications_.post({DidBecomeActiveNotification, {}});
+  } else {
+    delegate_->applicationWillResignActive();
+    notifications_.post({WillResignActiveNotification, {}});
+    saveState();
+  }
+}
+
+void GtkApplicationLoop::restore() {
+  if (!delegate_->applicationShouldRestoreApplicationState()) return;
+  const auto window = screens_.window();
+  const ViewControllerRef root = window ? window->rootViewController() : nullptr;
+  if (root) root->decodeRestorableStateWithCoder(DictionaryRestorationCoder(restoration_.load()));
+}
+
+void GtkApplicationLoop::saveState() {
+  const auto window = screens_.window();
+  const ViewControllerRef root = window ? window->rootViewController() : nullptr;
+  if (!root || !delegate_->applicationShouldSaveApplicationState()) return;
+  DictionaryRestorationCoder coder;
+  root->encodeRestorableStateWithCoder(coder);
+  restoration_.save(coder.values());
+}
+
+void GtkApplicationLoop::showAbout() {
+  const auto window = screens_.window();
+  if (!window) return;
+  adw_show_about_window(window->widget(), "application-name", "Vaelo Drive", "application-icon", "com.marrow.VaeloDrive",
+                        "version", VAELO_VERSION, "license-type", GTK_LICENSE_GPL_3_0, "comments",
+                        "Browse and manage the documents of your cloud drive.", nullptr);
+}
+
+std::string GtkApplicationLoop::description() {
+  const char* id = application_ ? g_application_get_application_id(G_APPLICATION(application_)) : nullptr;
+  return id ? id : "";
+}
+
+}  // namespace vaelo

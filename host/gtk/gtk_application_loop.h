@@ -1,0 +1,49 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <adwaita.h>
+
+#include <functional>
+#include <memory>
+#include <string>
+
+#include "host/desktop/restoration_store.h"
+#include "platform/application.h"
+#include "platform/notifications.h"
+
+namespace vaelo {
+
+class GtkScreens;
+
+/// The application loop on GApplication: one instance a session, links handed to it over D-Bus, and the window's focus told as
+/// active and inactive. Main thread.
+class GtkApplicationLoop : public Application {
+ public:
+  GtkApplicationLoop(GtkScreens& screens, NotificationCenter& notifications, RestorationStore restoration);
+  ~GtkApplicationLoop() override;
+  int run(int argc, char** argv, std::function<std::shared_ptr<ApplicationDelegate>()> makeDelegate) override;
+  bool isRightToLeft() override { return gtk_widget_get_default_direction() == GTK_TEXT_DIR_RTL; }
+  std::string description() override;
+
+ private:
+  void activate();
+  void launch();
+  int commandLine(GApplicationCommandLine* line);
+  /// True when the application took the link.
+  bool openLink(const std::string& link);
+  void windowFocusChanged();
+  void restore();
+  void saveState();
+  void showAbout();
+
+  GtkScreens& screens_;
+  NotificationCenter& notifications_;
+  RestorationStore restoration_;
+  AdwApplication* application_;
+  std::function<std::shared_ptr<ApplicationDelegate>()> makeDelegate_;
+  std::shared_ptr<ApplicationDelegate> delegate_;
+  std::shared_ptr<void> rebuiltToken_;
+  bool active_ = false;
+};
+
+}  // namespace vaelo

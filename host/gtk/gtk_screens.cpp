@@ -1,0 +1,76 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/gtk/gtk_screens.h"
+
+#include "host/gtk/drive_unavailable_screen.h"
+#include "host/gtk/folder_list_screen.h"
+#include "host/gtk/gtk_document_interaction.h"
+#include "host/gtk/gtk_window.h"
+#include "host/gtk/root_list_screen.h"
+
+namespace vaelo {
+
+WindowRef GtkScreens::makeWindow(const Rect& bounds) {
+  auto window = std::make_shared<GtkWindowHost>(application_, bounds);
+  window_ = window;
+  return window;
+}
+
+DocumentListControllerRef GtkScreens::makeRootList() {
+  const std::optional<URL> root = drive_.defaultContainerURL();
+  if (!root) return nullptr;
+  return std::make_shared<RootListScreen>(*root, drive_, *this);
+}
+
+DocumentListControllerRef GtkScreens::makeList(const URL& folder) {
+  return std::make_shared<FolderListScreen>(folder, drive_, *this);
+}
+
+std::optional<std::vector<DocumentListControllerRef>> GtkScreens::hierarchyTo(const URL& folder) {
+  const URL real = drive_.realPathURL(folder);
+  const Result<CloudContainerRef> container = drive_.containerForURL(real);
+  const std::optional<URL> top = container.value ? (*container.value)->documentsFolderURL() : std::nullopt;
+  const DocumentListControllerRef root = makeRootList();
+  if (!root || !top || !real.isInside(*top)) return std::nullopt;
+  std::vector<DocumentListControllerRef> lists{root};
+  const bool isRoot = root->presentedURL() == *top;
+  if (!isRoot) lists.push_back(makeList(*top));
+  const std::size_t above = top->pathComponents().size();
+  const std::vector<std::string> components = real.pathComponents();
+  URL at = *top;
+  for (std::size_t i = above; i < components.size(); ++i) {
+    at = at.appendingPathComponent(components[i], true);
+    lists.push_back(makeList(at));
+  }
+  return lists;
+}
+
+ViewControllerRef GtkScreens::makeDriveUnavailable() { return std::make_shared<DriveUnavailableController>(); }
+
+bool GtkScreens::canPreviewItem(const URL&) {
+  // What the preview can't draw it shows as icon and facts, so there is nothing that it can't show.
+  return true;
+}
+
+std::shared_ptr<DocumentInteractionController> GtkScreens::makeDocumentInteraction(const URL& url) {
+  return std::make_shared<GtkDocumentInteraction>(url);
+}
+
+void GtkScreens::runPreOpenAlert(const URL&, const ViewControllerRef&, std::function<void()> open) { open(); }
+
+InterfaceIdiom GtkScreens::userInterfaceIdiom() {
+  const auto shown = window();
+  return shown ? shown->traitCollection().idiom : InterfaceIdiom::Desktop;
+}
+
+Screen GtkScreens::mainScreen() {
+  constexpr Rect usual{0, 0, 800, 640};
+  return {usual, 1};
+}
+
+InterfaceOrientation GtkScreens::statusBarOrientation() {
+  const auto shown = window();
+  if (!shown) return InterfaceOrientation::Unknown;
+  return shown->bounds().width > shown->bounds().height ? InterfaceOrientation::LandscapeLeft : InterfaceOrientation::Portrait;
+}
+
+}  // namespace vaelo

@@ -1,0 +1,148 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/gtk/pango_graphics.h"
+
+#include <cmath>
+#include <numbers>
+
+#include "host/support/glib_ptr.h"
+
+namespace vaelo {
+
+namespace {
+
+PangoContext* context() {
+  static PangoContext* shared = pango_font_map_create_context(pango_cairo_font_map_get_default());
+  return shared;
+}
+
+GRef<PangoLayout> layoutOf(const std::string& text, const Font& font) {
+  GRef<PangoLayout> layout(pango_layout_new(context()));
+  PangoFontDescription* description = pango_font_description_from_string("Cantarell, sans");
+  pango_font_description_set_absolute_size(description, font.pointSize * PANGO_SCALE);
+  pango_layout_set_font_description(layout.get(), description);
+  pango_font_description_free(description);
+  pango_layout_set_text(layout.get(), text.c_str(), static_cast<int>(text.size()));
+  return layout;
+}
+
+double points(int pangoUnits) { return static_cast<double>(pangoUnits) / PANGO_SCALE; }
+
+class CairoContext : public DrawingContext {
+ public:
+  explicit CairoContext(cairo_t* cairo) : cairo_(cairo) {}
+  void setFillColor(const Color& color) override { fill_ = color; }
+  void setStrokeColor(const Color& color) override { stroke_ = color; }
+  void setLineWidth(double width) override { cairo_set_line_width(cairo_, width); }
+  void fillRect(const Rect& rect) override {
+    cairo_rectangle(cairo_, rect.x, rect.y, rect.width, rect.height);
+    paintFill();
+  }
+  void fillEllipse(const Rect& rect) override {
+    ellipse(rect);
+    paintFill();
+  }
+  void strokeEllipse(const Rect& rect) override {
+    ellipse(rect);
+    use(stroke_);
+    cairo_stroke(cairo_);
+  }
+  void fillWedge(const Point& center, double radius, double startAngle, double endAngle) override {
+    cairo_move_to(cairo_, center.x, center.y);
+    cairo_arc(cairo_, center.x, center.y, radius, startAngle, endAngle);
+    cairo_close_path(cairo_);
+    paintFill();
+  }
+  void drawImage(const ImageRef& image, const Rect& rect) override {
+    const auto* held = dynamic_cast<const GtkImageData*>(image.get());
+    if (!held || !GDK_IS_TEXTURE(held->paintable())) return;
+    GdkTexture* texture = GDK_TEXTURE(held->paintable());
+    cairo_surface_t* surface = cairo_image_surface_create(CAIRO_FORMAT_ARGB32, gdk_texture_get_width(texture),
+                                                          gdk_texture_get_height(texture));
+    gdk_texture_download(texture, cairo_image_surface_get_data(surface),
+                         static_cast<gsize>(cairo_image_surface_get_stride(surface)));
+    cairo_surface_mark_dirty(surface);
+    cairo_save(cairo_);
+    cairo_translate(cairo_, rect.x, rect.y);
+    cairo_scale(cairo_, rect.width / gdk_texture_get_width(texture), rect.height / gdk_texture_get_height(texture));
+    cairo_set_source_surface(cairo_, surface, 0, 0);
+    cairo_paint(cairo_);
+    cairo_restore(cairo_);
+    cairo_surface_destroy(surface);
+  }
+
+ private:
+  void use(const Color& color) { cairo_set_source_rgba(cairo_, color.red, color.green, color.blue, color.alpha); }
+  void paintFill() {
+    use(fill_);
+    cairo_fill(cairo_);
+  }
+  void ellipse(const Rect& rect) {
+    cairo_save(cairo_);
+    cairo_translate(cairo_, rect.x + rect.width / 2, rect.y + rect.height / 2);
+    cairo_scale(cairo_, rect.width / 2, rect.height / 2);
+    cairo_new_sub_path(cairo_);
+    cairo_arc(cairo_, 0, 0, 1, 0, 2 * std::numbers::pi);
+    cairo_restore(cairo_);
+  }
+  cairo_t* cairo_;
+  Color fill_;
+  Color stroke_;
+};
+
+}  // namespace
+
+FontMetrics PangoGraphics::fontMetrics(const Font& font) {
+  const GRef<PangoLayout> layout = layoutOf("X", font);
+  PangoRectangle ink;
+  PangoRectangle logical;
+  pango_layout_get_extents(layout.get(), &ink, &logical);
+  const int baseline = pango_layout_get_baseline(layout.get());
+  FontMetrics metrics;
+  metrics.ascender = points(baseline);
+  metrics.descender = -points(logical.height - baseline);
+  metrics.capHeight = points(ink.height);
+  metrics.lineHeight = points(logical.height);
+  return metrics;
+}
+
+Size PangoGraphics::measure(const std::string& text, const Font& font, double maxWidth, int maxLines) {
+  const GRef<PangoLayout> layout = layoutOf(text, font);
+  if (maxWidth > 0) {
+    pango_layout_set_width(layout.get(), static_cast<int>(std::ceil(maxWidth * PANGO_SCALE)));
+    pango_layout_set_wrap(layout.get(), PANGO_WRAP_WORD_CHAR);
+    pango_layout_set_ellipsize(layout.get(), maxLines == 0 ? PANGO_ELLIPSIZE_NONE : PANGO_ELLIPSIZE_END);
+    if (maxLines > 0) pango_layout_set_height(layout.get(), -maxLines);
+  }
+  PangoRectangle logical;
+  pango_layout_get_extents(layout.get(), nullptr, &logical);
+  return {std::ceil(points(logical.width)), std::ceil(points(logical.height))};
+}
+
+ImageRef PangoGraphics::renderImage(const Size& size, const std::function<void(DrawingContext&)>& draw) {
+  const int width = std::max(1, static_cast<int>(std::ceil(size.width)));
+  const int height = std::max(1, static_cast<int>(std::ceil(size.height)));
+  cairo_surface_t* surface = cairo_image_surface_create(CAIRO_FORMAT_ARGB32, width, height);
+  cairo_t* cairo = cairo_create(surface);
+  CairoContext drawing(cairo);
+  draw(drawing);
+  cairo_destroy(cairo);
+  cairo_surface_flush(surface);
+  const auto stride = static_cast<gsize>(cairo_image_surface_get_stride(surface));
+  GBytes* bytes = g_bytes_new(cairo_image_surface_get_data(surface), stride * static_cast<gsize>(height));
+  GdkTexture* texture = gdk_memory_texture_new(width, height, GDK_MEMORY_DEFAULT, bytes, stride);
+  g_bytes_unref(bytes);
+  cairo_surface_destroy(surface);
+  return std::make_shared<GtkImageData>(GDK_PAINTABLE(texture), size.width, size.height);
+}
+
+ImageRef PangoGraphics::documentIcon(const std::string& fileName, const std::optional<std::string>&, IconFormat format) {
+  const int size = format == IconFormat::Large ? 128 : 32;
+  const std::string type = takeString(g_content_type_guess(fileName.c_str(), nullptr, 0, nullptr));
+  const GRef<GIcon> icon(g_content_type_get_icon(type.c_str()));
+  GtkIconTheme* theme = gtk_icon_theme_get_for_display(gdk_display_get_default());
+  GtkIconPaintable* paintable =
+      gtk_icon_theme_lookup_by_gicon(theme, icon.get(), size, 1, GTK_TEXT_DIR_NONE, static_cast<GtkIconLookupFlags>(0));
+  return std::make_shared<GtkImageData>(GDK_PAINTABLE(paintable), size, size);
+}
+
+}  // namespace vaelo

@@ -1,0 +1,55 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/gtk/root_list_screen.h"
+
+#include "host/gtk/list/folder_reader.h"
+#include "host/support/glib_ptr.h"
+
+namespace vaelo {
+
+void RootListScreen::fill() {
+  const std::string folder = presentedURL()->path();
+  ownFolder_.start(folder, [this](const FolderChanges&) { read(); }, [this] { folderWasRemoved(); });
+  mirror_.start(URL(folder).deletingLastPathComponent().path(), [this](const FolderChanges&) { read(); }, [] {});
+  read();
+}
+
+void RootListScreen::read() {
+  const std::string folder = presentedURL()->path();
+  worker_.run([this, folder]() -> std::function<void()> {
+    FolderReading reading = readFolder(folder);
+    return [this, folder, reading = std::move(reading)] {
+      std::vector<FolderEntry> entries;
+      const std::size_t count = reading.snapshot ? reading.snapshot->size() : 0;
+      std::size_t i = 0;
+      const auto add = [&] {
+        const std::string name(reading.snapshot->name(i));
+        entries.push_back({takeString(g_filename_display_name(name.c_str())), folder + "/" + name, reading.snapshot->kind(i), ""});
+      };
+      // Libraries stand behind the folders and before the documents.
+      for (; i < count && isListedAsFolder(reading.snapshot->kind(i)); ++i) add();
+      const std::vector<FolderEntry> own = libraries();
+      entries.insert(entries.end(), own.begin(), own.end());
+      for (; i < count; ++i) add();
+      folderView().setEntries(std::move(entries));
+      reportItems();
+    };
+  });
+}
+
+std::vector<FolderEntry> RootListScreen::libraries() const {
+  std::vector<FolderEntry> entries;
+  for (const CloudContainerRef& container : drive().allContainers()) {
+    const std::optional<URL> documents = container->documentsFolderURL();
+    if (!documents || container->identifier() == drive().defaultContainerIdentifier()) continue;
+    entries.push_back({container->localizedName(), documents->path(), EntryKind::Folder, "applications-other"});
+  }
+  return entries;
+}
+
+std::vector<std::string> RootListScreen::searchedFolders() const {
+  std::vector<std::string> folders{presentedURL()->path()};
+  for (const FolderEntry& library : libraries()) folders.push_back(library.path);
+  return folders;
+}
+
+}  // namespace vaelo

@@ -1,0 +1,48 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/host_platform.h"
+
+#include <glib.h>
+
+namespace vaelo {
+
+HostFolders HostFolders::fromEnvironment() {
+  const auto below = [](const char* folder, const char* rest) { return std::string(folder) + "/vaelo-drive" + rest; };
+  return {below(g_get_user_data_dir(), ""), below(g_get_user_config_dir(), "/preferences.ini"),
+          below(g_get_user_state_dir(), "/restoration.ini")};
+}
+
+HostPlatform::HostPlatform(const HostFolders& folders)
+    : drive_(folders.data, log_, queues_, notifications_),
+      documentStore_(drive_.index()),
+      fileProvider_(drive_.layout(), drive_.index(), queues_),
+      resourceValues_(drive_.layout(), drive_.index(), types_),
+      coordination_(folders.data + "/coordination.lock"),
+      preferences_(folders.preferencesFile, log_) {}
+
+HostPlatform::~HostPlatform() {
+  if (platform_) Platform::install(nullptr);
+}
+
+void HostPlatform::install(Application& application, ScreenFactory& screens) {
+  platform_.reset(new Platform{.application = application,
+                               .activityTracing = tracing_,
+                               .cloudDocuments = drive_,
+                               .characterClasses = characterClasses_,
+                               .documentStore = documentStore_,
+                               .fileCoordination = coordination_,
+                               .fileManager = fileManager_,
+                               .fileProvider = fileProvider_,
+                               .formatting = formatting_,
+                               .launchServices = launchServices_,
+                               .log = log_,
+                               .notifications = notifications_,
+                               .offers = offers_,
+                               .preferences = preferences_,
+                               .queues = queues_,
+                               .resourceValues = resourceValues_,
+                               .screens = screens,
+                               .types = types_});
+  Platform::install(platform_.get());
+}
+
+}  // namespace vaelo

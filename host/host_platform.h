@@ -1,0 +1,73 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <string>
+
+#include "host/desktop/gio_launch_services.h"
+#include "host/desktop/no_offers.h"
+#include "host/drive/local_cloud_documents.h"
+#include "host/drive/local_document_store.h"
+#include "host/drive/local_file_provider.h"
+#include "host/files/g_types.h"
+#include "host/files/glib_log.h"
+#include "host/files/glib_queues.h"
+#include "host/files/icu_character_classes.h"
+#include "host/files/icu_formatting.h"
+#include "host/files/ini_preferences.h"
+#include "host/files/local_file_coordination.h"
+#include "host/files/local_file_manager.h"
+#include "host/files/local_resource_values.h"
+#include "platform/platform.h"
+
+namespace vaelo {
+
+/// Where the program keeps its files (XDG Base Directory Specification).
+struct HostFolders {
+  std::string data;
+  std::string preferencesFile;
+  std::string restorationFile;
+  static HostFolders fromEnvironment();
+};
+
+/// The real services, made in the order in which they need each other; install() makes them the program's platform. The
+/// application loop and the screens are the caller's.
+class HostPlatform {
+ public:
+  explicit HostPlatform(const HostFolders& folders);
+  ~HostPlatform();
+  HostPlatform(const HostPlatform&) = delete;
+  HostPlatform& operator=(const HostPlatform&) = delete;
+
+  /// `application` and `screens` outlive the platform's use.
+  void install(Application& application, ScreenFactory& screens);
+  LocalCloudDocuments& drive() { return drive_; }
+  LogSink& log() { return log_; }
+  NotificationCenter& notifications() { return notifications_; }
+  GLibQueues& queues() { return queues_; }
+  ResourceValues& resourceValues() { return resourceValues_; }
+  FileManager& fileManager() { return fileManager_; }
+  FileCoordination& fileCoordination() { return coordination_; }
+  DocumentStore& documentStore() { return documentStore_; }
+  FileProvider& fileProvider() { return fileProvider_; }
+
+ private:
+  GLibLog log_;
+  GLibActivityTracing tracing_;
+  GLibQueues queues_;
+  NotificationCenter notifications_;
+  GTypes types_;
+  IcuCharacterClasses characterClasses_;
+  IcuFormatting formatting_;
+  LocalFileManager fileManager_;
+  LocalCloudDocuments drive_;
+  LocalDocumentStore documentStore_;
+  LocalFileProvider fileProvider_;
+  LocalResourceValues resourceValues_;
+  LocalFileCoordination coordination_;
+  GioLaunchServices launchServices_;
+  NoOffers offers_;
+  IniPreferences preferences_;
+  std::unique_ptr<Platform> platform_;
+};
+
+}  // namespace vaelo

@@ -1,0 +1,23 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "app/main.h"
+
+#include <libintl.h>
+
+#include <clocale>
+
+#include "host/desktop/restoration_store.h"
+#include "host/gtk/gtk_application_loop.h"
+#include "host/gtk/gtk_screens.h"
+#include "host/host_platform.h"
+
+int main(int argc, char** argv) {
+  std::setlocale(LC_ALL, "");
+  bind_textdomain_codeset("vaelo-drive", "UTF-8");
+  textdomain("vaelo-drive");
+  const vaelo::HostFolders folders = vaelo::HostFolders::fromEnvironment();
+  vaelo::HostPlatform platform(folders);
+  vaelo::GtkScreens screens(platform.drive());
+  vaelo::GtkApplicationLoop loop(screens, platform.notifications(), vaelo::RestorationStore(folders.restorationFile));
+  platform.install(loop, screens);
+  return vaelo::vaeloMain(argc, argv);
+}
