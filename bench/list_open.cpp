@@ -28,6 +28,14 @@ double processStart(char** argv) {
   return now();
 }
 
+long residentKibibytes() {
+  std::ifstream file("/proc/self/statm");
+  long total = 0;
+  long resident = 0;
+  file >> total >> resident;
+  return resident * (sysconf(_SC_PAGESIZE) / 1024);
+}
+
 struct Run {
   std::string folder;
   bool grid = false;

@@ -71,6 +71,12 @@ std::string validUtf8(std::string_view bytes) {
   return result;
 }
 
+/// What is shown for a name. The suffix of bookmarks and aliases says how they are stored, not what they are called.
+std::string shownName(std::string_view name, EntryKind kind) {
+  if (kind == EntryKind::Bookmark || kind == EntryKind::Alias) name = name.substr(0, name.rfind('.'));
+  return validUtf8(name);
+}
+
 /// Splices with few unchanged rows between them as one. No more than some hundred gaps can be wide.
 std::vector<Splice> joined(const std::vector<Splice>& splices, std::size_t size) {
   const std::size_t gap = size / 256;
@@ -179,7 +185,7 @@ std::string_view FolderModel::nameAt(std::size_t i) const { return entries_ ? (*
 EntryKind FolderModel::kindAt(std::size_t i) const { return entries_ ? (*entries_)[i].kind : snapshot_->kind(i); }
 
 std::string FolderModel::displayNameAt(std::size_t i) const {
-  return entries_ ? (*entries_)[i].displayName : validUtf8(snapshot_->name(i));
+  return entries_ ? (*entries_)[i].displayName : shownName(snapshot_->name(i), snapshot_->kind(i));
 }
 
 std::optional<std::size_t> FolderModel::indexOf(std::string_view name) const {
@@ -212,7 +218,7 @@ GObject* FolderModel::makeShownItem(guint position) {
 
   FolderItem item;
   item.name = name;
-  item.displayName = old ? validUtf8(name) : displayNameAt(i);
+  item.displayName = old ? shownName(name, transition_->old->kind(i)) : displayNameAt(i);
   item.kind = old ? transition_->old->kind(i) : kindAt(i);
   if (entries_) item.icon = (*entries_)[i].icon;
   item.finalized = [weak = std::weak_ptr(self_)](FolderItem& gone) {

@@ -52,10 +52,11 @@ void dropLayouts(Row* row) {
   g_clear_object(&row->second);
 }
 
+/// `small`: the second line, whose end matters least; of a name, beginning and extension matter.
 PangoLayout* makeLayout(GtkWidget* widget, const std::string& text, bool small, bool centered, int lines) {
   PangoLayout* layout = gtk_widget_create_pango_layout(widget, nullptr);
   pango_layout_set_text(layout, text.c_str(), static_cast<int>(text.size()));
-  pango_layout_set_ellipsize(layout, PANGO_ELLIPSIZE_MIDDLE);
+  pango_layout_set_ellipsize(layout, small ? PANGO_ELLIPSIZE_END : PANGO_ELLIPSIZE_MIDDLE);
   pango_layout_set_wrap(layout, PANGO_WRAP_WORD_CHAR);
   pango_layout_set_height(layout, -lines);
   // A line break in a name would make it two lines.

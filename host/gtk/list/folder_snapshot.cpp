@@ -1,27 +1,19 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/list/folder_snapshot.h"
 
-#include <strings.h>
-
 #include <unordered_set>
 
+#include "host/drive/alias_file.h"
+#include "host/drive/bookmark_file.h"
 #include "host/drive/packages.h"
 #include "host/gtk/list/name_order.h"
 
 namespace vaelo {
-namespace {
-
-bool hasSuffix(std::string_view name, std::string_view suffix) {
-  return name.size() > suffix.size() &&
-         strncasecmp(name.data() + name.size() - suffix.size(), suffix.data(), suffix.size()) == 0;
-}
-
-}  // namespace
 
 EntryKind kindOfName(std::string_view name, bool directory) {
   if (directory) return isPackageName(name) ? EntryKind::Package : EntryKind::Folder;
-  if (hasSuffix(name, ".vaelobookmark")) return EntryKind::Bookmark;
-  return hasSuffix(name, ".desktop") ? EntryKind::Alias : EntryKind::Document;
+  if (isBookmarkName(name)) return EntryKind::Bookmark;
+  return isAliasName(name) ? EntryKind::Alias : EntryKind::Document;
 }
 
 void FolderSnapshot::Draft::add(std::string_view name, EntryKind kind) {

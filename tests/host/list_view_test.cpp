@@ -1,0 +1,208 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include <gtest/gtest.h>
+#include <unistd.h>
+
+#include "host/gtk/list/folder_reader.h"
+#include "host/gtk/list/folder_view.h"
+#include "tests/host/list_test_folder.h"
+
+namespace vaelo {
+namespace {
+
+using list_test::TestFolder;
+using list_test::waitUntil;
+
+/// A view in a window, where there is a display.
+class FolderViewTest : public testing::Test {
+ protected:
+  void SetUp() override {
+    if (!gtk_init_check()) GTEST_SKIP() << "no display";
+    adw_init();
+    view_ = std::make_unique<FolderView>();
+    view_->setEvents({.activated = [this](const std::string& name) { activated_ = name; },
+                      .itemsChanged = [this] { ++itemsChanges_; },
+                      .selectionChanged = [this] { ++selectionChanges_; },
+                      .folderRemoved = [this] { removed_ = true; },
+                      .readFailed = [this](int error) { error_ = error; },
+                      .contextRequested = nullptr});
+    window_ = gtk_window_new();
+    gtk_window_set_default_size(GTK_WINDOW(window_), 400, 500);
+    gtk_window_set_child(GTK_WINDOW(window_), view_->widget());
+    gtk_window_present(GTK_WINDOW(window_));
+  }
+  void TearDown() override {
+    if (!window_) return;
+    gtk_window_destroy(GTK_WINDOW(window_));
+    view_.reset();
+  }
+
+  void open() {
+    view_->setFolder(folder_.path());
+    ASSERT_TRUE(waitUntil([&] { return view_->loaded(); }));
+  }
+  std::vector<std::string> names() const {
+    std::vector<std::string> result;
+    for (std::size_t i = 0; i < view_->itemCount(); ++i) result.push_back(view_->nameAt(i));
+    return result;
+  }
+  GtkWidget* shownPage() const { return gtk_stack_get_visible_child(GTK_STACK(view_->widget())); }
+  GtkWidget* list() const { return gtk_scrolled_window_get_child(GTK_SCROLLED_WINDOW(shownPage())); }
+
+  TestFolder folder_;
+  GtkWidget* window_ = nullptr;
+  std::unique_ptr<FolderView> view_;
+  std::string activated_;
+  int itemsChanges_ = 0;
+  int selectionChanges_ = 0;
+  bool removed_ = false;
+  int error_ = 0;
+};
+
+TEST_F(FolderViewTest, FollowsTheFolder) {
+  folder_.write("file 10");
+  folder_.write("file 2");
+  open();
+  EXPECT_EQ(names(), (std::vector<std::string>{"file 2", "file 10"}));
+  view_->setSelection({"file 10"});
+  EXPECT_EQ(selectionChanges_, 0);
+
+  folder_.write("file 3");
+  folder_.makeFolder("z");
+  ASSERT_TRUE(waitUntil([&] { return view_->itemCount() == 4; }));
+  EXPECT_EQ(names(), (std::vector<std::string>{"z", "file 2", "file 3", "file 10"}));
+  EXPECT_EQ(view_->selection(), (std::vector<std::string>{"file 10"}));
+
+  folder_.remove("file 10");
+  ASSERT_TRUE(waitUntil([&] { return view_->itemCount() == 3; }));
+  EXPECT_TRUE(view_->selection().empty());
+  EXPECT_EQ(selectionChanges_, 1);
+  EXPECT_GE(itemsChanges_, 3);
+}
+
+TEST_F(FolderViewTest, ManyChangesASecondAllArrive) {
+  open();
+  for (int i = 0; i < 5000; ++i) folder_.write("file " + std::to_string(i));
+  ASSERT_TRUE(waitUntil([&] { return view_->itemCount() == 5000; }));
+  for (int i = 0; i < 5000; i += 2) folder_.remove("file " + std::to_string(i));
+  ASSERT_TRUE(waitUntil([&] { return view_->itemCount() == 2500; }));
+  EXPECT_EQ(view_->nameAt(0), "file 1");
+}
+
+TEST_F(FolderViewTest, VisibleRowsGetTheirDetails) {
+  for (int i = 0; i < 300; ++i) folder_.write("file " + std::to_string(i), std::string(2500, 'x'));
+  open();
+  const auto detailsOf = [&](const std::string& name) {
+    FolderItem* item = view_->model().liveItem(name);
+    return item && item->details ? item->details->secondLine : std::string();
+  };
+  EXPECT_TRUE(waitUntil([&] { return !detailsOf("file 0").empty(); }));
+  EXPECT_NE(detailsOf("file 0").find("2.5"), std::string::npos);
+  EXPECT_EQ(detailsOf("file 299"), "");
+  folder_.write("file 0", "four");
+  EXPECT_TRUE(waitUntil([&] { return detailsOf("file 0").find("4 bytes") != std::string::npos; }));
+}
+
+TEST_F(FolderViewTest, PressOpensAndSelectsWhileEditing) {
+  folder_.write("a");
+  folder_.write("b");
+  open();
+  g_signal_emit_by_name(list(), "activate", 1U);
+  EXPECT_EQ(activated_, "b");
+  activated_.clear();
+  view_->setEditing(true);
+  g_signal_emit_by_name(list(), "activate", 0U);
+  EXPECT_EQ(activated_, "");
+  EXPECT_EQ(view_->selection(), (std::vector<std::string>{"a"}));
+  EXPECT_EQ(selectionChanges_, 1);
+  g_signal_emit_by_name(list(), "activate", 0U);
+  EXPECT_TRUE(view_->selection().empty());
+  view_->setSelection({"b"});
+  view_->setEditing(false);
+  EXPECT_TRUE(view_->selection().empty());
+  EXPECT_EQ(selectionChanges_, 2);
+}
+
+TEST_F(FolderViewTest, EmptyUnreadableAndRemovedFoldersAreSaid) {
+  open();
+  EXPECT_TRUE(ADW_IS_STATUS_PAGE(shownPage()));
+  EXPECT_STREQ(adw_status_page_get_title(ADW_STATUS_PAGE(shownPage())), "This folder is empty");
+  folder_.write("file");
+  ASSERT_TRUE(waitUntil([&] { return view_->itemCount() == 1; }));
+  EXPECT_TRUE(GTK_IS_SCROLLED_WINDOW(shownPage()));
+  std::filesystem::remove_all(folder_.path());
+  EXPECT_TRUE(waitUntil([&] { return removed_; }));
+
+  folder_.write("file");
+  view_->setFolder(folder_.path());
+  EXPECT_TRUE(waitUntil([&] { return error_ != 0; }));
+  EXPECT_EQ(error_, ENOENT);
+  EXPECT_STREQ(adw_status_page_get_title(ADW_STATUS_PAGE(shownPage())), "This folder can’t be read");
+}
+
+TEST_F(FolderViewTest, GridShowsTheSameRows) {
+  for (int i = 0; i < 50; ++i) folder_.write("file " + std::to_string(i));
+  open();
+  view_->setSelection({"file 3"});
+  view_->setMode(FolderView::Mode::Grid);
+  EXPECT_TRUE(GTK_IS_GRID_VIEW(list()));
+  EXPECT_EQ(view_->selection(), (std::vector<std::string>{"file 3"}));
+  EXPECT_TRUE(waitUntil([&] {
+    FolderItem* item = view_->model().liveItem("file 0");
+    return item && item->details;
+  }));
+}
+
+TEST_F(FolderViewTest, SuppliedEntriesReplaceTheFolder) {
+  folder_.write("file");
+  open();
+  view_->setEntries({{"Library", "/nowhere/one", EntryKind::Folder, ""}, {"Alpha", "/nowhere/two", EntryKind::Folder, ""}});
+  EXPECT_EQ(names(), (std::vector<std::string>{"/nowhere/one", "/nowhere/two"}));
+  g_signal_emit_by_name(list(), "activate", 1U);
+  EXPECT_EQ(activated_, "/nowhere/two");
+}
+
+TEST_F(FolderViewTest, GoesAwayWhileReading) {
+  for (int i = 0; i < 1000; ++i) folder_.write("file " + std::to_string(i));
+  view_->setFolder(folder_.path());
+  gtk_window_destroy(GTK_WINDOW(window_));
+  window_ = nullptr;
+  view_.reset();
+  // Another reading of the folder ends later than the one that nobody waits for any longer.
+  bool later = false;
+  Worker worker;
+  worker.run([&later, path = folder_.path()]() -> std::function<void()> {
+    readFolder(path);
+    return [&later] { later = true; };
+  });
+  EXPECT_TRUE(waitUntil([&] { return later; }));
+}
+
+TEST(TypeAhead, FindsBeginnings) {
+  FolderSnapshot::Draft draft;
+  for (const char* name : {"Alpha", "alpine", "beta", "\u00c9tude", "\u4e2d\u6587", "Zebra"})
+    draft.add(name, EntryKind::Document);
+  FolderModel model;
+  model.setSnapshot(FolderSnapshot::sorted(std::move(draft)));
+  const auto typed = [&](const std::string& letters, std::size_t from) {
+    TypeAhead typeAhead;
+    std::optional<std::size_t> found;
+    for (std::size_t i = 0; i < letters.size();) {
+      const auto length = static_cast<std::size_t>(g_utf8_next_char(letters.c_str() + i) - (letters.c_str() + i));
+      found = typeAhead.type(model, letters.substr(i, length), 1000, from);
+      if (found) from = *found;
+      i += length;
+    }
+    return found ? std::string(model.nameAt(*found)) : std::string();
+  };
+  const std::size_t last = model.itemCount() - 1;
+  EXPECT_EQ(typed("a", last), "Alpha");
+  EXPECT_EQ(typed("ALPI", last), "alpine");
+  EXPECT_EQ(typed("aa", last), "alpine");
+  EXPECT_EQ(typed("z", last), "Zebra");
+  EXPECT_EQ(typed("\u00e9t", last), "\u00c9tude");
+  EXPECT_EQ(typed("\u4e2d", last), "\u4e2d\u6587");
+  EXPECT_EQ(typed("q", last), "");
+}
+
+}  // namespace
+}  // namespace vaelo
