@@ -11,8 +11,10 @@ namespace vaelo {
 class RestorationStore {
  public:
   explicit RestorationStore(std::string path) : path_(std::move(path)) {}
-  /// Only URLs and integers are kept.
+  /// Only URLs and integers are kept, the former with their folder hint. A failure costs the user one tap after the next
+  /// start, so it is not told.
   void save(const Dictionary& values);
+  /// Empty when nothing was kept or the file is damaged.
   Dictionary load() const;
 
  private:

@@ -2,7 +2,10 @@
 #include "host/files/glib_queues.h"
 
 #include <glib.h>
+#include <sys/resource.h>
+#include <unistd.h>
 
+#include <algorithm>
 #include <atomic>
 #include <condition_variable>
 #include <deque>
@@ -20,8 +23,9 @@ gboolean runBlock(gpointer held) {
 }
 
 void post(GMainContext* context, std::chrono::nanoseconds delay, Block block) {
-  const auto milliseconds = std::chrono::ceil<std::chrono::milliseconds>(delay).count();
+  const auto milliseconds = std::min<std::int64_t>(std::chrono::ceil<std::chrono::milliseconds>(delay).count(), G_MAXINT);
   GSource* source = delay.count() > 0 ? g_timeout_source_new(static_cast<guint>(milliseconds)) : g_idle_source_new();
+  // The same for both, so that blocks run in the order in which they came.
   g_source_set_priority(source, G_PRIORITY_DEFAULT);
   g_source_set_callback(source, runBlock, new Block(std::move(block)), [](gpointer held) { delete static_cast<Block*>(held); });
   g_source_attach(source, context);
@@ -58,6 +62,9 @@ class SerialQueue : public DispatchQueue {
     if (!thread_.joinable()) {
       thread_ = std::thread([context = g_main_context_ref(context_), stopping = stopping_] {
         while (!*stopping) g_main_context_iteration(context, TRUE);
+        // What was queued before the queue was let go of still runs; what was delayed does not.
+        while (g_main_context_iteration(context, FALSE)) {
+        }
         g_main_context_unref(context);
       });
     }
@@ -96,7 +103,14 @@ class ThreadedOperations : public OperationQueue {
     const std::lock_guard lock(shared_->mutex);
     shared_->waiting.push_back(std::move(operation));
     constexpr std::size_t limit = 2;
-    if (shared_->idle == 0 && threads_.size() < limit) threads_.emplace_back([shared = shared_] { work(*shared); });
+    if (shared_->idle < shared_->waiting.size() && threads_.size() < limit) {
+      threads_.emplace_back([shared = shared_, quality = quality_] {
+        const bool patient = quality == QualityOfService::Utility || quality == QualityOfService::Background;
+        // Of this thread alone; what nobody waits for must not slow down what the user sees.
+        if (patient) setpriority(PRIO_PROCESS, static_cast<id_t>(gettid()), 10);
+        work(*shared);
+      });
+    }
     shared_->changed.notify_one();
   }
   std::string name() const override { return name_; }

@@ -1,12 +1,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/files/icu_character_classes.h"
 
-#include <unicode/coll.h>
 #include <unicode/uchar.h>
 #include <unicode/unistr.h>
 #include <unicode/utf8.h>
-
-#include <memory>
 
 namespace vaelo {
 
@@ -29,6 +26,14 @@ bool isNewline(UChar32 c) { return c == 0x0A || c == 0x0B || c == 0x0C || c == 0
 bool isTrimmed(UChar32 c) { return c >= 0 && (isNewline(c) || c == '\t' || u_charType(c) == U_SPACE_SEPARATOR); }
 
 }  // namespace
+
+IcuCharacterClasses::IcuCharacterClasses() {
+  UErrorCode status = U_ZERO_ERROR;
+  std::unique_ptr<icu::Collator> collator(icu::Collator::createInstance(status));
+  if (U_FAILURE(status)) return;
+  collator->setStrength(icu::Collator::SECONDARY);
+  collator_ = std::move(collator);
+}
 
 bool IcuCharacterClasses::containsIllegalCharacter(const std::string& text) {
   return anyCharacter(text, [](UChar32 c) { return c < 0 || u_charType(c) == U_UNASSIGNED || U_IS_UNICODE_NONCHAR(c); });
@@ -59,11 +64,7 @@ std::string IcuCharacterClasses::trimmingWhitespaceAndNewlines(const std::string
 }
 
 bool IcuCharacterClasses::localizedCaseInsensitiveEquals(const std::string& a, const std::string& b) {
-  UErrorCode status = U_ZERO_ERROR;
-  const std::unique_ptr<icu::Collator> collator(icu::Collator::createInstance(status));
-  if (U_FAILURE(status)) return a == b;
-  collator->setStrength(icu::Collator::SECONDARY);
-  return collator->equals(icu::UnicodeString::fromUTF8(a), icu::UnicodeString::fromUTF8(b));
+  return collator_ ? collator_->equals(icu::UnicodeString::fromUTF8(a), icu::UnicodeString::fromUTF8(b)) : a == b;
 }
 
 }  // namespace vaelo

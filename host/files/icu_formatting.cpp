@@ -3,11 +3,9 @@
 
 #include <glib.h>
 #include <libintl.h>
-#include <unicode/datefmt.h>
-#include <unicode/numberformatter.h>
 
-#include <array>
-#include <memory>
+#include <cmath>
+#include <iterator>
 
 namespace vaelo {
 
@@ -25,45 +23,50 @@ constexpr CountTexts Counts[] = {
     {".DICT.MOVE_ITEMS.%d", "Move %@ Item", "Move %@ Items"},
     {".DICT.CANNOT_MOVE_ITEMS.%d", "%@ item can’t be moved.", "%@ items can’t be moved."},
     {".DICT.CANNOT_DELETE_ITEMS.%d", "%@ item can’t be deleted.", "%@ items can’t be deleted."},
-    {".DICT.AVAILABLE.%g", "%@ available", "%@ available"},
+    {".DICT.AVAILABLE.%g", "%2$@ available", "%2$@ available"},
 };
 
-std::string countText(const std::string& key, unsigned long count) {
+/// The text for a counted key by its English forms; any other key is its own English text.
+std::string textFor(const std::string& key, std::uint64_t count) {
   for (const CountTexts& texts : Counts) {
-    if (key == texts.key) return ngettext(texts.one, texts.many, count);
+    if (key == texts.key) return ngettext(texts.one, texts.many, static_cast<unsigned long>(count));
   }
-  return key;
+  return gettext(key.c_str());
 }
 
-std::string localizedNumber(double number, int fractionDigits) {
-  UErrorCode status = U_ZERO_ERROR;
-  std::string text;
-  icu::number::NumberFormatter::withLocale(icu::Locale::getDefault())
-      .precision(icu::number::Precision::maxFraction(fractionDigits))
-      .formatDouble(number, status)
-      .toString(status)
-      .toUTF8String(text);
-  return U_SUCCESS(status) ? text : std::to_string(number);
+/// The user's choice for one purpose ("LC_TIME"), read as the C library reads it, but whether or not that has been done yet;
+/// where there is none, what most computers are set to.
+std::string userLocale(const char* purpose) {
+  for (const char* variable : {"LC_ALL", purpose, "LANG"}) {
+    const char* name = g_getenv(variable);
+    const std::string text = name ? name : "";
+    if (!text.empty()) return text == "POSIX" || text == "C" || text.starts_with("C.") ? "en_US" : text;
+  }
+  return "en_US";
 }
 
 struct Amount {
   double number;
   int fractionDigits;
-  const char* unit;
+  const char* unit;  ///< null for bytes
 };
 
 Amount amountOf(std::uint64_t bytes, ByteCountStyle style) {
-  constexpr std::array<const char*, 7> units{"bytes", "KB", "MB", "GB", "TB", "PB", "EB"};
+  struct Unit {
+    const char* name;
+    int fractionDigits;
+  };
+  constexpr Unit units[] = {{nullptr, 0}, {"KB", 0}, {"MB", 1}, {"GB", 2}, {"TB", 2}, {"PB", 2}, {"EB", 2}};
   const double base = style == ByteCountStyle::Binary ? 1024 : 1000;
   auto number = static_cast<double>(bytes);
-  std::size_t unit = 0;
-  // What would be shown as 1000 of a unit is shown as 1 of the next.
-  while (number >= base - 0.5 && unit + 1 < units.size()) {
+  std::size_t at = 0;
+  // What would be rounded to 1000 of a unit is shown as 1 of the next.
+  const auto limit = [&] { return base - (at == 0 ? 0 : 0.5 / std::pow(10, units[at].fractionDigits)); };
+  while (number >= limit() && at + 1 < std::size(units)) {
     number /= base;
-    ++unit;
+    ++at;
   }
-  const int digits = unit <= 1 ? 0 : unit == 2 ? 1 : 2;
-  return {number, digits, units[unit]};
+  return {number, units[at].fractionDigits, units[at].name};
 }
 
 icu::DateFormat::EStyle icuStyle(DateStyle style) {
@@ -78,38 +81,63 @@ icu::DateFormat::EStyle icuStyle(DateStyle style) {
 
 }  // namespace
 
+IcuFormatting::IcuFormatting() : IcuFormatting(userLocale("LC_NUMERIC"), userLocale("LC_TIME")) {}
+
+IcuFormatting::IcuFormatting(const std::string& numbers, const std::string& dates)
+    : dates_(icu::Locale::createCanonical(dates.c_str())) {
+  for (int digits = 0; digits < 3; ++digits) {
+    numbers_[digits] = icu::number::NumberFormatter::withLocale(icu::Locale::createCanonical(numbers.c_str()))
+                           .precision(icu::number::Precision::maxFraction(digits))
+                           .roundingMode(UNUM_ROUND_HALFUP);
+  }
+}
+
+std::string IcuFormatting::localizedNumber(double number, int fractionDigits) const {
+  UErrorCode status = U_ZERO_ERROR;
+  std::string text;
+  numbers_[fractionDigits].formatDouble(number, status).toString(status).toUTF8String(text);
+  return U_SUCCESS(status) ? text : std::to_string(number);
+}
+
 std::string IcuFormatting::byteCount(std::uint64_t bytes, ByteCountStyle style, bool withUnit) {
   const Amount amount = amountOf(bytes, style);
   if (!withUnit) {
-    // Plain digits: the caller reads the number back.
-    std::array<char, 64> digits{};
-    g_ascii_formatd(digits.data(), static_cast<int>(digits.size()), "%.2f", amount.number);
-    return digits.data();
+    const double scale = amount.fractionDigits == 0 ? 1 : amount.fractionDigits == 1 ? 10 : 100;
+    char digits[G_ASCII_DTOSTR_BUF_SIZE];
+    return g_ascii_formatd(digits, sizeof digits, "%.12g", std::round(amount.number * scale) / scale);
   }
   const std::string number = localizedNumber(amount.number, amount.fractionDigits);
+  if (amount.unit == nullptr) return filled(ngettext("%@ byte", "%@ bytes", static_cast<unsigned long>(bytes)), {number});
   return filled(gettext("%@ %@"), {number, gettext(amount.unit)});
 }
 
 std::string IcuFormatting::localizedDate(Date date, DateStyle dateStyle, DateStyle timeStyle) {
-  const std::unique_ptr<icu::DateFormat> format(icu::DateFormat::createDateTimeInstance(
-      icuStyle(dateStyle), icuStyle(timeStyle), icu::Locale::getDefault()));
-  if (!format) return "";
+  if (dateStyle == DateStyle::None && timeStyle == DateStyle::None) return "";
   const auto milliseconds = std::chrono::duration<double, std::milli>(date.time_since_epoch()).count();
   icu::UnicodeString text;
+  const std::lock_guard lock(mutex_);
+  std::unique_ptr<icu::DateFormat>& format = dateFormats_[{dateStyle, timeStyle}];
+  if (!format) format.reset(icu::DateFormat::createDateTimeInstance(icuStyle(dateStyle), icuStyle(timeStyle), dates_));
+  if (!format) return "";
   format->format(static_cast<UDate>(milliseconds), text);
   std::string result;
   return text.toUTF8String(result);
 }
 
-std::string IcuFormatting::localizedString(const std::string& key) { return key.empty() ? key : gettext(key.c_str()); }
+std::string IcuFormatting::localizedString(const std::string& key) {
+  // The empty key is that of the catalogue's header.
+  return key.empty() ? key : textFor(key, 2);
+}
 
 std::string IcuFormatting::localizedCount(const std::string& key, std::int64_t count) {
-  return filled(countText(key, static_cast<unsigned long>(count < 0 ? -count : count)),
-                {localizedNumber(static_cast<double>(count), 0)});
+  const std::uint64_t plain = count < 0 ? 0 - static_cast<std::uint64_t>(count) : static_cast<std::uint64_t>(count);
+  return filled(textFor(key, plain), {localizedNumber(static_cast<double>(count), 0)});
 }
 
 std::string IcuFormatting::localizedAmount(const std::string& key, double number, const std::string& text) {
-  return filled(countText(key, number == 1 ? 1 : 2), {text});
+  char digits[G_ASCII_DTOSTR_BUF_SIZE];
+  g_ascii_formatd(digits, sizeof digits, "%g", number);
+  return filled(textFor(key, number == 1 ? 1 : 2), {digits, text});
 }
 
 std::string IcuFormatting::filled(const std::string& format, const std::vector<std::string>& arguments) {

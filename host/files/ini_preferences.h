@@ -1,13 +1,14 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include "host/support/glib_ptr.h"
+#include "host/drive/small_file.h"
 #include "platform/logging.h"
 #include "platform/preferences.h"
 
 namespace vaelo {
 
-/// Preferences in a key file, read once and written at each change. Main thread.
+/// Preferences in a key file, read once and written at each change. What can't be written is kept until the program ends, and
+/// the log tells. Main thread.
 class IniPreferences : public Preferences {
  public:
   IniPreferences(std::string path, LogSink& log);
@@ -20,7 +21,7 @@ class IniPreferences : public Preferences {
 
   std::string path_;
   LogSink& log_;
-  GKeyFilePtr file_;
+  KeyFile file_;
 };
 
 }  // namespace vaelo

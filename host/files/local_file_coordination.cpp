@@ -5,19 +5,22 @@
 #include <sys/file.h>
 
 #include <algorithm>
-#include <thread>
+#include <cerrno>
 
+#include "host/drive/small_file.h"
 #include "host/support/unique_fd.h"
 
 namespace vaelo {
 
 struct LocalFileCoordination::Access {
   std::vector<URL> urls;
-  bool writes;
+  bool writes = false;
   std::thread::id thread;
+  bool underWay = false;
+  /// Its thread has another access under way. It does not queue behind those that wait for that one.
+  bool nested = false;
 
   bool excludes(const Access& other) const {
-    // One thread never waits for itself: an accessor may coordinate again.
     if ((!writes && !other.writes) || thread == other.thread) return false;
     return std::any_of(urls.begin(), urls.end(), [&](const URL& mine) {
       return std::any_of(other.urls.begin(), other.urls.end(),
@@ -29,84 +32,90 @@ struct LocalFileCoordination::Access {
 /// Waits for its turn when made; gives it up when it goes.
 class LocalFileCoordination::Turn {
  public:
-  Turn(LocalFileCoordination& owner, std::vector<URL> urls, bool writes)
-      : owner_(owner), access_{std::move(urls), writes, std::this_thread::get_id()} {
+  enum class Kind { MetadataRead, Read, Write };
+
+  Turn(LocalFileCoordination& owner, std::vector<URL> urls, Kind kind) : owner_(owner) {
+    access_.urls = std::move(urls);
+    access_.writes = kind == Kind::Write;
+    access_.thread = std::this_thread::get_id();
     std::unique_lock lock(owner_.mutex_);
-    const auto blocked = [this] {
-      return std::any_of(owner_.accesses_.begin(), owner_.accesses_.end(),
-                         [this](const Access* other) { return access_.excludes(*other); });
-    };
-    owner_.accessEnded_.wait(lock, [&] { return !blocked(); });
-    const bool nested = std::any_of(owner_.accesses_.begin(), owner_.accesses_.end(),
-                                    [this](const Access* other) { return other->thread == access_.thread; });
-    owner_.accesses_.push_back(&access_);
-    lock.unlock();
-    if (writes && !nested) {
-      lockFile_ = UniqueFd(open(owner_.lockFile_.c_str(), O_RDWR | O_CREAT | O_CLOEXEC, 0600));
-      // Without a lock file (a full or read-only disk) only the other instances are not waited for.
-      while (lockFile_ && flock(lockFile_.get(), LOCK_EX) != 0 && errno == EINTR) {
-      }
+    access_.nested = std::any_of(owner_.accesses_.begin(), owner_.accesses_.end(),
+                                 [this](const Access* other) { return other->thread == access_.thread; });
+    if (!access_.nested && kind != Kind::MetadataRead) {
+      // Before anything is held, so that nobody in this program waits for one who waits for another program.
+      lock.unlock();
+      lockBetweenPrograms(kind == Kind::Write ? LOCK_EX : LOCK_SH);
+      lock.lock();
     }
+    owner_.accesses_.push_back(&access_);
+    if (owner_.waitsForItself(access_)) {
+      std::erase(owner_.accesses_, &access_);
+      error_ = fileError(access_.writes ? FileErrorCode::WriteUnknown : FileErrorCode::ReadUnknown,
+                         access_.urls.front().path(), "two coordinated accesses would wait for each other");
+      return;
+    }
+    owner_.changed_.wait(lock, [this] { return owner_.obstaclesOf(access_).empty(); });
+    access_.underWay = true;
   }
   ~Turn() {
     {
       const std::lock_guard lock(owner_.mutex_);
       std::erase(owner_.accesses_, &access_);
     }
-    owner_.accessEnded_.notify_all();
+    owner_.changed_.notify_all();
   }
   Turn(const Turn&) = delete;
   Turn& operator=(const Turn&) = delete;
 
+  const std::optional<Error>& error() const { return error_; }
+
  private:
+  void lockBetweenPrograms(int mode) {
+    lockFile_ = UniqueFd(open(owner_.lockFile_.c_str(), O_RDWR | O_CREAT | O_NOFOLLOW | O_CLOEXEC, 0600));
+    while (lockFile_ && flock(lockFile_.get(), mode) != 0 && errno == EINTR) {
+    }
+  }
+
   LocalFileCoordination& owner_;
   Access access_;
   UniqueFd lockFile_;
+  std::optional<Error> error_;
 };
 
 class LocalFileCoordinator : public FileCoordinator {
  public:
   LocalFileCoordinator(LocalFileCoordination& owner, FilePresenter* presenter) : owner_(owner), presenter_(presenter) {}
 
-  std::optional<Error> coordinateReading(const URL& url, unsigned, const Accessor& accessor) override {
-    const LocalFileCoordination::Turn turn(owner_, {url}, false);
-    accessor(url);
-    return std::nullopt;
+  std::optional<Error> coordinateReading(const URL& url, unsigned options, const Accessor& accessor) override {
+    const bool metadataOnly = options & ReadingImmediatelyAvailableMetadataOnly;
+    const Turn turn(owner_, {url}, metadataOnly ? Turn::Kind::MetadataRead : Turn::Kind::Read);
+    if (!turn.error()) accessor(url);
+    return turn.error();
   }
 
   std::optional<Error> coordinateWriting(const URL& url, unsigned options, const Accessor& accessor) override {
-    if (options & WritingForDeleting) owner_.tellOfDeletion(url, presenter_);
-    const LocalFileCoordination::Turn turn(owner_, {url}, true);
+    if (options & WritingForDeleting) owner_.presenters_.itemWillBeDeleted(url, presenter_);
+    const Turn turn(owner_, {url}, Turn::Kind::Write);
+    if (turn.error()) return turn.error();
     accessor(url);
-    if (!(options & (WritingForDeleting | WritingForMoving))) {
-      for (const auto& registered : owner_.presentersOf(url, presenter_, false)) {
-        owner_.tell(registered, [](FilePresenter& presenter) { presenter.presentedItemDidChange(); });
-      }
-    }
+    if (!(options & (WritingForDeleting | WritingForMoving))) owner_.presenters_.itemChanged(url, presenter_);
     return std::nullopt;
   }
 
   std::optional<Error> coordinateWriting(const URL& first, unsigned, const URL& second, unsigned,
                                          const PairAccessor& accessor) override {
-    const LocalFileCoordination::Turn turn(owner_, {first, second}, true);
-    accessor(first, second);
-    return std::nullopt;
+    const Turn turn(owner_, {first, second}, Turn::Kind::Write);
+    if (!turn.error()) accessor(first, second);
+    return turn.error();
   }
 
+  /// Nothing to do: who presents the item is asked when it has moved, and none of them moves it meanwhile.
   void itemWillMove(const URL&, const URL&) override {}
-
-  void itemDidMove(const URL& from, const URL& to) override {
-    for (const auto& registered : owner_.presentersOf(from, presenter_, true)) {
-      owner_.tell(registered, [from, to](FilePresenter& presenter) {
-        const std::optional<URL> shown = presenter.presentedItemURL();
-        if (shown && shown->isInside(from)) {
-          presenter.presentedItemDidMoveToURL(URL(to.path() + shown->path().substr(from.path().size())));
-        }
-      });
-    }
-  }
+  void itemDidMove(const URL& from, const URL& to) override { owner_.presenters_.itemMoved(from, to, presenter_); }
 
  private:
+  using Turn = LocalFileCoordination::Turn;
+
   LocalFileCoordination& owner_;
   FilePresenter* presenter_;
 };
@@ -117,73 +126,36 @@ std::unique_ptr<FileCoordinator> LocalFileCoordination::makeCoordinator(FilePres
   return std::make_unique<LocalFileCoordinator>(*this, presenter);
 }
 
-void LocalFileCoordination::addFilePresenter(FilePresenter& presenter) {
-  auto registered = std::make_shared<Registered>();
-  registered->presenter = &presenter;
-  registered->queue = presenter.presentedItemOperationQueue();
-  const std::lock_guard lock(mutex_);
-  presenters_.push_back(std::move(registered));
-}
+void LocalFileCoordination::addFilePresenter(FilePresenter& presenter) { presenters_.add(presenter); }
+void LocalFileCoordination::removeFilePresenter(FilePresenter& presenter) { presenters_.remove(presenter); }
 
-void LocalFileCoordination::removeFilePresenter(FilePresenter& presenter) {
-  std::shared_ptr<Registered> found;
-  {
-    const std::lock_guard lock(mutex_);
-    const auto at = std::find_if(presenters_.begin(), presenters_.end(),
-                                 [&](const auto& registered) { return registered->presenter == &presenter; });
-    if (at == presenters_.end()) return;
-    found = *at;
-    presenters_.erase(at);
+std::vector<const LocalFileCoordination::Access*> LocalFileCoordination::obstaclesOf(const Access& access) const {
+  std::vector<const Access*> obstacles;
+  bool cameBefore = true;
+  for (const Access* other : accesses_) {
+    if (other == &access) {
+      cameBefore = false;
+    } else if ((other->underWay || (cameBefore && !access.nested)) && access.excludes(*other)) {
+      obstacles.push_back(other);
+    }
   }
-  // Recursive, since a presenter may remove itself inside its own callback.
-  const std::lock_guard calling(found->calling);
-  found->presenter = nullptr;
+  return obstacles;
 }
 
-std::vector<std::shared_ptr<LocalFileCoordination::Registered>> LocalFileCoordination::presentersOf(const URL& url,
-                                                                                                    FilePresenter* but,
-                                                                                                    bool below) {
-  std::vector<std::shared_ptr<Registered>> all;
-  {
-    const std::lock_guard lock(mutex_);
-    all = presenters_;
+bool LocalFileCoordination::waitsForItself(const Access& access) const {
+  std::vector<const Access*> waitedFor = obstaclesOf(access);
+  for (std::size_t i = 0; i < waitedFor.size(); ++i) {
+    // A thread waits with one access at most, and while it does, none of its others ends.
+    const std::thread::id thread = waitedFor[i]->thread;
+    if (thread == access.thread) return true;
+    for (const Access* other : accesses_) {
+      if (other->thread != thread || other->underWay) continue;
+      for (const Access* next : obstaclesOf(*other)) {
+        if (std::find(waitedFor.begin(), waitedFor.end(), next) == waitedFor.end()) waitedFor.push_back(next);
+      }
+    }
   }
-  std::erase_if(all, [&](const std::shared_ptr<Registered>& registered) {
-    const std::lock_guard calling(registered->calling);
-    if (!registered->presenter || registered->presenter == but) return true;
-    const std::optional<URL> shown = registered->presenter->presentedItemURL();
-    return !shown || !(below ? shown->isInside(url) : *shown == url);
-  });
-  return all;
-}
-
-void LocalFileCoordination::tell(const std::shared_ptr<Registered>& registered, std::function<void(FilePresenter&)> call) {
-  registered->queue->addOperation([registered, call = std::move(call)] {
-    const std::lock_guard calling(registered->calling);
-    if (registered->presenter) call(*registered->presenter);
-  });
-}
-
-void LocalFileCoordination::tellOfDeletion(const URL& url, FilePresenter* but) {
-  for (const auto& registered : presentersOf(url, but, true)) {
-    struct Answer {
-      std::mutex mutex;
-      std::condition_variable changed;
-      bool given = false;
-    };
-    const auto answer = std::make_shared<Answer>();
-    tell(registered, [answer](FilePresenter& presenter) {
-      presenter.accommodatePresentedItemDeletionWithCompletionHandler([answer](std::optional<Error>) {
-        const std::lock_guard lock(answer->mutex);
-        answer->given = true;
-        answer->changed.notify_all();
-      });
-    });
-    // A presenter that does not answer must not keep the user from deleting.
-    constexpr std::chrono::seconds patience(1);
-    std::unique_lock lock(answer->mutex);
-    answer->changed.wait_for(lock, patience, [&] { return answer->given; });
-  }
+  return false;
 }
 
 }  // namespace vaelo

@@ -2,20 +2,28 @@
 #pragma once
 
 #include <condition_variable>
+#include <map>
 #include <memory>
 #include <mutex>
 #include <string>
+#include <thread>
 #include <vector>
 
+#include "host/files/presenter_list.h"
 #include "platform/file_coordinator.h"
 
 namespace vaelo {
 
-/// Coordinates the accesses of this program, and of other instances of it on the same drive, to files and folders. An access
-/// waits for those under way to the same item, to what holds it and to what it holds, unless both read. Safe from any thread.
+/// Coordinates the accesses of this program, and of other instances of it on the same drive, to files and folders.
+///
+/// Within the program an access waits for those under way, and for those that came before it, to the same item, to what
+/// holds it and to what it holds, unless both read. A thread may coordinate again inside an accessor: it does not wait for
+/// itself. Threads that would wait for each other in a circle don't: the last one gets error 512. Between programs one lock
+/// file stands for the whole drive: a write excludes all other writes and reads of content, reads of metadata alone wait for
+/// nobody. Safe from any thread.
 class LocalFileCoordination : public FileCoordination {
  public:
-  /// `lockFile` is made when needed; while a write is under way other processes wait for it.
+  /// `lockFile` is made when needed. Where that is not possible, other programs are not waited for.
   explicit LocalFileCoordination(std::string lockFile);
   std::unique_ptr<FileCoordinator> makeCoordinator(FilePresenter* presenter = nullptr) override;
   void addFilePresenter(FilePresenter& presenter) override;
@@ -25,22 +33,15 @@ class LocalFileCoordination : public FileCoordination {
   friend class LocalFileCoordinator;
   struct Access;
   class Turn;
-  struct Registered {
-    FilePresenter* presenter;  // null once removed
-    std::shared_ptr<OperationQueue> queue;
-    std::recursive_mutex calling;  // held while a callback runs, so that removal can wait for it
-  };
 
-  std::vector<std::shared_ptr<Registered>> presentersOf(const URL& url, FilePresenter* but, bool below);
-  /// Runs `call` on the presenter's queue, unless it was removed before.
-  void tell(const std::shared_ptr<Registered>& registered, std::function<void(FilePresenter&)> call);
-  void tellOfDeletion(const URL& url, FilePresenter* but);
+  bool waitsForItself(const Access& access) const;
+  std::vector<const Access*> obstaclesOf(const Access& access) const;
 
-  std::string lockFile_;
-  std::mutex mutex_;  // guards all below
-  std::condition_variable accessEnded_;
-  std::vector<const Access*> accesses_;
-  std::vector<std::shared_ptr<Registered>> presenters_;
+  const std::string lockFile_;
+  PresenterList presenters_;  // has its own lock
+  std::mutex mutex_;          // guards all below
+  std::condition_variable changed_;
+  std::vector<const Access*> accesses_;  // waiting and under way, in the order in which they came
 };
 
 }  // namespace vaelo

@@ -3,21 +3,31 @@
 
 #include <fcntl.h>
 #include <glib.h>
-#include <linux/fs.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
 #include <cerrno>
-#include <cstdio>
+#include <climits>
 
-#include "host/drive/packages.h"
 #include "host/drive/promise_file.h"
-#include "host/files/file_copy.h"
+#include "host/files/file_move.h"
 #include "host/files/file_times.h"
 #include "host/files/system_error.h"
 #include "host/files/tree_walk.h"
 
 namespace vaelo {
+
+namespace {
+
+/// One directory entry under two spellings. Two names of a file (hard links) are two items.
+bool isSameItem(const std::string& a, const std::string& b) {
+  struct stat first {};
+  struct stat second {};
+  return lstat(a.c_str(), &first) == 0 && lstat(b.c_str(), &second) == 0 && first.st_dev == second.st_dev &&
+         first.st_ino == second.st_ino && (S_ISDIR(first.st_mode) || first.st_nlink == 1);
+}
+
+}  // namespace
 
 bool LocalFileManager::fileExistsAtPath(const std::string& path, bool* isDirectory) {
   struct stat info {};
@@ -29,7 +39,7 @@ bool LocalFileManager::fileExistsAtPath(const std::string& path, bool* isDirecto
 Result<FileAttributes> LocalFileManager::attributesOfItemAtPath(const std::string& path) {
   struct statx info {};
   if (statx(AT_FDCWD, path.c_str(), AT_SYMLINK_NOFOLLOW, STATX_BASIC_STATS | STATX_BTIME, &info) != 0) {
-    return errorFromErrno(errno, path, false);
+    return describedError(errno, path, FileAccess::Read);
   }
   FileAttributes attributes;
   attributes.type = S_ISREG(info.stx_mode)   ? FileType::Regular
@@ -45,52 +55,43 @@ Result<FileAttributes> LocalFileManager::attributesOfItemAtPath(const std::strin
 Result<std::string> LocalFileManager::destinationOfSymbolicLinkAtPath(const std::string& path) {
   char target[PATH_MAX];
   const ssize_t length = readlink(path.c_str(), target, sizeof target);
-  if (length < 0) return errorFromErrno(errno, path, false);
+  if (length < 0) return describedError(errno, path, FileAccess::Read);
   return std::string(target, static_cast<std::size_t>(length));
 }
 
 std::optional<Error> LocalFileManager::createDirectoryAtURL(const URL& url) {
   bool isDirectory = false;
-  if (fileExistsAtPath(url.path(), &isDirectory)) {
-    return isDirectory ? std::nullopt : std::optional(errorFromErrno(EEXIST, url.path(), true));
-  }
-  if (g_mkdir_with_parents(url.path().c_str(), 0777) != 0) return errorFromErrno(errno, url.path(), true);
+  if (fileExistsAtPath(url.path(), &isDirectory) && isDirectory) return std::nullopt;
+  // Also a link that leads nowhere, and an item that is not downloaded.
+  if (physicalPathOf(url.path())) return describedError(EEXIST, url.path(), FileAccess::Write);
+  if (g_mkdir_with_parents(url.path().c_str(), 0777) != 0) return describedError(errno, url.path(), FileAccess::Write);
   return std::nullopt;
 }
 
 std::optional<Error> LocalFileManager::removeItemAtURL(const URL& url) {
   const std::optional<std::string> physical = physicalPathOf(url.path());
-  if (!physical) return errorFromErrno(ENOENT, url.path(), true);
+  if (!physical) return describedError(ENOENT, url.path(), FileAccess::Write);
   return removeTree(*physical);
 }
 
 std::optional<Error> LocalFileManager::moveItemAtURL(const URL& source, const URL& destination) {
+  const std::string& to = destination.path();
   const std::optional<std::string> from = physicalPathOf(source.path());
-  if (!from) return errorFromErrno(ENOENT, source.path(), true);
-  const bool promised = *from != source.path();
-  const auto failed = [&](int number) {
-    Error error = errorFromErrno(number, number == EEXIST ? destination.path() : source.path(), true);
-    error.userInfo[DestinationFilePathErrorKey] = Value(destination.path());
-    return error;
-  };
+  if (!from) return moveError(ENOENT, source.path(), to);
   // The name may also be taken by an item that is not downloaded.
-  if (const auto taken = physicalPathOf(destination.path()); taken && *taken != *from) {
-    struct stat a {};
-    struct stat b {};
-    const bool sameFile = lstat(taken->c_str(), &a) == 0 && lstat(from->c_str(), &b) == 0 && a.st_dev == b.st_dev &&
-                          a.st_ino == b.st_ino && S_ISDIR(a.st_mode);
-    if (!sameFile) return failed(EEXIST);
+  if (const auto taken = physicalPathOf(to)) {
+    if (!isSameItem(*from, *taken)) return moveError(EEXIST, source.path(), to);
+    // A file system that does not tell case apart finds the item itself under its new name.
+    if (rename(from->c_str(), taken->c_str()) != 0) return moveError(errno, source.path(), to);
+    return std::nullopt;
   }
-  if (promised) return movePromise(*from, destination.path());
-  if (renameat2(AT_FDCWD, from->c_str(), AT_FDCWD, destination.path().c_str(), RENAME_NOREPLACE) == 0) return std::nullopt;
-  if (errno == EXDEV) return copyThenRemove(*from, destination.path());
-  return failed(errno);
+  return isPromiseName(URL(*from).lastPathComponent()) ? movePromise(*from, to) : moveFile(*from, to);
 }
 
 void LocalFileManager::enumerate(const URL& url, const std::vector<ResourceKey>&, unsigned options,
                                  const std::function<bool(const URL&)>& visit,
                                  const std::function<bool(const URL&, const Error&)>& onError) {
-  walkTree(url, options, visit, onError);
+  enumerateTree(url, options, visit, onError);
 }
 
 std::vector<std::string> LocalFileManager::userDocumentsDirectories() {

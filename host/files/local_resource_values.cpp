@@ -6,6 +6,8 @@
 #include <sys/stat.h>
 
 #include <cerrno>
+#include <climits>
+#include <cstdlib>
 
 #include "host/drive/alias_file.h"
 #include "host/drive/item_attributes.h"
@@ -13,13 +15,14 @@
 #include "host/drive/promise_file.h"
 #include "host/files/file_times.h"
 #include "host/files/system_error.h"
+#include "host/support/glib_ptr.h"
 
 namespace vaelo {
 
 /// Answers keys for one item, either from what stands on the disk or from a promise.
 class LocalResourceValues::Reader {
  public:
-  Reader(LocalResourceValues& owner, const URL& url) : owner_(owner), url_(url), name_(url.lastPathComponent()) {}
+  Reader(LocalResourceValues& owner, URL url) : owner_(owner), url_(std::move(url)), name_(url_.lastPathComponent()) {}
 
   int readFile(const std::string& path) {
     return statx(AT_FDCWD, path.c_str(), AT_SYMLINK_NOFOLLOW, STATX_BASIC_STATS | STATX_BTIME, &info_) == 0 ? 0 : errno;
@@ -29,7 +32,7 @@ class LocalResourceValues::Reader {
   Value valueOf(ResourceKey key) {
     switch (key) {
       case ResourceKey::Name: return name_;
-      case ResourceKey::LocalizedName: return takenDisplayName();
+      case ResourceKey::LocalizedName: return displayName();
       case ResourceKey::TypeIdentifier: return typeIdentifier();
       case ResourceKey::LocalizedTypeDescription: return typeDescription();
       case ResourceKey::FileSize:
@@ -53,19 +56,14 @@ class LocalResourceValues::Reader {
  private:
   bool isFolder() const { return promise_ ? promise_->package : S_ISDIR(info_.stx_mode); }
   bool isPackage() const { return promise_ ? promise_->package : S_ISDIR(info_.stx_mode) && isPackageName(name_); }
-  bool isAlias() const {
-    return !promise_ && S_ISREG(info_.stx_mode) && isAliasName(name_) && readAliasFile(url_.path()).value;
-  }
+  bool isAlias() const { return !promise_ && S_ISREG(info_.stx_mode) && isAliasName(name_) && readAliasFile(url_.path()); }
   /// A person reads text, whatever bytes the name has.
-  std::string takenDisplayName() const {
-    char* text = g_filename_display_name(name_.c_str());
-    std::string result = text;
-    g_free(text);
-    return result;
-  }
+  std::string displayName() const { return takeString(g_filename_display_name(name_.c_str())); }
   std::string typeIdentifier() const {
     if (!promise_ && S_ISLNK(info_.stx_mode)) return "public.symlink";
     if (isFolder() && !isPackage()) return "public.folder";
+    // Has no description of its own, so that the one below stands.
+    if (isAlias()) return "com.marrow.alias";
     const auto type = owner_.types_.preferredIdentifierForExtension(url_.pathExtension());
     return type.value_or(isPackage() ? "com.marrow.package" : "public.data");
   }
@@ -104,8 +102,8 @@ class LocalResourceValues::Reader {
   }
 
   LocalResourceValues& owner_;
-  const URL& url_;
-  std::string name_;
+  const URL url_;
+  const std::string name_;
   struct statx info_ {};
   std::optional<PromiseInfo> promise_;
   std::optional<std::string> role_;
@@ -127,31 +125,66 @@ ResourceMap valuesFor(Reader& reader, const std::vector<ResourceKey>& keys) {
   return values;
 }
 
+/// Of what isn't there callers ask with the code that stands for any missing item.
+Error errorFor(int number, const URL& url) {
+  Error error = describedError(number, url.path(), FileAccess::Read);
+  if (error.code == FileErrorCode::ReadNoSuchFile) error.code = FileErrorCode::NoSuchFile;
+  return error;
+}
+
 }  // namespace
 
 Result<ResourceMap> LocalResourceValues::resourceValues(const URL& url, const std::vector<ResourceKey>& keys) {
   Reader reader(*this, url);
-  if (const int failure = reader.readFile(url.path())) return errorFromErrno(failure, url.path(), false);
+  if (const int failure = reader.readFile(url.path())) return errorFor(failure, url);
   return valuesFor(reader, keys);
 }
 
 Result<ResourceMap> LocalResourceValues::promisedItemResourceValues(const URL& url, const std::vector<ResourceKey>& keys) {
-  Reader reader(*this, url);
-  const int failure = reader.readFile(url.path());
-  if (failure == 0) return valuesFor(reader, keys);
-  if (failure != ENOENT) return errorFromErrno(failure, url.path(), false);
-  const std::optional<std::string> physical = physicalPathOf(url.path());
-  if (!physical) return errorFromErrno(ENOENT, url.path(), false);
-  Result<PromiseInfo> promise = readPromise(*physical);
-  if (!promise.value) return *promise.error;
+  std::string promisePath = url.path();
+  if (!isPromiseName(url.lastPathComponent())) {
+    Reader reader(*this, url);
+    const int failure = reader.readFile(url.path());
+    if (failure == 0) return valuesFor(reader, keys);
+    const std::optional<std::string> physical = failure == ENOENT ? physicalPathOf(url.path()) : std::nullopt;
+    if (!physical) return errorFor(failure, url);
+    promisePath = *physical;
+  }
+  const std::optional<std::string> logical = logicalNameOf(promisePath);
+  Result<PromiseInfo> promise = readPromise(promisePath);
+  if (!promise || !logical) {
+    const bool gone = promise.error && promise.error->code == FileErrorCode::ReadNoSuchFile;
+    return errorFor(gone ? ENOENT : EIO, url);
+  }
+  Reader reader(*this, *logical == url.path() ? url : URL(*logical, promise.value->package));
   reader.usePromise(std::move(*promise.value));
   return valuesFor(reader, keys);
 }
 
 bool LocalResourceValues::promisedItemIsReachable(const URL& url) { return physicalPathOf(url.path()).has_value(); }
 
-URL LocalResourceValues::resolvingSymlinks(const URL& url) { return URL(realLocation(url.path())); }
+URL LocalResourceValues::resolvingSymlinks(const URL& url) {
+  const auto resolved = [](const std::string& path) -> std::optional<std::string> {
+    char real[PATH_MAX];
+    if (!realpath(path.c_str(), real)) return std::nullopt;
+    return real;
+  };
+  std::optional<std::string> path = resolved(url.path());
+  const std::optional<std::string> physical = path ? std::nullopt : physicalPathOf(url.path());
+  // An item that is not downloaded is no link itself, but may be reached through one.
+  if (physical && *physical != url.path()) {
+    path = resolved(url.deletingLastPathComponent().path());
+    if (path) *path += "/" + url.lastPathComponent();
+  }
+  return path && *path != url.path() ? URL(*path, url.hasDirectoryPath()) : url;
+}
 
-Result<URL> LocalResourceValues::resolveAliasFile(const URL& url) { return readAliasFile(url.path()); }
+Result<URL> LocalResourceValues::resolveAliasFile(const URL& url) {
+  Result<URL> target = readAliasFile(url.path());
+  if (target.error && !target.error->localizedDescription) {
+    target.error->localizedDescription = describedError(EIO, url.path(), FileAccess::Read).localizedDescription;
+  }
+  return target;
+}
 
 }  // namespace vaelo

@@ -1,51 +1,47 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/files/system_error.h"
 
-#include <glib.h>
+#include <libintl.h>
 
 #include <cerrno>
+
+#include "host/support/glib_ptr.h"
 
 namespace vaelo {
 
 namespace {
 
-struct Kind {
-  int code;
-  const char* words;
-};
-
-Kind kindOf(int number, bool writing) {
+/// Each has one "%s", the item's name.
+const char* wordsFor(int number) {
   switch (number) {
     case ENOENT:
-    case ENOTDIR: return {FileErrorCode::NoSuchFile, "The file “%s” doesn’t exist any more."};
+    case ENOTDIR: return gettext("The file “%s” doesn’t exist any more.");
     case EACCES:
-    case EPERM:
-      return {writing ? FileErrorCode::WriteNoPermission : FileErrorCode::ReadNoPermission,
-              "You don’t have permission to use “%s”."};
+    case EPERM: return gettext("You don’t have permission to use “%s”.");
     case EEXIST:
-    case ENOTEMPTY: return {FileErrorCode::WriteFileExists, "An item named “%s” already exists."};
-    case ENAMETOOLONG: return {FileErrorCode::WriteInvalidFileName, "The name “%s” is too long."};
+    case ENOTEMPTY: return gettext("An item named “%s” already exists.");
+    case ENAMETOOLONG: return gettext("The name “%s” is too long.");
+    case EILSEQ: return gettext("The disk can’t keep the name “%s”.");
     case ENOSPC:
-    case EDQUOT: return {FileErrorCode::WriteOutOfSpace, "There is not enough space for “%s”. Delete something and try again."};
-    case EROFS: return {FileErrorCode::WriteVolumeReadOnly, "“%s” is on a disk that can only be read."};
-    case ELOOP: return {FileErrorCode::ReadUnknown, "The links of “%s” run in a circle."};
-    default: return {writing ? FileErrorCode::WriteUnknown : FileErrorCode::ReadUnknown, "“%s” can’t be used."};
+    case EDQUOT: return gettext("There is not enough space for “%s”. Delete something and try again.");
+    case EROFS: return gettext("“%s” is on a disk that can only be read.");
+    case ELOOP: return gettext("The links of “%s” run in a circle.");
+    case EBUSY: return gettext("“%s” is being changed by another program. Try again later.");
+    default: return gettext("“%s” can’t be used.");
   }
 }
 
 }  // namespace
 
-Error errorFromErrno(int number, const std::string& path, bool writing) {
-  const Kind kind = kindOf(number, writing);
-  char* name = g_filename_display_basename(path.c_str());
-  // The words hold one %s each.
-#pragma GCC diagnostic push
-#pragma GCC diagnostic ignored "-Wformat-nonliteral"
-  char* text = g_strdup_printf(kind.words, name);
-#pragma GCC diagnostic pop
-  Error error{FileErrorDomain, kind.code, {{FilePathErrorKey, Value(path)}}, text, g_strerror(number)};
-  g_free(text);
-  g_free(name);
+Error describedError(int number, const std::string& path, FileAccess access) {
+  Error error = errorFromErrno(number, path, access);
+  if (number == ENOTEMPTY) error.code = FileErrorCode::WriteFileExists;
+  if (number == EILSEQ && access == FileAccess::Write) error.code = FileErrorCode::WriteInvalidFileName;
+  std::string words = wordsFor(number);
+  const std::string name = takeString(g_filename_display_basename(path.c_str()));
+  // Not printf: a translation must not be able to ask for more than the name.
+  if (const std::size_t at = words.find("%s"); at != std::string::npos) words.replace(at, 2, name);
+  error.localizedDescription = std::move(words);
   return error;
 }
 

@@ -3,12 +3,13 @@
 
 #include <string>
 
+#include "host/drive/small_file.h"
 #include "platform/error.h"
 
 namespace vaelo {
 
-/// The error for a failed system call: code and words by `number` (errno), the path in the user information. `writing` tells
-/// reads from changes, whose codes differ. The one place where system errors become ours.
-Error errorFromErrno(int number, const std::string& path, bool writing);
+/// errorFromErrno with words for a person, which name the item: what the user's own files fail with reaches an alert, what the
+/// drive's files fail with only the log.
+Error describedError(int number, const std::string& path, FileAccess access);
 
 }  // namespace vaelo

@@ -34,13 +34,16 @@ struct Entry {
 
 /// The names in an open folder, whose descriptor it takes; sets errno and answers nothing on failure.
 std::optional<std::vector<Entry>> readEntries(UniqueFd folder) {
+  if (!folder) return std::nullopt;
   const int fd = folder.get();
   DirPtr dir(fdopendir(fd));
   if (!dir) return std::nullopt;
   folder.release();
   std::vector<Entry> entries;
-  errno = 0;
-  while (const dirent* entry = readdir(dir.get())) {
+  for (;;) {
+    errno = 0;
+    const dirent* entry = readdir(dir.get());
+    if (!entry) break;
     const std::string name = entry->d_name;
     if (name == "." || name == "..") continue;
     bool isFolder = entry->d_type == DT_DIR;
@@ -61,29 +64,37 @@ class Walk {
        const std::function<bool(const URL&, const Error&)>& onError)
       : options_(options), visit_(visit), onError_(onError) {}
 
-  bool below(const URL& folder, int depth) {
-    const auto entries = readEntries(UniqueFd(open(folder.path().c_str(), depth == 0 ? FolderFlags & ~O_NOFOLLOW : FolderFlags)));
-    if (!entries) return onError_(folder, errorFromErrno(errno, folder.path(), false));
+  /// False when a callback ended the walk.
+  bool below(const URL& folder, const UniqueFd& open) {
+    // A second descriptor, since reading takes one and the folders below are opened from the first: whatever somebody puts in
+    // place of a folder above, the walk stays in the tree where it began.
+    const auto entries = open ? readEntries(UniqueFd(openat(open.get(), ".", FolderFlags))) : std::nullopt;
+    if (!entries) return onError_(folder, describedError(errno, folder.path(), FileAccess::Read));
     for (const Entry& entry : *entries) {
-      std::string path = folder.path() + "/" + entry.name;
-      if (isPromiseName(entry.name)) {
-        const std::optional<std::string> logical = logicalNameOf(path);
-        if (!logical) continue;
-        path = *logical;
-      } else if (entry.name.front() == '.' && (options_ & SkipsHiddenFiles)) {
-        continue;
-      }
-      if (!visit_(URL(path, entry.isFolder))) return false;
-      const bool skipsPackage = (options_ & SkipsPackageDescendants) && isPackageName(entry.name);
-      // Deeper than any path can be is a sign of a file system that lies.
-      constexpr int deepest = 2048;
-      if (!entry.isFolder || (options_ & SkipsSubdirectoryDescendants) || skipsPackage || depth == deepest) continue;
-      if (!below(URL(path, true), depth + 1)) return false;
+      const std::optional<std::string> name = logicalName(folder, entry, *entries);
+      if (!name || (name->front() == '.' && (options_ & SkipsHiddenFiles))) continue;
+      const URL url(folder.path() + "/" + *name, entry.isFolder);
+      if (!visit_(url)) return false;
+      if (!entry.isFolder || (options_ & SkipsSubdirectoryDescendants)) continue;
+      if ((options_ & SkipsPackageDescendants) && isPackageName(entry.name)) continue;
+      if (!below(url, UniqueFd(openat(open.get(), entry.name.c_str(), FolderFlags)))) return false;
     }
     return true;
   }
 
  private:
+  /// Nothing for a promise that stands for no item, or for one that is there itself.
+  static std::optional<std::string> logicalName(const URL& folder, const Entry& entry, const std::vector<Entry>& all) {
+    if (entry.isFolder || !isPromiseName(entry.name)) return entry.name;
+    const std::optional<std::string> path = logicalNameOf(folder.path() + "/" + entry.name);
+    if (!path) return std::nullopt;
+    std::string name = path->substr(path->rfind('/') + 1);
+    const auto at = std::lower_bound(all.begin(), all.end(), name,
+                                     [](const Entry& a, const std::string& b) { return a.name < b; });
+    if (at != all.end() && at->name == name) return std::nullopt;
+    return name;
+  }
+
   unsigned options_;
   const std::function<bool(const URL&)>& visit_;
   const std::function<bool(const URL&, const Error&)>& onError_;
@@ -91,8 +102,8 @@ class Walk {
 
 /// Empties the open folder; answers 0 or errno.
 int emptyFolder(UniqueFd folder) {
-  const int again = dup(folder.get());
-  const UniqueFd keeper(again);
+  const UniqueFd keeper(dup(folder.get()));
+  if (!keeper) return errno;
   const auto entries = readEntries(std::move(folder));
   if (!entries) return errno;
   for (const Entry& entry : *entries) {
@@ -104,29 +115,33 @@ int emptyFolder(UniqueFd folder) {
         return errno;
       }
     }
-    if (unlinkat(keeper.get(), entry.name.c_str(), entry.isFolder ? AT_REMOVEDIR : 0) != 0 && errno != ENOENT) return errno;
+    if (unlinkat(keeper.get(), entry.name.c_str(), entry.isFolder ? AT_REMOVEDIR : 0) == 0 || errno == ENOENT) continue;
+    // Somebody put a file or a link in the folder's place.
+    if (errno != ENOTDIR || unlinkat(keeper.get(), entry.name.c_str(), 0) != 0) return errno;
   }
   return 0;
 }
 
 }  // namespace
 
-void walkTree(const URL& url, unsigned options, const std::function<bool(const URL&)>& visit,
-              const std::function<bool(const URL&, const Error&)>& onError) {
-  Walk(options, visit, onError).below(url, 0);
+void enumerateTree(const URL& url, unsigned options, const std::function<bool(const URL&)>& visit,
+                   const std::function<bool(const URL&, const Error&)>& onError) {
+  // Only the folder that was asked for may be named by a link.
+  Walk(options, visit, onError).below(url, UniqueFd(open(url.path().c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC)));
 }
 
 std::optional<Error> removeTree(const std::string& path) {
   struct stat info {};
-  if (lstat(path.c_str(), &info) != 0) return errorFromErrno(errno, path, true);
+  const auto failed = [&path](int number) { return describedError(number, path, FileAccess::Write); };
+  if (lstat(path.c_str(), &info) != 0) return failed(errno);
   if (!S_ISDIR(info.st_mode)) {
-    if (unlink(path.c_str()) != 0) return errorFromErrno(errno, path, true);
+    if (unlink(path.c_str()) != 0) return failed(errno);
     return std::nullopt;
   }
   UniqueFd folder(open(path.c_str(), FolderFlags));
-  if (!folder) return errorFromErrno(errno, path, true);
-  if (const int failure = emptyFolder(std::move(folder))) return errorFromErrno(failure, path, true);
-  if (rmdir(path.c_str()) != 0) return errorFromErrno(errno, path, true);
+  if (!folder) return failed(errno);
+  if (const int number = emptyFolder(std::move(folder))) return failed(number);
+  if (rmdir(path.c_str()) != 0) return failed(errno);
   return std::nullopt;
 }
 

@@ -20,11 +20,6 @@ struct GErrorFree {
 };
 using GErrorPtr = std::unique_ptr<GError, GErrorFree>;
 
-struct GKeyFileUnref {
-  void operator()(GKeyFile* file) const { g_key_file_unref(file); }
-};
-using GKeyFilePtr = std::unique_ptr<GKeyFile, GKeyFileUnref>;
-
 /// Takes over a string that g_free frees; empty for null.
 inline std::string takeString(char* text) {
   std::string result = text ? text : "";

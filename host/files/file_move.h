@@ -1,0 +1,23 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <optional>
+#include <string>
+
+#include "platform/error.h"
+
+namespace vaelo {
+
+/// Moves what stands at the physical path `from` to `to`, without replacing. Between file systems it copies to a temporary
+/// name beside `to`, flushes, makes sure that the source is still what was copied, renames, and only then removes the source:
+/// on failure the source is whole and nothing is left at the destination. Attributes and times come along. Blocks.
+/// Errors: those of FileManager, all with DestinationFilePathErrorKey.
+std::optional<Error> moveFile(const std::string& from, const std::string& to);
+
+/// Gives the item that the promise at `promise` stands for the logical path `to`, without replacing. Errors as moveFile.
+std::optional<Error> movePromise(const std::string& promise, const std::string& to);
+
+/// The error of a failed move: about `to` when something is there already, else about `from`.
+Error moveError(int number, const std::string& from, const std::string& to);
+
+}  // namespace vaelo

@@ -1,0 +1,36 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <sys/stat.h>
+
+#include <string>
+#include <vector>
+
+namespace vaelo {
+
+/// Copies an item and all below it with attributes, modes and times; links are copied as links. Every file and folder is
+/// flushed. Blocks; one thread.
+class TreeCopy {
+ public:
+  /// Nothing may stand at `to`.
+  TreeCopy(std::string from, std::string to) : from_(std::move(from)), to_(std::move(to)) {}
+  /// 0 or the error number, after which a part of the copy may be there. EBUSY: the source changed meanwhile.
+  int run() { return copy(from_, to_); }
+  /// True while everything that run() copied is still as it was.
+  bool sourceIsUnchanged() const;
+
+ private:
+  struct Copied {
+    std::string path;
+    struct stat info;
+  };
+  int copy(const std::string& from, const std::string& to);
+  int copyFile(const std::string& from, const std::string& to, const struct stat& info);
+  int copyFolder(const std::string& from, const std::string& to, const struct stat& info);
+
+  std::string from_;
+  std::string to_;
+  std::vector<Copied> copied_;
+};
+
+}  // namespace vaelo
