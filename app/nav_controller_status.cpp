@@ -9,13 +9,11 @@ namespace vaelo {
 
 namespace {
 
-/// As a translation's "%g" shows it, whatever the process's locale.
-std::string plainNumber(const std::string& text) {
+/// Digits with a decimal point, whatever the process's locale.
+double plainNumber(const std::string& text) {
   double number = 0;
   std::from_chars(text.data(), text.data() + text.size(), number);
-  char digits[32];
-  const auto end = std::to_chars(digits, digits + sizeof digits, number, std::chars_format::general, 6).ptr;
-  return {digits, end};
+  return number;
 }
 
 }  // namespace
@@ -30,8 +28,8 @@ void NavController::quotaFetcherDidUpdateValue(QuotaFetcher&, std::uint64_t free
 std::string NavController::quotaAvailableString() const {
   Formatting& formatting = Platform::current().formatting;
   const std::string withUnit = formatting.byteCount(quotaBytes_, ByteCountStyle::Binary);
-  const std::string number = plainNumber(formatting.byteCount(quotaBytes_, ByteCountStyle::Binary, false));
-  return formatting.filled(formatting.localizedString(".DICT.AVAILABLE.%g"), {number, withUnit});
+  const std::string number = formatting.byteCount(quotaBytes_, ByteCountStyle::Binary, false);
+  return formatting.localizedAmount(".DICT.AVAILABLE.%g", plainNumber(number), withUnit);
 }
 
 std::string NavController::toolbarStatusText(std::size_t itemCount) const {
