@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 // Opens one folder in a window and prints how long it took from the start of the process to the first painted rows, how much
 // memory the process holds then, and how long the main loop was blocked at most until everything visible was there.
-//   list_open FOLDER [--grid] [--stay SECONDS] [--scroll]
+//   list_open FOLDER [--grid] [--stay SECONDS] [--scroll] [--edit]
 #include <unistd.h>
 
 #include <algorithm>
@@ -40,6 +40,7 @@ struct Run {
   std::string folder;
   bool grid = false;
   bool scroll = false;
+  bool edit = false;
   double stay = 1;
   double start = 0;
   double main = now();
@@ -87,6 +88,7 @@ void activate(GtkApplication* application) {
                         .folderRemoved = [] { std::printf("removed\n"); },
                         .readFailed = [](int error) { std::printf("failed %s\n", std::strerror(error)); },
                         .contextRequested = nullptr});
+  run->view->setEditing(run->edit);
   run->view->setFolder(run->folder);
   GtkWidget* window = adw_application_window_new(application);
   gtk_window_set_default_size(GTK_WINDOW(window), 800, 700);
@@ -124,6 +126,8 @@ int main(int argc, char** argv) {
     const std::string argument = argv[i];
     if (argument == "--grid") {
       run->grid = true;
+    } else if (argument == "--edit") {
+      run->edit = true;
     } else if (argument == "--scroll") {
       run->scroll = true;
     } else if (argument == "--stay" && i + 1 < argc) {
@@ -133,7 +137,7 @@ int main(int argc, char** argv) {
     }
   }
   if (run->folder.empty()) {
-    std::fprintf(stderr, "usage: list_open FOLDER [--grid] [--stay SECONDS] [--scroll]\n");
+    std::fprintf(stderr, "usage: list_open FOLDER [--grid] [--stay SECONDS] [--scroll] [--edit]\n");
     return 2;
   }
   waitForEvents = g_main_context_get_poll_func(nullptr);

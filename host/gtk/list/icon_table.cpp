@@ -1,10 +1,11 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/list/icon_table.h"
 
-#include <strings.h>
-
 #include <algorithm>
+#include <memory>
 #include <utility>
+
+#include "host/support/glib_ptr.h"
 
 namespace vaelo {
 namespace {
@@ -53,6 +54,12 @@ GdkTexture* decode(GFile* file, int pixels) {
   return texture;
 }
 
+/// A reference that jobs carry along, wherever they are dropped.
+template <typename T>
+std::shared_ptr<T> shared(T* object) {
+  return std::shared_ptr<T>(object, GObjectUnref());
+}
+
 }  // namespace
 
 IconTable::IconTable(std::function<void()> changed) : changed_(std::move(changed)) {}
@@ -81,39 +88,35 @@ GdkPaintable* IconTable::iconFor(const FolderItem& item, int size, GtkWidget* wi
   const std::string key = kind + '/' + std::to_string(size * scale);
   const auto [place, isNew] = icons_.try_emplace(key, nullptr);
   if (!isNew) return place->second;
-  g_object_ref(widget);
-  worker_.run([this, kind, key, size, scale, widget]() -> std::function<void()> {
-    GIcon* icon = iconOfKey(kind);
-    return [this, key, icon, size, scale, widget] {
-      found(key, icon, size, scale, widget);
-      g_object_unref(icon);
-      g_object_unref(widget);
+  const GtkTextDirection direction = gtk_widget_get_direction(widget);
+  worker_.run([this, kind, key, size, scale, direction]() -> std::function<void()> {
+    return [this, key, size, scale, direction, icon = shared(iconOfKey(kind))] {
+      lookUp(key, icon.get(), size, scale, direction);
     };
   });
   return nullptr;
 }
 
-void IconTable::found(const std::string& key, GIcon* icon, int size, int scale, GtkWidget* widget) {
-  GtkIconPaintable* paintable = gtk_icon_theme_lookup_by_gicon(theme_, icon, size, scale, gtk_widget_get_direction(widget),
-                                                               static_cast<GtkIconLookupFlags>(0));
-  GFile* file = gtk_icon_paintable_get_file(paintable);
-  if (!file || gtk_icon_paintable_is_symbolic(paintable)) {
-    g_clear_object(&file);
-    icons_[key] = GDK_PAINTABLE(paintable);
-    changed_();
+void IconTable::lookUp(const std::string& key, GIcon* icon, int size, int scale, GtkTextDirection direction) {
+  const auto paintable =
+      shared(gtk_icon_theme_lookup_by_gicon(theme_, icon, size, scale, direction, static_cast<GtkIconLookupFlags>(0)));
+  GFile* found = gtk_icon_paintable_get_file(paintable.get());
+  if (!found || gtk_icon_paintable_is_symbolic(paintable.get())) {
+    g_clear_object(&found);
+    store(key, GDK_PAINTABLE(paintable.get()));
     return;
   }
-  worker_.run([this, key, file, paintable, pixels = size * scale]() -> std::function<void()> {
-    GdkTexture* texture = decode(file, pixels);
-    return [this, key, file, paintable, texture] {
-      GdkPaintable*& place = icons_[key];
-      g_clear_object(&place);
-      place = texture ? GDK_PAINTABLE(texture) : GDK_PAINTABLE(g_object_ref(paintable));
-      g_object_unref(file);
-      g_object_unref(paintable);
-      changed_();
-    };
+  worker_.run([this, key, paintable, file = shared(found), pixels = size * scale]() -> std::function<void()> {
+    GdkTexture* texture = decode(file.get(), pixels);
+    // The toolkit decodes by itself what can't be decoded here.
+    if (!texture) return [this, key, paintable] { store(key, GDK_PAINTABLE(paintable.get())); };
+    return [this, key, picture = shared(texture)] { store(key, GDK_PAINTABLE(picture.get())); };
   });
+}
+
+void IconTable::store(const std::string& key, GdkPaintable* icon) {
+  g_set_object(&icons_[key], icon);
+  changed_();
 }
 
 }  // namespace vaelo

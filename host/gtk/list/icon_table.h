@@ -28,7 +28,8 @@ class IconTable {
   GdkPaintable* iconFor(const FolderItem& item, int size, GtkWidget* widget);
 
  private:
-  void found(const std::string& key, GIcon* icon, int size, int scale, GtkWidget* widget);
+  void lookUp(const std::string& key, GIcon* icon, int size, int scale, GtkTextDirection direction);
+  void store(const std::string& key, GdkPaintable* icon);
   void clear();
 
   std::function<void()> changed_;

@@ -14,27 +14,34 @@ namespace vaelo {
 struct Worker::State {
   std::mutex mutex;
   std::condition_variable changed;
-  std::deque<Job> jobs;    // guarded by mutex
-  bool stopped = false;    // guarded by mutex
-  bool abandoned = false;  // main thread only
-  bool started = false;    // main thread only
+  std::deque<Job> jobs;                       // guarded by mutex
+  std::deque<std::function<void()>> returns;  // guarded by mutex
+  bool stopped = false;                       // guarded by mutex
+  bool started = false;                       // main thread only
+
+  /// On the main thread.
+  void runReturn() {
+    std::function<void()> done;
+    {
+      const std::lock_guard lock(mutex);
+      if (stopped || returns.empty()) return;
+      done = std::move(returns.front());
+      returns.pop_front();
+    }
+    done();
+  }
 };
-
-namespace {
-
-struct Return {
-  std::function<void()> run;
-};
-
-}  // namespace
 
 Worker::Worker() : state_(std::make_shared<State>()) {}
 
 Worker::~Worker() {
-  state_->abandoned = true;
+  // What is dropped here may hold objects whose end calls back.
+  std::deque<Job> jobs;
+  std::deque<std::function<void()>> returns;
   const std::lock_guard lock(state_->mutex);
   state_->stopped = true;
-  state_->jobs.clear();
+  jobs.swap(state_->jobs);
+  returns.swap(state_->returns);
   state_->changed.notify_one();
 }
 
@@ -58,16 +65,18 @@ void Worker::run(Job job) {
       std::function<void()> done = next();
       next = nullptr;
       if (!done) continue;
-      auto* back = new Return{[state, done = std::move(done)] {
-        if (!state->abandoned) done();
-      }};
+      {
+        const std::lock_guard lock(state->mutex);
+        if (state->stopped) return;
+        state->returns.push_back(std::move(done));
+      }
       g_idle_add_full(
           G_PRIORITY_DEFAULT,
           [](gpointer data) -> gboolean {
-            static_cast<Return*>(data)->run();
+            (*static_cast<std::shared_ptr<State>*>(data))->runReturn();
             return G_SOURCE_REMOVE;
           },
-          back, [](gpointer data) { delete static_cast<Return*>(data); });
+          new std::shared_ptr<State>(state), [](gpointer data) { delete static_cast<std::shared_ptr<State>*>(data); });
     }
   }).detach();
 }
