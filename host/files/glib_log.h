@@ -9,6 +9,7 @@ namespace vaelo {
 /// and debug lines. G_MESSAGES_DEBUG=vaelo-drive shows the debug lines.
 class GLibLog : public LogSink {
  public:
+  GLibLog();
   void write(LogType type, const std::string& line) override;
   bool wantsDebug() override;
 };

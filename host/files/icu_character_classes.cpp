@@ -5,6 +5,8 @@
 #include <unicode/unistr.h>
 #include <unicode/utf8.h>
 
+#include "host/files/user_locale.h"
+
 namespace vaelo {
 
 namespace {
@@ -29,7 +31,8 @@ bool isTrimmed(UChar32 c) { return c >= 0 && (isNewline(c) || c == '\t' || u_cha
 
 IcuCharacterClasses::IcuCharacterClasses() {
   UErrorCode status = U_ZERO_ERROR;
-  std::unique_ptr<icu::Collator> collator(icu::Collator::createInstance(status));
+  std::unique_ptr<icu::Collator> collator(icu::Collator::createInstance(
+      icu::Locale::createCanonical(userLocale("LC_COLLATE").c_str()), status));
   if (U_FAILURE(status)) return;
   collator->setStrength(icu::Collator::SECONDARY);
   collator_ = std::move(collator);

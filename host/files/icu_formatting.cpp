@@ -7,6 +7,8 @@
 #include <cmath>
 #include <iterator>
 
+#include "host/files/user_locale.h"
+
 namespace vaelo {
 
 namespace {
@@ -32,17 +34,6 @@ std::string textFor(const std::string& key, std::uint64_t count) {
     if (key == texts.key) return ngettext(texts.one, texts.many, static_cast<unsigned long>(count));
   }
   return gettext(key.c_str());
-}
-
-/// The user's choice for one purpose ("LC_TIME"), read as the C library reads it, but whether or not that has been done yet;
-/// where there is none, what most computers are set to.
-std::string userLocale(const char* purpose) {
-  for (const char* variable : {"LC_ALL", purpose, "LANG"}) {
-    const char* name = g_getenv(variable);
-    const std::string text = name ? name : "";
-    if (!text.empty()) return text == "POSIX" || text == "C" || text.starts_with("C.") ? "en_US" : text;
-  }
-  return "en_US";
 }
 
 struct Amount {
