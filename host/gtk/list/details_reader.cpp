@@ -89,7 +89,7 @@ std::shared_ptr<const ItemDetails> readDetails(const std::string& path, EntryKin
     return details;
   }
   details->secondLine = joinedText({sizeText(status.stx_size), date});
-  details->thumbnail = cachedThumbnail(path, status.stx_mtime.tv_sec, thumbnailPixels);
+  details->thumbnail = cachedThumbnail(g_get_user_cache_dir(), path, status.stx_mtime.tv_sec, thumbnailPixels);
   return details;
 }
 

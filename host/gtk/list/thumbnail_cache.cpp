@@ -6,11 +6,11 @@
 
 namespace vaelo {
 
-GdkTexture* cachedThumbnail(const std::string& path, std::int64_t modified, int pixels) {
+GdkTexture* cachedThumbnail(const std::string& cacheFolder, const std::string& path, std::int64_t modified, int pixels) {
   char* uri = g_filename_to_uri(path.c_str(), nullptr, nullptr);
   if (!uri) return nullptr;
   char* hash = g_compute_checksum_for_string(G_CHECKSUM_MD5, uri, -1);
-  const std::string folder = std::string(g_get_user_cache_dir()) + "/thumbnails/";
+  const std::string folder = cacheFolder + "/thumbnails/";
   const std::string file = "/" + std::string(hash) + ".png";
   g_free(hash);
   g_free(uri);
