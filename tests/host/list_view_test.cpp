@@ -152,6 +152,23 @@ TEST_F(FolderViewTest, GridShowsTheSameRows) {
   }));
 }
 
+TEST_F(FolderViewTest, ScrollsToRowsFarAway) {
+  for (int i = 0; i < 1000; ++i) folder_.write("file " + std::to_string(i));
+  open();
+  const auto shown = [&](const std::string& name) {
+    FolderItem* item = view_->model().liveItem(name);
+    graphene_rect_t bounds;
+    return item && item->row && gtk_widget_compute_bounds(item->row, list(), &bounds) && bounds.origin.y >= 0 &&
+           bounds.origin.y + bounds.size.height <= static_cast<float>(gtk_widget_get_height(list()));
+  };
+  ASSERT_TRUE(waitUntil([&] { return shown("file 0"); }));
+  for (const char* name : {"file 777", "file 12", "file 999", "file 0"}) {
+    ASSERT_TRUE(view_->scrollTo(name));
+    EXPECT_TRUE(waitUntil([&] { return shown(name); })) << name;
+  }
+  EXPECT_FALSE(view_->scrollTo("nothing"));
+}
+
 TEST_F(FolderViewTest, SuppliedEntriesReplaceTheFolder) {
   folder_.write("file");
   open();

@@ -131,6 +131,7 @@ void FolderView::setMode(Mode mode) {
     if (row && folderRowItem(row)) top = folderItemOf(folderRowItem(row)).name;
   }
   mode_ = mode;
+  revealed_.clear();
   makeList();
   // Thumbnails were made for the other size.
   allDetailsAreOld();
@@ -310,7 +311,30 @@ bool FolderView::scrollTo(const std::string& name) {
   const auto i = model_.indexOf(name);
   if (!i) return false;
   gtk_widget_activate_action(list_, "list.scroll-to-item", "u", static_cast<guint>(*i));
+  // The list reckons with heights that it guessed, and may end a row short. Its true places are known after a frame.
+  framesToWait_ = 1;
+  if (revealed_.empty()) {
+    gtk_widget_add_tick_callback(
+        list_,
+        [](GtkWidget*, GdkFrameClock*, gpointer data) -> gboolean {
+          auto* self = static_cast<FolderView*>(data);
+          if (self->framesToWait_-- > 0) return G_SOURCE_CONTINUE;
+          self->finishReveal();
+          return G_SOURCE_REMOVE;
+        },
+        this, nullptr);
+  }
+  revealed_ = name;
   return true;
+}
+
+void FolderView::finishReveal() {
+  FolderItem* item = model_.liveItem(std::exchange(revealed_, {}));
+  graphene_rect_t bounds;
+  if (!item || !item->row || !gtk_widget_compute_bounds(gtk_widget_get_parent(item->row), list_, &bounds)) return;
+  const double top = static_cast<double>(bounds.origin.y);
+  const double bottom = top + static_cast<double>(bounds.size.height) - gtk_widget_get_height(list_);
+  if (top < 0 || bottom > 0) setScrollPosition(scrollPosition() + (top < 0 ? top : bottom));
 }
 
 double FolderView::scrollPosition() const { return gtk_adjustment_get_value(adjustment()); }

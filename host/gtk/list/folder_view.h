@@ -105,6 +105,7 @@ class FolderView {
   void detailsAreOld(FolderItem& item);
   void allDetailsAreOld();
   void redrawRows();
+  void finishReveal();
   GtkAdjustment* adjustment() const;
   FolderItem* focusedItem() const;
 
@@ -113,6 +114,8 @@ class FolderView {
   unsigned generation_ = 0;
   bool loaded_ = false;
   bool settingSelection_ = false;
+  std::string revealed_;  // what scrollTo() is on the way to
+  int framesToWait_ = 0;
   int errorNumber_ = 0;
   FolderChanges pending_;
   bool updating_ = false;
