@@ -86,6 +86,11 @@ std::shared_ptr<DRItem> NavController::targetOfLink(const DRItem& link) const {
     VLO_DEBUG("DLC Selection is symlink that didn't resolve to valid target: %@", link.resolvedURL());
     return nullptr;
   }
+  // A link in a circle leads to itself.
+  if (target->isSymlink() && target->resolvedURL() == target->url()) {
+    VLO_DEBUG("DLC Selection is symlink that didn't resolve to valid target: %@", link.resolvedURL());
+    return nullptr;
+  }
   if (!isInMirror(target->resolvedURL())) {
     VLO_DEBUG("DLC Selection is symlink to invalid target: %@", target->resolvedURL());
     return nullptr;

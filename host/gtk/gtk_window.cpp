@@ -90,7 +90,11 @@ ScreenPage* GtkWindowHost::topPage() const {
 
 void GtkWindowHost::makeKeyAndVisible() {
   Window::makeKeyAndVisible();
-  if (const auto controller = navigation()) controller->setHost(this);
+  if (const auto controller = navigation()) {
+    controller->setHost(this);
+    // What came before is not told again.
+    stackChanged({}, controller->viewControllers(), false, [] {});
+  }
   gtk_window_present(widget());
 }
 
