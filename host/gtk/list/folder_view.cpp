@@ -335,6 +335,7 @@ void FolderView::finishReveal() {
   const double top = static_cast<double>(bounds.origin.y);
   const double bottom = top + static_cast<double>(bounds.size.height) - gtk_widget_get_height(list_);
   if (top < 0 || bottom > 0) setScrollPosition(scrollPosition() + (top < 0 ? top : bottom));
+  if (std::exchange(focusRevealed_, false)) gtk_widget_grab_focus(gtk_widget_get_parent(item->row));
 }
 
 double FolderView::scrollPosition() const { return gtk_adjustment_get_value(adjustment()); }

@@ -116,6 +116,7 @@ class FolderView {
   bool settingSelection_ = false;
   std::string revealed_;  // what scrollTo() is on the way to
   int framesToWait_ = 0;
+  bool focusRevealed_ = false;
   int errorNumber_ = 0;
   FolderChanges pending_;
   bool updating_ = false;

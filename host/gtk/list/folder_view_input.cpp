@@ -66,10 +66,9 @@ bool FolderView::keyPressed(guint key, GdkModifierType modifiers) {
   g_unichar_to_utf8(letter, utf8.data());
   const auto found = typeAhead_.type(model_, utf8.data(), now, focusedRow);
   if (!found) return true;
-  const std::string name = nameAt(*found);
-  scrollTo(name);
-  // The list has a widget for the row at once, which it places with the next frame.
-  if (FolderItem* item = model_.liveItem(name); item && item->row) gtk_widget_grab_focus(gtk_widget_get_parent(item->row));
+  scrollTo(nameAt(*found));
+  // A row that takes the focus before it has its place makes the list scroll by its guess again.
+  focusRevealed_ = true;
   return true;
 }
 
