@@ -9,6 +9,7 @@
 #include <atomic>
 #include <condition_variable>
 #include <deque>
+#include <map>
 #include <mutex>
 #include <thread>
 #include <vector>
@@ -22,62 +23,96 @@ gboolean runBlock(gpointer held) {
   return G_SOURCE_REMOVE;
 }
 
-void post(GMainContext* context, std::chrono::nanoseconds delay, Block block) {
+void post(std::chrono::nanoseconds delay, Block block) {
   const auto milliseconds = std::min<std::int64_t>(std::chrono::ceil<std::chrono::milliseconds>(delay).count(), G_MAXINT);
   GSource* source = delay.count() > 0 ? g_timeout_source_new(static_cast<guint>(milliseconds)) : g_idle_source_new();
   // The same for both, so that blocks run in the order in which they came.
   g_source_set_priority(source, G_PRIORITY_DEFAULT);
   g_source_set_callback(source, runBlock, new Block(std::move(block)), [](gpointer held) { delete static_cast<Block*>(held); });
-  g_source_attach(source, context);
+  g_source_attach(source, nullptr);
   g_source_unref(source);
 }
 
 class MainQueue : public DispatchQueue {
  public:
-  void async(Block block) override { post(nullptr, {}, std::move(block)); }
-  void after(std::chrono::nanoseconds delay, Block block) override { post(nullptr, delay, std::move(block)); }
+  void async(Block block) override { post({}, std::move(block)); }
+  void after(std::chrono::nanoseconds delay, Block block) override { post(delay, std::move(block)); }
   std::string label() const override { return "main"; }
 };
 
-/// One thread with a main context of its own, begun by the first block.
+/// One thread, begun by the first block.
 class SerialQueue : public DispatchQueue {
  public:
-  explicit SerialQueue(std::string label) : label_(std::move(label)), context_(g_main_context_new()) {}
+  explicit SerialQueue(std::string label) : label_(std::move(label)) {}
   ~SerialQueue() override {
-    *stopping_ = true;
-    g_main_context_wakeup(context_);
-    if (thread_.joinable()) {
-      // A block may hold the last reference to its own queue.
-      if (thread_.get_id() == std::this_thread::get_id()) {
-        thread_.detach();
-      } else {
-        thread_.join();
-      }
+    {
+      const std::lock_guard lock(shared_->mutex);
+      shared_->stopping = true;
     }
-    g_main_context_unref(context_);
+    shared_->changed.notify_one();
+    if (!thread_.joinable()) return;
+    // A block may hold the last reference to its own queue.
+    if (thread_.get_id() == std::this_thread::get_id()) {
+      thread_.detach();
+    } else {
+      thread_.join();
+    }
   }
-  void async(Block block) override { after({}, std::move(block)); }
+  void async(Block block) override {
+    add([&](Shared& shared) { shared.ready.push_back(std::move(block)); });
+  }
   void after(std::chrono::nanoseconds delay, Block block) override {
-    const std::lock_guard lock(mutex_);
-    if (!thread_.joinable()) {
-      thread_ = std::thread([context = g_main_context_ref(context_), stopping = stopping_] {
-        while (!*stopping) g_main_context_iteration(context, TRUE);
-        // What was queued before the queue was let go of still runs; what was delayed does not.
-        while (g_main_context_iteration(context, FALSE)) {
-        }
-        g_main_context_unref(context);
-      });
-    }
-    post(context_, delay, std::move(block));
+    const auto moment = std::chrono::steady_clock::now() + delay;
+    add([&](Shared& shared) { shared.delayed.emplace(moment, std::move(block)); });
   }
   std::string label() const override { return label_; }
 
  private:
-  std::string label_;
-  GMainContext* context_;
-  std::shared_ptr<std::atomic<bool>> stopping_ = std::make_shared<std::atomic<bool>>(false);
-  std::mutex mutex_;  // guards thread_
-  std::thread thread_;
+  struct Shared {
+    std::mutex mutex;  // guards all below
+    std::condition_variable changed;
+    std::deque<Block> ready;
+    std::multimap<std::chrono::steady_clock::time_point, Block> delayed;
+    bool stopping = false;
+  };
+  template <typename Change>
+  void add(Change change) {
+    {
+      const std::lock_guard lock(shared_->mutex);
+      change(*shared_);
+      if (!thread_.joinable()) thread_ = std::thread([shared = shared_] { work(*shared); });
+    }
+    shared_->changed.notify_one();
+  }
+  static void work(Shared& shared) {
+    std::unique_lock lock(shared.mutex);
+    for (;;) {
+      const auto now = std::chrono::steady_clock::now();
+      while (!shared.delayed.empty() && shared.delayed.begin()->first <= now) {
+        shared.ready.push_back(std::move(shared.delayed.begin()->second));
+        shared.delayed.erase(shared.delayed.begin());
+      }
+      if (!shared.ready.empty()) {
+        Block block = std::move(shared.ready.front());
+        shared.ready.pop_front();
+        lock.unlock();
+        block();
+        // What it holds goes before the next one runs, and not under the lock.
+        block = nullptr;
+        lock.lock();
+      } else if (shared.stopping) {
+        return;
+      } else if (shared.delayed.empty()) {
+        shared.changed.wait(lock);
+      } else {
+        const auto next = shared.delayed.begin()->first;
+        shared.changed.wait_until(lock, next);
+      }
+    }
+  }
+  const std::string label_;
+  std::shared_ptr<Shared> shared_ = std::make_shared<Shared>();
+  std::thread thread_;  // guarded by shared_->mutex, but for the destructor
 };
 
 class ThreadedOperations : public OperationQueue {
