@@ -87,8 +87,11 @@ void NavController::initNewListController(const DocumentListControllerRef& list)
   viewTitle_ = list->title();
   VLO_DEBUG("New DLC (%d items): \"%@\", UTI=%@, URL=%@", list->containedItems().size(), list->title(),
             FileUtils::getResourceValueForURL(ResourceKey::TypeIdentifier, list->presentedURL()), list->presentedURL());
-  for (const URL& item : list->containedItems()) {
-    VLO_DEBUG("    %@", "..." + item.path().substr(item.path().rfind('/')));
+  // A list may have 100,000 items; their lines are made only for a log that takes them.
+  if (Platform::current().log.wantsDebug()) {
+    for (const URL& item : list->containedItems()) {
+      VLO_DEBUG("    %@", "..." + item.path().substr(item.path().rfind('/')));
+    }
   }
   unsigned actions = 1u << ItemAction::Delete | 1u << ItemAction::Rename;
   actions |= 1u << ItemAction::Share;
