@@ -106,8 +106,8 @@ class Accessibility:
 class App:
     """The application on a data folder of its own."""
 
-    def __init__(self, size=(800, 640), demo=False, prepare=None, arguments=(), **environment):
-        self.desktop = Desktop()
+    def __init__(self, size=(800, 640), demo=False, prepare=None, arguments=(), screen=(1280, 800), **environment):
+        self.desktop = Desktop(*screen)
         self.base = self.desktop.scratch / "drive"
         self.data = self.base / "data" / "vaelo-drive"
         self.drive = self.data / "mirror" / "com~marrow~Kestrel"
