@@ -127,7 +127,7 @@ TEST_F(FilesManagerTest, RemovalTakesTheWholeTreeAndNoLinkTarget) {
 
 TEST_F(FilesManagerTest, RemovalTakesADeepTree) {
   std::string path = drive + "/deep";
-  for (int level = 0; level < 300; ++level) path += "/d";
+  for (int level = 0; level < 100; ++level) path += "/d";
   makeFolder(path);
   EXPECT_FALSE(files.removeItemAtURL(URL(drive + "/deep")));
   EXPECT_FALSE(exists(drive + "/deep"));
@@ -288,6 +288,26 @@ TEST_F(FilesManagerTest, TheWalkSeesEveryItemOnceAndFollowsNoLink) {
   EXPECT_EQ(walk(SkipsHiddenFiles | SkipsPackageDescendants),
             (Names{"a", "a/far", "a/file", "a/round", "both", "doc.bundle", longName}));
   EXPECT_EQ(walk(SkipsHiddenFiles | SkipsSubdirectoryDescendants), (Names{"a", "both", "doc.bundle", longName}));
+}
+
+TEST_F(FilesManagerTest, TheWalkStaysInItsTreeWhenAFolderIsReplacedByALink) {
+  write(root + "/outside/secret");
+  makeFolder(drive + "/a");
+  std::vector<std::string> found;
+  int errors = 0;
+  files.enumerate(
+      URL(drive), {}, EnumerateAll,
+      [&](const URL& url) {
+        found.push_back(url.path().substr(drive.size() + 1));
+        if (url.lastPathComponent() == "a") {
+          std::filesystem::remove(drive + "/a");
+          link(root + "/outside", drive + "/a");
+        }
+        return true;
+      },
+      [&](const URL&, const Error&) { return ++errors > 0; });
+  EXPECT_EQ(found, std::vector<std::string>{"a"});
+  EXPECT_EQ(errors, 1);
 }
 
 TEST_F(FilesManagerTest, TheWalkCanBeEndedAndTellsOfWhatItCannotRead) {

@@ -90,16 +90,18 @@ TEST(FilesQueuesTest, OperationsRunAtTheSameTime) {
   const auto queue = queues.makeOperationQueue("operations", QualityOfService::Utility);
   EXPECT_EQ(queue->name(), "operations");
   EXPECT_EQ(queue->qualityOfService(), QualityOfService::Utility);
-  // Twice, so that threads which are idle already are counted right too.
-  for (int round = 0; round < 2; ++round) {
-    std::promise<void> first;
+  for (int round = 0; round < 50; ++round) {
+    const auto fresh = queues.makeOperationQueue("fresh", QualityOfService::Default);
+    std::promise<void> alone;
+    fresh->addOperation([&] { alone.set_value(); });
+    alone.get_future().wait();
+    for (int turn = 0; turn < 500; ++turn) std::this_thread::yield();
+    // The one thread is idle by now, as a rule, and may not be counted on for both.
     std::promise<void> second;
-    queue->addOperation([&] {
-      second.get_future().wait();
-      first.set_value();
-    });
-    queue->addOperation([&] { second.set_value(); });
-    first.get_future().wait();
+    std::promise<bool> met;
+    fresh->addOperation([&] { met.set_value(second.get_future().wait_for(5s) == std::future_status::ready); });
+    fresh->addOperation([&] { second.set_value(); });
+    ASSERT_TRUE(met.get_future().get());
   }
 }
 
