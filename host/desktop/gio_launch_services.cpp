@@ -17,8 +17,8 @@ ApplicationRecord recordOf(GAppInfo* app) {
   constexpr std::string_view suffix = ".desktop";
   ApplicationRecord record;
   record.itemID = text(g_app_info_get_id(app));
-  record.bundleIdentifier = record.itemID.ends_with(suffix) ? record.itemID.substr(0, record.itemID.size() - suffix.size())
-                                                            : record.itemID;
+  record.bundleIdentifier =
+      record.itemID.ends_with(suffix) ? record.itemID.substr(0, record.itemID.size() - suffix.size()) : record.itemID;
   record.itemName = text(g_app_info_get_name(app));
   record.localizedName = text(g_app_info_get_display_name(app));
   record.localizedShortName = record.localizedName;
@@ -38,7 +38,8 @@ class GioDocumentRecord : public DocumentRecord {
     // By name alone: the item may not be downloaded, and its content is then not to be asked for.
     const std::string type = takeString(g_content_type_guess(url_.lastPathComponent().c_str(), nullptr, 0, nullptr));
     std::vector<ApplicationRecord> owners;
-    if (const GRef<GAppInfo> own{g_app_info_get_default_for_type(type.c_str(), FALSE)}) owners.push_back(recordOf(own.get()));
+    if (const GRef<GAppInfo> own{g_app_info_get_default_for_type(type.c_str(), FALSE)})
+      owners.push_back(recordOf(own.get()));
     collect(g_app_info_get_recommended_for_type(type.c_str()), owners, {});
     std::vector<ApplicationRecord> others;
     collect(g_app_info_get_fallback_for_type(type.c_str()), others, owners);

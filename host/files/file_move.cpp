@@ -62,8 +62,8 @@ int copyThenRemove(const std::string& from, const std::string& to) {
 }  // namespace
 
 Error moveError(int number, const std::string& from, const std::string& to) {
-  Error error = describedError(number, number == EEXIST || number == ENAMETOOLONG || number == EILSEQ ? to : from,
-                               FileAccess::Write);
+  Error error =
+      describedError(number, number == EEXIST || number == ENAMETOOLONG || number == EILSEQ ? to : from, FileAccess::Write);
   error.userInfo[DestinationFilePathErrorKey] = Value(to);
   return error;
 }

@@ -9,8 +9,8 @@
 namespace vaelo {
 
 /// Moves what stands at the physical path `from` to `to`, without replacing. Between file systems it copies to a temporary
-/// name beside `to`, flushes, makes sure that the source is still what was copied, renames, and only then removes the source:
-/// on failure the source is whole and nothing is left at the destination. Attributes and times come along. Blocks.
+/// name beside `to`, flushes, makes sure that the source is still what was copied, renames, and only then removes the
+/// source: on failure the source is whole and nothing is left at the destination. Attributes and times come along. Blocks.
 /// Errors: those of FileManager, all with DestinationFilePathErrorKey.
 std::optional<Error> moveFile(const std::string& from, const std::string& to);
 

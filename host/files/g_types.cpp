@@ -133,7 +133,8 @@ bool conformsByTable(const std::string& type, const std::string& other) {
   if (type == other) return true;
   if (const KnownType* known = knownType(type)) {
     const std::vector<std::string> parents = words(known->parents);
-    return std::any_of(parents.begin(), parents.end(), [&](const std::string& parent) { return conformsByTable(parent, other); });
+    return std::any_of(parents.begin(), parents.end(),
+                       [&](const std::string& parent) { return conformsByTable(parent, other); });
   }
   return type.starts_with(DynamicPrefix) && conformsByTable(kindOfMediaType(mediaTypeOf(type)), other);
 }

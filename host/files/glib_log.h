@@ -5,8 +5,8 @@
 
 namespace vaelo {
 
-/// The log of GLib under the domain "vaelo-drive": errors as warnings (nothing we log may end the program), the rest as messages
-/// and debug lines. G_MESSAGES_DEBUG=vaelo-drive shows the debug lines.
+/// The log of GLib under the domain "vaelo-drive": errors as warnings (nothing we log may end the program), the rest as
+/// messages and debug lines. G_MESSAGES_DEBUG=vaelo-drive shows the debug lines.
 class GLibLog : public LogSink {
  public:
   GLibLog();

@@ -28,7 +28,8 @@ void post(std::chrono::nanoseconds delay, Block block) {
   GSource* source = delay.count() > 0 ? g_timeout_source_new(static_cast<guint>(milliseconds)) : g_idle_source_new();
   // The same for both, so that blocks run in the order in which they came.
   g_source_set_priority(source, G_PRIORITY_DEFAULT);
-  g_source_set_callback(source, runBlock, new Block(std::move(block)), [](gpointer held) { delete static_cast<Block*>(held); });
+  g_source_set_callback(source, runBlock, new Block(std::move(block)),
+                        [](gpointer held) { delete static_cast<Block*>(held); });
   g_source_attach(source, nullptr);
   g_source_unref(source);
 }

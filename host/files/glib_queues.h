@@ -5,9 +5,9 @@
 
 namespace vaelo {
 
-/// Time and threads on GLib: the main queue is the default main context, a serial queue one thread from its first block on, an
-/// operation queue up to two threads, which give way to others when nobody waits for their work. A queue that is let go of
-/// runs what was given to it at once, but not what was delayed.
+/// Time and threads on GLib: the main queue is the default main context, a serial queue one thread from its first block on,
+/// an operation queue up to two threads, which give way to others when nobody waits for their work. A queue that is let go
+/// of runs what was given to it at once, but not what was delayed.
 class GLibQueues : public Queues {
  public:
   GLibQueues();

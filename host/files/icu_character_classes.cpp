@@ -23,7 +23,9 @@ bool anyCharacter(const std::string& text, Test test) {
   return false;
 }
 
-bool isNewline(UChar32 c) { return c == 0x0A || c == 0x0B || c == 0x0C || c == 0x0D || c == 0x85 || c == 0x2028 || c == 0x2029; }
+bool isNewline(UChar32 c) {
+  return c == 0x0A || c == 0x0B || c == 0x0C || c == 0x0D || c == 0x85 || c == 0x2028 || c == 0x2029;
+}
 
 bool isTrimmed(UChar32 c) { return c >= 0 && (isNewline(c) || c == '\t' || u_charType(c) == U_SPACE_SEPARATOR); }
 
@@ -31,8 +33,8 @@ bool isTrimmed(UChar32 c) { return c >= 0 && (isNewline(c) || c == '\t' || u_cha
 
 IcuCharacterClasses::IcuCharacterClasses() {
   UErrorCode status = U_ZERO_ERROR;
-  std::unique_ptr<icu::Collator> collator(icu::Collator::createInstance(
-      icu::Locale::createCanonical(userLocale("LC_COLLATE").c_str()), status));
+  std::unique_ptr<icu::Collator> collator(
+      icu::Collator::createInstance(icu::Locale::createCanonical(userLocale("LC_COLLATE").c_str()), status));
   if (U_FAILURE(status)) return;
   collator->setStrength(icu::Collator::SECONDARY);
   collator_ = std::move(collator);

@@ -20,7 +20,8 @@ class IcuCharacterClasses : public CharacterClasses {
   bool localizedCaseInsensitiveEquals(const std::string& a, const std::string& b) override;
 
  private:
-  std::unique_ptr<const icu::Collator> collator_;  // costly to make, safe to compare with from any thread; null if ICU has no data
+  std::unique_ptr<const icu::Collator>
+      collator_;  // costly to make, safe to compare with from any thread; null if ICU has no data
 };
 
 }  // namespace vaelo

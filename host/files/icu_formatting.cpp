@@ -62,10 +62,14 @@ Amount amountOf(std::uint64_t bytes, ByteCountStyle style) {
 
 icu::DateFormat::EStyle icuStyle(DateStyle style) {
   switch (style) {
-    case DateStyle::None: return icu::DateFormat::kNone;
-    case DateStyle::Short: return icu::DateFormat::kShort;
-    case DateStyle::Medium: return icu::DateFormat::kMedium;
-    case DateStyle::Long: return icu::DateFormat::kLong;
+    case DateStyle::None:
+      return icu::DateFormat::kNone;
+    case DateStyle::Short:
+      return icu::DateFormat::kShort;
+    case DateStyle::Medium:
+      return icu::DateFormat::kMedium;
+    case DateStyle::Long:
+      return icu::DateFormat::kLong;
   }
   return icu::DateFormat::kNone;
 }
@@ -135,8 +139,8 @@ std::string IcuFormatting::filled(const std::string& format, const std::vector<s
   std::string result;
   std::size_t next = 0;
   for (std::size_t i = 0; i < format.size(); ++i) {
-    const bool numbered = format[i] == '%' && i + 3 < format.size() && g_ascii_isdigit(format[i + 1]) &&
-                          format.compare(i + 2, 2, "$@") == 0;
+    const bool numbered =
+        format[i] == '%' && i + 3 < format.size() && g_ascii_isdigit(format[i + 1]) && format.compare(i + 2, 2, "$@") == 0;
     const bool plain = format.compare(i, 2, "%@") == 0;
     if (!numbered && !plain) {
       result.push_back(format[i]);

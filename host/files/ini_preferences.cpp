@@ -16,7 +16,8 @@ std::string fileKeyFor(const std::string& key) { return percentEncoded(key); }
 bool isBase64(const std::string& text) {
   constexpr const char* letters = "ABCDEFGHIJKLMNOPQRSTUVWXYZabcdefghijklmnopqrstuvwxyz0123456789+/";
   const std::size_t end = text.find_first_not_of(letters);
-  return text.size() % 4 == 0 && (end == std::string::npos || (text.size() - end <= 2 && text.find_first_not_of('=', end) == std::string::npos));
+  return text.size() % 4 == 0 &&
+         (end == std::string::npos || (text.size() - end <= 2 && text.find_first_not_of('=', end) == std::string::npos));
 }
 
 }  // namespace

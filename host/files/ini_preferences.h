@@ -7,8 +7,8 @@
 
 namespace vaelo {
 
-/// Preferences in a key file, read once and written at each change. What can't be written is kept until the program ends, and
-/// the log tells. Main thread.
+/// Preferences in a key file, read once and written at each change. What can't be written is kept until the program ends,
+/// and the log tells. Main thread.
 class IniPreferences : public Preferences {
  public:
   IniPreferences(std::string path, LogSink& log);

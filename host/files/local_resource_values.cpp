@@ -31,24 +31,41 @@ class LocalResourceValues::Reader {
 
   Value valueOf(ResourceKey key) {
     switch (key) {
-      case ResourceKey::Name: return name_;
-      case ResourceKey::LocalizedName: return displayName();
-      case ResourceKey::TypeIdentifier: return typeIdentifier();
-      case ResourceKey::LocalizedTypeDescription: return typeDescription();
+      case ResourceKey::Name:
+        return name_;
+      case ResourceKey::LocalizedName:
+        return displayName();
+      case ResourceKey::TypeIdentifier:
+        return typeIdentifier();
+      case ResourceKey::LocalizedTypeDescription:
+        return typeDescription();
       case ResourceKey::FileSize:
-      case ResourceKey::TotalFileSize: return size();
-      case ResourceKey::CreationDate: return creationDate();
-      case ResourceKey::ContentModificationDate: return modificationDate();
-      case ResourceKey::IsDirectory: return isFolder();
-      case ResourceKey::IsPackage: return isPackage();
-      case ResourceKey::IsRegularFile: return promise_ ? !promise_->package : S_ISREG(info_.stx_mode);
-      case ResourceKey::HasHiddenExtension: return false;
-      case ResourceKey::ParentDirectoryURL: return url_.deletingLastPathComponent();
-      case ResourceKey::IsShared: return role().has_value();
-      case ResourceKey::SharedItemRole: return role() ? Value(*role()) : Value();
-      case ResourceKey::DownloadingStatus: return downloadingStatus();
-      case ResourceKey::DocumentIdentifier: return documentIdentifier();
-      case ResourceKey::ThumbnailDictionary: return {};
+      case ResourceKey::TotalFileSize:
+        return size();
+      case ResourceKey::CreationDate:
+        return creationDate();
+      case ResourceKey::ContentModificationDate:
+        return modificationDate();
+      case ResourceKey::IsDirectory:
+        return isFolder();
+      case ResourceKey::IsPackage:
+        return isPackage();
+      case ResourceKey::IsRegularFile:
+        return promise_ ? !promise_->package : S_ISREG(info_.stx_mode);
+      case ResourceKey::HasHiddenExtension:
+        return false;
+      case ResourceKey::ParentDirectoryURL:
+        return url_.deletingLastPathComponent();
+      case ResourceKey::IsShared:
+        return role().has_value();
+      case ResourceKey::SharedItemRole:
+        return role() ? Value(*role()) : Value();
+      case ResourceKey::DownloadingStatus:
+        return downloadingStatus();
+      case ResourceKey::DocumentIdentifier:
+        return documentIdentifier();
+      case ResourceKey::ThumbnailDictionary:
+        return {};
     }
     return {};
   }

@@ -99,7 +99,8 @@ void PresenterList::tell(const std::shared_ptr<Registration>& registration, std:
 
 void PresenterList::itemChanged(const URL& url, const FilePresenter* but) {
   for (const Shown& each : shown(but)) {
-    if (url.isInside(each.url)) tell(each.registration, [](FilePresenter& presenter) { presenter.presentedItemDidChange(); });
+    if (url.isInside(each.url))
+      tell(each.registration, [](FilePresenter& presenter) { presenter.presentedItemDidChange(); });
   }
 }
 

@@ -15,19 +15,29 @@ namespace {
 const char* wordsFor(int number) {
   switch (number) {
     case ENOENT:
-    case ENOTDIR: return gettext("The file “%s” doesn’t exist any more.");
+    case ENOTDIR:
+      return gettext("The file “%s” doesn’t exist any more.");
     case EACCES:
-    case EPERM: return gettext("You don’t have permission to use “%s”.");
+    case EPERM:
+      return gettext("You don’t have permission to use “%s”.");
     case EEXIST:
-    case ENOTEMPTY: return gettext("An item named “%s” already exists.");
-    case ENAMETOOLONG: return gettext("The name “%s” is too long.");
-    case EILSEQ: return gettext("The disk can’t keep the name “%s”.");
+    case ENOTEMPTY:
+      return gettext("An item named “%s” already exists.");
+    case ENAMETOOLONG:
+      return gettext("The name “%s” is too long.");
+    case EILSEQ:
+      return gettext("The disk can’t keep the name “%s”.");
     case ENOSPC:
-    case EDQUOT: return gettext("There is not enough space for “%s”. Delete something and try again.");
-    case EROFS: return gettext("“%s” is on a disk that can only be read.");
-    case ELOOP: return gettext("The links of “%s” run in a circle.");
-    case EBUSY: return gettext("“%s” is being changed by another program. Try again later.");
-    default: return gettext("“%s” can’t be used.");
+    case EDQUOT:
+      return gettext("There is not enough space for “%s”. Delete something and try again.");
+    case EROFS:
+      return gettext("“%s” is on a disk that can only be read.");
+    case ELOOP:
+      return gettext("The links of “%s” run in a circle.");
+    case EBUSY:
+      return gettext("“%s” is being changed by another program. Try again later.");
+    default:
+      return gettext("“%s” can’t be used.");
   }
 }
 

@@ -8,8 +8,8 @@
 
 namespace vaelo {
 
-/// errorFromErrno with words for a person, which name the item: what the user's own files fail with reaches an alert, what the
-/// drive's files fail with only the log.
+/// errorFromErrno with words for a person, which name the item: what the user's own files fail with reaches an alert, what
+/// the drive's files fail with only the log.
 Error describedError(int number, const std::string& path, FileAccess access);
 
 }  // namespace vaelo

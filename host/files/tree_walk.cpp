@@ -66,8 +66,8 @@ class Walk {
 
   /// False when a callback ended the walk.
   bool below(const URL& folder, const UniqueFd& open) {
-    // A second descriptor, since reading takes one and the folders below are opened from the first: whatever somebody puts in
-    // place of a folder above, the walk stays in the tree where it began.
+    // A second descriptor, since reading takes one and the folders below are opened from the first: whatever somebody puts
+    // in place of a folder above, the walk stays in the tree where it began.
     const auto entries = open ? readEntries(UniqueFd(openat(open.get(), ".", FolderFlags))) : std::nullopt;
     if (!entries) return onError_(folder, describedError(errno, folder.path(), FileAccess::Read));
     for (const Entry& entry : *entries) {
@@ -89,8 +89,8 @@ class Walk {
     const std::optional<std::string> path = logicalNameOf(folder.path() + "/" + entry.name);
     if (!path) return std::nullopt;
     std::string name = path->substr(path->rfind('/') + 1);
-    const auto at = std::lower_bound(all.begin(), all.end(), name,
-                                     [](const Entry& a, const std::string& b) { return a.name < b; });
+    const auto at =
+        std::lower_bound(all.begin(), all.end(), name, [](const Entry& a, const std::string& b) { return a.name < b; });
     if (at != all.end() && at->name == name) return std::nullopt;
     return name;
   }

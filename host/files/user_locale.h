@@ -5,8 +5,9 @@
 
 namespace vaelo {
 
-/// The user's choice for one purpose ("LC_TIME", "LC_COLLATE"), read from the environment as the C library reads it, whether or
-/// not that has been done yet. Where there is none, and for the C locale, whose order and dates are not for people, "en_US".
+/// The user's choice for one purpose ("LC_TIME", "LC_COLLATE"), read from the environment as the C library reads it, whether
+/// or not that has been done yet. Where there is none, and for the C locale, whose order and dates are not for people,
+/// "en_US".
 std::string userLocale(const char* purpose);
 
 }  // namespace vaelo

@@ -8,12 +8,13 @@ namespace vaelo {
 
 namespace {
 
-/// The desktop's databases are looked for once in a process, so each case runs this program again with applications of its own.
+/// The desktop's databases are looked for once in a process, so each case runs this program again with applications of its
+/// own.
 class DesktopLaunchServicesTest : public drive_test::DriveTest {
  protected:
   void application(const std::string& id, const std::string& exec, const std::string& types) {
-    write(root + "/share/applications/" + id + ".desktop", "[Desktop Entry]\nType=Application\nName=" + id + "\nExec=" + exec +
-                                                               "\nMimeType=" + types + "\n");
+    write(root + "/share/applications/" + id + ".desktop",
+          "[Desktop Entry]\nType=Application\nName=" + id + "\nExec=" + exec + "\nMimeType=" + types + "\n");
   }
   /// Runs the disabled test of that name there.
   void runApart(const std::string& test) {
@@ -82,7 +83,8 @@ TEST_F(DesktopLaunchServicesTest, OwnersComeFirst) {
   application("org.example.Text", "true %f", "text/plain;");
   // What update-desktop-database makes of the three.
   write(root + "/share/applications/mimeinfo.cache",
-        "[MIME Cache]\ntext/csv=org.example.Table.desktop;org.example.Chosen.desktop;\ntext/plain=org.example.Text.desktop;\n");
+        "[MIME "
+        "Cache]\ntext/csv=org.example.Table.desktop;org.example.Chosen.desktop;\ntext/plain=org.example.Text.desktop;\n");
   write(root + "/config/mimeapps.list", "[Default Applications]\ntext/csv=org.example.Chosen.desktop\n");
   runApart("OwnersComeFirst");
 }
@@ -93,7 +95,9 @@ TEST_F(DesktopLaunchServicesTest, RecordsSayWhatTheEntrySays) {
   runApart("RecordsSayWhatTheEntrySays");
 }
 
-TEST_F(DesktopLaunchServicesTest, ItsOwnName) { EXPECT_EQ(GioLaunchServices().ownBundleIdentifier(), "com.marrow.VaeloDrive"); }
+TEST_F(DesktopLaunchServicesTest, ItsOwnName) {
+  EXPECT_EQ(GioLaunchServices().ownBundleIdentifier(), "com.marrow.VaeloDrive");
+}
 
 }  // namespace
 

@@ -124,7 +124,8 @@ TEST_F(FilesCoordinationTest, ReadersMeetAndOthersPass) {
   // "/ab" only looks as if it were in "/a".
   coordination.makeCoordinator()->coordinateWriting(URL("/a"), WritingDefault, [&](const URL&) {
     std::thread([&] {
-      coordination.makeCoordinator()->coordinateReading(URL("/ab"), ReadingImmediatelyAvailableMetadataOnly, [](const URL&) {});
+      coordination.makeCoordinator()->coordinateReading(URL("/ab"), ReadingImmediatelyAvailableMetadataOnly,
+                                                        [](const URL&) {});
     }).join();
   });
 }

@@ -21,12 +21,12 @@ TEST_F(FilesFormattingTest, ByteCounts) {
     const char* file;
     const char* binary;
   };
-  for (const Case& row : {Case{0, "0 bytes", "0 bytes"}, Case{1, "1 byte", "1 byte"}, Case{999, "999 bytes", "999 bytes"},
-                          Case{1000, "1 KB", "1,000 bytes"}, Case{1024, "1 KB", "1 KB"}, Case{1499, "1 KB", "1 KB"},
-                          Case{999499, "999 KB", "976 KB"}, Case{999500, "1 MB", "976 KB"},
-                          Case{1250000, "1.3 MB", "1.2 MB"}, Case{999950000, "1 GB", "953.6 MB"},
-                          Case{5368709120, "5.37 GB", "5 GB"}, Case{1234567890123, "1.23 TB", "1.12 TB"},
-                          Case{UINT64_MAX, "18.45 EB", "16 EB"}}) {
+  for (const Case& row :
+       {Case{0, "0 bytes", "0 bytes"}, Case{1, "1 byte", "1 byte"}, Case{999, "999 bytes", "999 bytes"},
+        Case{1000, "1 KB", "1,000 bytes"}, Case{1024, "1 KB", "1 KB"}, Case{1499, "1 KB", "1 KB"},
+        Case{999499, "999 KB", "976 KB"}, Case{999500, "1 MB", "976 KB"}, Case{1250000, "1.3 MB", "1.2 MB"},
+        Case{999950000, "1 GB", "953.6 MB"}, Case{5368709120, "5.37 GB", "5 GB"}, Case{1234567890123, "1.23 TB", "1.12 TB"},
+        Case{UINT64_MAX, "18.45 EB", "16 EB"}}) {
     EXPECT_EQ(formatting.byteCount(row.bytes, ByteCountStyle::File), row.file);
     EXPECT_EQ(formatting.byteCount(row.bytes, ByteCountStyle::Binary), row.binary);
   }
@@ -46,9 +46,11 @@ TEST_F(FilesFormattingTest, DatesAreInTheUsersLanguage) {
   EXPECT_EQ(formatting.localizedDate(date, DateStyle::Medium, DateStyle::None), "Feb 13, 2009");
   EXPECT_EQ(formatting.localizedDate(date, DateStyle::Short, DateStyle::None), "2/13/09");
   EXPECT_EQ(german.localizedDate(date, DateStyle::Long, DateStyle::None), "13. Februar 2009");
-  EXPECT_NE(formatting.localizedDate(date, DateStyle::Long, DateStyle::Short).find("February 13, 2009 at"), std::string::npos);
+  EXPECT_NE(formatting.localizedDate(date, DateStyle::Long, DateStyle::Short).find("February 13, 2009 at"),
+            std::string::npos);
   EXPECT_EQ(formatting.localizedDate(date, DateStyle::None, DateStyle::None), "");
-  EXPECT_FALSE(formatting.localizedDate(Date(std::chrono::hours(-24 * 365 * 100)), DateStyle::Long, DateStyle::Short).empty());
+  EXPECT_FALSE(
+      formatting.localizedDate(Date(std::chrono::hours(-24 * 365 * 100)), DateStyle::Long, DateStyle::Short).empty());
 }
 
 TEST_F(FilesFormattingTest, CountsAreWordsWithThePluralForm) {
@@ -82,8 +84,8 @@ TEST(FilesCharacterClassesTest, IllegalIsWhatNoNameCanHold) {
   for (const char* legal : {"", "Report 1.pdf", "ü", "\xf0\x9f\x90\xa6", "\u05d0\u200f", "tab\t"}) {
     EXPECT_FALSE(classes.containsIllegalCharacter(legal)) << legal;
   }
-  for (const char* illegal : {"\xff", "a\xc3", "\xed\xa0\x80", "\xc0\xaf", "\xef\xbf\xbe", "\xef\xbf\xbf", "\xf4\x90\x80\x80",
-                              "\xcd\xb8"}) {
+  for (const char* illegal :
+       {"\xff", "a\xc3", "\xed\xa0\x80", "\xc0\xaf", "\xef\xbf\xbe", "\xef\xbf\xbf", "\xf4\x90\x80\x80", "\xcd\xb8"}) {
     EXPECT_TRUE(classes.containsIllegalCharacter(illegal)) << illegal;
   }
 }

@@ -13,12 +13,23 @@ class FilesResourceValuesTest : public drive_test::DriveTest {
   FilesResourceValuesTest() { makeFolder(drive); }
 
   static const std::vector<ResourceKey>& allKeys() {
-    static const std::vector<ResourceKey> keys{
-        ResourceKey::Name, ResourceKey::LocalizedName, ResourceKey::TypeIdentifier, ResourceKey::LocalizedTypeDescription,
-        ResourceKey::FileSize, ResourceKey::TotalFileSize, ResourceKey::CreationDate, ResourceKey::ContentModificationDate,
-        ResourceKey::IsDirectory, ResourceKey::IsPackage, ResourceKey::IsRegularFile, ResourceKey::HasHiddenExtension,
-        ResourceKey::ParentDirectoryURL, ResourceKey::IsShared, ResourceKey::SharedItemRole, ResourceKey::DownloadingStatus,
-        ResourceKey::ThumbnailDictionary};
+    static const std::vector<ResourceKey> keys{ResourceKey::Name,
+                                               ResourceKey::LocalizedName,
+                                               ResourceKey::TypeIdentifier,
+                                               ResourceKey::LocalizedTypeDescription,
+                                               ResourceKey::FileSize,
+                                               ResourceKey::TotalFileSize,
+                                               ResourceKey::CreationDate,
+                                               ResourceKey::ContentModificationDate,
+                                               ResourceKey::IsDirectory,
+                                               ResourceKey::IsPackage,
+                                               ResourceKey::IsRegularFile,
+                                               ResourceKey::HasHiddenExtension,
+                                               ResourceKey::ParentDirectoryURL,
+                                               ResourceKey::IsShared,
+                                               ResourceKey::SharedItemRole,
+                                               ResourceKey::DownloadingStatus,
+                                               ResourceKey::ThumbnailDictionary};
     return keys;
   }
   /// The promised form of all keys but the identifier.
