@@ -11,6 +11,15 @@
 
 namespace vaelo {
 
+namespace {
+
+bool skipUnreadable(const URL& entry, const Error& error) {
+  VLO_INFO("Error enumerating %@: %@", entry, error);
+  return true;
+}
+
+}  // namespace
+
 std::shared_ptr<DRItem> DRItem::init() {
   throw std::invalid_argument(logFormatted("Don't call %@.", {"-[DRItem init]"}));
 }
@@ -81,22 +90,29 @@ bool DRItem::cacheValues() {
   Platform& platform = Platform::current();
   resolvedURL_ = vlo_URLByResolvingBookmark(*url_);
   isBookmark_ = platform.cloudDocuments.isExternalDocumentReference(*url_);
-  // A bookmark that leads nowhere leaves no URL to read; only the attributes of the bookmark itself are left.
-  if (!resolvedURL_) return initFromAttributes();
+  // A bookmark that leads nowhere: as for any read that never comes about, the record stands with what is known so far.
+  if (!resolvedURL_) return true;
   promiseURL_ = platform.cloudDocuments.physicalURL(*resolvedURL_);
-  const bool accessing = platform.resourceValues.startAccessingSecurityScopedResource(*resolvedURL_);
+  // A link changes resolvedURL_ during the read; the access is that of the URL from before.
+  const URL described = *resolvedURL_;
+  const bool accessing = platform.resourceValues.startAccessingSecurityScopedResource(described);
   bool success = true;
   platform.fileCoordination.makeCoordinator()->coordinateReading(
-      *resolvedURL_, ReadingImmediatelyAvailableMetadataOnly,
-      [&](const URL& newURL) { success = readValues(newURL, accessing); });
+      described, ReadingImmediatelyAvailableMetadataOnly, [&](const URL& newURL) {
+        success = readValues(newURL);
+        // Only a read that worked stops the access; one that failed keeps it.
+        if (success && accessing) platform.resourceValues.stopAccessingSecurityScopedResource(described);
+      });
   return success || initFromAttributes();
 }
 
-bool DRItem::readValues(const URL& newURL, bool stopAccess) {
+bool DRItem::readValues(const URL& newURL) {
   Platform& platform = Platform::current();
   if (!platform.resourceValues.promisedItemIsReachable(newURL)) return false;
   Result<ResourceMap> values = platform.resourceValues.promisedItemResourceValues(newURL, resourceKeys());
-  if (values.error && values.error->code == FileErrorCode::NoSuchFile) return false;
+  if (values.error && values.error->domain == FileErrorDomain && values.error->code == FileErrorCode::NoSuchFile) {
+    return false;
+  }
   if (!values.value) {
     VLO_WARNING("promisedItemResourceValuesForKeys failed on %@", newURL);
     values = platform.resourceValues.resourceValues(newURL, resourceKeys());
@@ -105,8 +121,6 @@ bool DRItem::readValues(const URL& newURL, bool stopAccess) {
   initFromKeysAndValuesWithURL(*values.value, newURL);
   canPreview_ = resolvedURL_ && platform.screens.canPreviewItem(*resolvedURL_);
   if (resolvedURL_) tags_ = platform.cloudDocuments.tagNames(*resolvedURL_).value;
-  // Only this path stops the access; the early returns keep it.
-  if (stopAccess && resolvedURL_) platform.resourceValues.stopAccessingSecurityScopedResource(*resolvedURL_);
   return true;
 }
 
@@ -130,8 +144,8 @@ std::uint64_t DRItem::sizeOfPackage(const std::optional<URL>& url) const {
   }
   Platform& platform = Platform::current();
   std::uint64_t sum = 0;
-  const std::vector<ResourceKey> prefetched{ResourceKey::IsDirectory, ResourceKey::IsPackage, ResourceKey::TotalFileSize,
-                                            ResourceKey::FileSize};
+  const std::vector<ResourceKey> prefetched{ResourceKey::IsDirectory, ResourceKey::IsPackage,
+                                            ResourceKey::TotalFileSize, ResourceKey::FileSize};
   platform.fileManager.enumerate(
       *url, prefetched, EnumerateAll,
       [&](const URL& entry) {
@@ -142,10 +156,7 @@ std::uint64_t DRItem::sizeOfPackage(const std::optional<URL>& url) const {
         }
         return true;
       },
-      [](const URL& entry, const Error& error) {
-        VLO_INFO("Error enumerating %@: %@", entry, error);
-        return true;
-      });
+      skipUnreadable);
   return sum;
 }
 

@@ -13,8 +13,8 @@
 
 namespace vaelo {
 
-/// The record of one item of the drive: what the screens show of it and judge it by, read once. It never writes to the file
-/// system. It holds no lock: the owner keeps refills (setUrl) and reads apart. Making one blocks on the disk.
+/// The record of one item of the drive: what the screens show of it and judge it by, read once. It never writes to the
+/// file system. It holds no lock: the owner keeps refills (setUrl) and reads apart. Making one blocks on the disk.
 class DRItem {
  public:
   /// Not to be called: throws std::invalid_argument.
@@ -107,7 +107,7 @@ class DRItem {
 
  private:
   DRItem() = default;
-  bool readValues(const URL& newURL, bool stopAccess);
+  bool readValues(const URL& newURL);
   void followLink(const std::optional<URL>& target);
   void takeFileSize(const Value& size);
   void takeContainerOrSharing(const ResourceMap& values, const URL& url);

@@ -22,10 +22,10 @@ std::optional<T> typed(const Value& value) {
 /// A path as a link stores it, against the folder that holds the link.
 std::optional<URL> relativeTo(const std::optional<std::string>& target, const std::optional<URL>& folder) {
   if (!target || !folder) return std::nullopt;
-  return folder->appendingPathComponent(*target);
+  return target->starts_with('/') ? URL(*target) : folder->appendingPathComponent(*target);
 }
 
-bool hasOneComponent(const std::string& path) { return path.find('/') == std::string::npos; }
+bool hasOneComponent(const URL& url) { return url.pathComponents().size() == 1; }
 
 }  // namespace
 
@@ -40,10 +40,8 @@ void DRItem::takeFileSize(const Value& size) {
 void DRItem::followLink(const std::optional<URL>& target) {
   isSymlink_ = true;
   resolvedURL_ = target;
-  // A target that is one component (the root) is read against the folder of the link, as far as these are known by now.
-  if (resolvedURL_ && resolvedURL_->pathComponents().size() == 1) {
-    resolvedURL_ = relativeTo(symlinkTarget_, parentDirectoryURL_);
-  }
+  // A target that is one component is read against the folder of the link, as far as these are known by now.
+  if (resolvedURL_ && hasOneComponent(*resolvedURL_)) resolvedURL_ = relativeTo(symlinkTarget_, parentDirectoryURL_);
 }
 
 void DRItem::initFromKeysAndValuesWithURL(const ResourceMap& values, const URL& url) {
@@ -85,7 +83,7 @@ void DRItem::takeContainerOrSharing(const ResourceMap& values, const URL& url) {
   renameable_ = !isContainer_;
   if (isContainer_) {
     const Result<CloudContainerRef> container = cloud.containerForURL(url);
-    if (container.value && !container.error) localizedName_ = (*container.value)->localizedName();
+    if (container.value && *container.value && !container.error) localizedName_ = (*container.value)->localizedName();
   } else if (valueOf(values, ResourceKey::IsShared).boolValue() &&
              valueOf(values, ResourceKey::SharedItemRole) == Value(SharedItemRoleParticipant)) {
     renameable_ = false;
@@ -106,8 +104,8 @@ bool DRItem::initFromAttributes() {
       isSymlink_ = true;
       symlinkTarget_ = platform.fileManager.destinationOfSymbolicLinkAtPath(url_->path()).value;
       if (symlinkTarget_) {
-        resolvedURL_ = hasOneComponent(*symlinkTarget_) ? relativeTo(symlinkTarget_, parentDirectoryURL_)
-                                                        : std::optional<URL>(URL(*symlinkTarget_));
+        resolvedURL_ = URL(*symlinkTarget_);
+        if (hasOneComponent(*resolvedURL_)) resolvedURL_ = relativeTo(symlinkTarget_, parentDirectoryURL_);
       }
       break;
     }

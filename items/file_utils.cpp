@@ -17,6 +17,47 @@ Error baseError(int code) { return Error{FileErrorDomain, code, {}, {}, {}}; }
 
 std::unique_ptr<FileCoordinator> freshCoordinator() { return Platform::current().fileCoordination.makeCoordinator(); }
 
+// What is done inside the coordinated writes: functions of their own, since log lines tell the name of the function.
+
+std::optional<Error> createDirectory(const URL& url) {
+  const std::optional<Error> failure = Platform::current().fileManager.createDirectoryAtURL(url);
+  if (failure) {
+    VLO_ERROR("failed to create directory:'%@': %@", url, *failure);
+  } else {
+    VLO_INFO("Created directory: '%@'", url);
+  }
+  return failure;
+}
+
+std::optional<Error> removeUnlessChanged(const URL& url, const Value& dateBefore) {
+  const Value dateNow = FileUtils::getResourceValueForURL(ResourceKey::ContentModificationDate, url);
+  if (!dateBefore.isPresent() || !dateNow.isPresent() || !(dateBefore == dateNow)) {
+    VLO_INFO("Date changed during delete (user chose Keep?) -- preserving document: '%@'", url);
+    return baseError(FileErrorCode::UserCancelled);
+  }
+  const std::optional<Error> failure = Platform::current().fileManager.removeItemAtURL(url);
+  if (failure) {
+    VLO_ERROR("failed to delete item:'%@': %@", url, *failure);
+  } else {
+    VLO_INFO("Deleted item: '%@'", url);
+  }
+  return failure;
+}
+
+std::optional<Error> moveWithNotices(FileCoordinator& coordinator, const URL& source, const URL& destination) {
+  coordinator.itemWillMove(source, destination);
+  VLO_DEBUG("Moving src2:  '%@'", source);
+  VLO_DEBUG("Moving dest2: '%@'", destination);
+  const std::optional<Error> failure = Platform::current().fileManager.moveItemAtURL(source, destination);
+  if (failure) {
+    VLO_WARNING("KX Move failed: %@", *failure);
+  } else {
+    VLO_INFO("Move successful");
+    coordinator.itemDidMove(source, destination);
+  }
+  return failure;
+}
+
 }  // namespace
 
 bool FileUtils::exists(const URL& url) { return Platform::current().fileManager.fileExistsAtPath(url.path()); }
@@ -28,14 +69,8 @@ bool FileUtils::isDir(const URL& url) { return existsAs(url, true); }
 std::optional<Error> FileUtils::mkdir(const URL& url) {
   VLO_DEBUG("Creating directory: '%@'", url);
   std::optional<Error> failure;
-  std::optional<Error> error = freshCoordinator()->coordinateWriting(url, WritingDefault, [&](const URL& newURL) {
-    failure = Platform::current().fileManager.createDirectoryAtURL(newURL);
-    if (failure) {
-      VLO_ERROR("failed to create directory:'%@': %@", newURL, *failure);
-    } else {
-      VLO_INFO("Created directory: '%@'", newURL);
-    }
-  });
+  std::optional<Error> error = freshCoordinator()->coordinateWriting(
+      url, WritingDefault, [&](const URL& newURL) { failure = createDirectory(newURL); });
   if (!error) error = failure;
   VLO_DEBUG("Coordinated Write returned %@", error);
   return error;
@@ -43,22 +78,10 @@ std::optional<Error> FileUtils::mkdir(const URL& url) {
 
 std::optional<Error> FileUtils::remove(const URL& url) {
   VLO_DEBUG("Removing item: '%@'", url);
-  const Value before = getResourceValueForURL(ResourceKey::ContentModificationDate, url);
+  const Value dateBefore = getResourceValueForURL(ResourceKey::ContentModificationDate, url);
   std::optional<Error> failure;
-  std::optional<Error> error = freshCoordinator()->coordinateWriting(url, WritingForDeleting, [&](const URL& newURL) {
-    const Value now = getResourceValueForURL(ResourceKey::ContentModificationDate, newURL);
-    if (!before.isPresent() || !now.isPresent() || !(before == now)) {
-      VLO_INFO("Date changed during delete (user chose Keep?) -- preserving document: '%@'", newURL);
-      failure = baseError(FileErrorCode::UserCancelled);
-      return;
-    }
-    failure = Platform::current().fileManager.removeItemAtURL(newURL);
-    if (failure) {
-      VLO_ERROR("failed to delete item:'%@': %@", newURL, *failure);
-    } else {
-      VLO_INFO("Deleted item: '%@'", newURL);
-    }
-  });
+  std::optional<Error> error = freshCoordinator()->coordinateWriting(
+      url, WritingForDeleting, [&](const URL& newURL) { failure = removeUnlessChanged(newURL, dateBefore); });
   if (!error) error = failure;
   VLO_INFO("Coordinated Write returned %@", error);
   return error;
@@ -84,16 +107,7 @@ std::optional<Error> FileUtils::moveTo(const URL& source, const URL& destination
   std::optional<Error> failure;
   std::optional<Error> error = coordinator->coordinateWriting(
       source, WritingForMoving, destination, WritingForReplacing, [&](const URL& newSource, const URL& newDestination) {
-        coordinator->itemWillMove(newSource, newDestination);
-        VLO_DEBUG("Moving src2:  '%@'", newSource);
-        VLO_DEBUG("Moving dest2: '%@'", newDestination);
-        failure = Platform::current().fileManager.moveItemAtURL(newSource, newDestination);
-        if (failure) {
-          VLO_WARNING("KX Move failed: %@", *failure);
-        } else {
-          VLO_INFO("Move successful");
-          coordinator->itemDidMove(newSource, newDestination);
-        }
+        failure = moveWithNotices(*coordinator, newSource, newDestination);
       });
   if (!error) error = failure;
   if (error) VLO_WARNING("Move failed: %@", *error);

@@ -23,8 +23,8 @@ class FileUtils {
   static std::optional<Error> mkdir(const URL& url);
   /// Deletes the item, unless it changed between this call and the moment of its turn: then UserCancelled.
   static std::optional<Error> remove(const URL& url);
-  /// Moves `source` to be `destination` (not into it). The same path is success; a file onto a folder, or a folder onto a
-  /// file, is FeatureUnsupported.
+  /// Moves `source` to be `destination` (not into it). The same path is success; a file onto a folder, or a folder onto
+  /// a file, is FeatureUnsupported.
   static std::optional<Error> moveTo(const URL& source, const URL& destination);
   /// The user's documents directory.
   static std::optional<URL> docDir();
@@ -45,8 +45,8 @@ class FileUtils {
   /// May a document of this extension live in the container that the URL lies in?
   static bool isValidExtensionForContainer(const URL& url);
   static std::string pathBarArrowCharacter(bool rightToLeft);
-  /// Splits an item's URL into its container and the display names below the container's top folder, outermost first. The out
-  /// arguments may be null and are written as far as the answer is known.
+  /// Splits an item's URL into its container and the display names below the container's top folder, outermost first. The
+  /// out arguments may be null and are written as far as the answer is known.
   static std::optional<Error> containerAndRelativePathforURLContainerRelativePathComponents(
       const URL& url, CloudContainerRef* container, std::vector<std::string>* components);
   /// "drive ▸ library ▸ folder" for an item, without the item itself.

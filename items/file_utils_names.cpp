@@ -26,7 +26,8 @@ bool FileUtils::isAudioVideoImageFile(const URL& url) {
   if (!type || type->empty()) return false;
   for (const char* media : {"public.image", "public.movie", "public.audio", "com.adobe.pdf"}) {
     if (Platform::current().types.conformsTo(*type, media)) {
-      VLO_DEBUG("isAudioVideoImageFile: Extension %@ is %@ which conforms to UTI %@", url.pathExtension(), *type, media);
+      VLO_DEBUG("isAudioVideoImageFile: Extension %@ is %@ which conforms to UTI %@", url.pathExtension(), *type,
+                media);
       return true;
     }
   }
@@ -40,14 +41,15 @@ bool FileUtils::isValidExtensionForContainer(const URL& url) {
   if (!type || type->empty()) return true;
   CloudDocuments& cloud = Platform::current().cloudDocuments;
   const Result<CloudContainerRef> container = cloud.containerForURL(url);
-  if (!container.value) return false;
+  if (!container.value || !*container.value) return false;
   if ((*container.value)->identifier() == cloud.defaultContainerIdentifier()) return true;
   if (!(*container.value)->documentsFolderURL()) return false;
   const std::optional<std::vector<DeclaredDocumentType>> declared = (*container.value)->documentTypes();
-  if (!declared) return true;
+  if (!declared || declared->empty()) return true;
 
   Array gathered;
   for (const DeclaredDocumentType& documentType : *declared) {
+    if (!documentType.contentTypes.isPresent()) continue;
     const Array* types = documentType.contentTypes.array();
     if (!types) {
       VLO_ERROR("Expected content types of Set");

@@ -29,7 +29,8 @@ URL vlo_URLByResolvingAlias(const URL& url) {
 bool vlo_isDesktopOrDocumentsFolder(const URL& url) {
   CloudDocuments& cloud = Platform::current().cloudDocuments;
   const Result<CloudContainerRef> container = cloud.containerForURL(url);
-  if (!container.value || (*container.value)->identifier() != cloud.defaultContainerIdentifier()) return false;
+  if (!container.value || !*container.value) return false;
+  if ((*container.value)->identifier() != cloud.defaultContainerIdentifier()) return false;
   const std::optional<std::string> path = cloud.pathRelativeToMirror(url);
   return path == "com~marrow~Kestrel/Documents" || path == "com~marrow~Kestrel/Desktop";
 }
@@ -40,7 +41,7 @@ bool vlo_canCrossZoneMoveURLs(const std::vector<URL>& urls) {
   const std::vector<CloudContainerRef> containers = cloud.allContainers();
   if (containers.empty()) return false;
   const Result<CloudContainerRef> source = cloud.containerForURL(urls.front());
-  if (!source.value) return false;
+  if (!source.value || !*source.value) return false;
   for (const CloudContainerRef& container : containers) {
     if (container->identifier() != (*source.value)->identifier() &&
         cloud.canMoveWithoutDownloading(**source.value, *container)) {
@@ -66,18 +67,20 @@ std::int64_t vlo_DocumentID(const URL& url) {
 
 namespace {
 
+DocumentStore::Device findDriveDevice() {
+  Platform& platform = Platform::current();
+  const std::optional<URL> folder = platform.cloudDocuments.defaultContainerURL();
+  const std::optional<DocumentStore::Device> found = folder ? platform.documentStore.deviceOf(*folder) : std::nullopt;
+  if (!found) {
+    VLO_ERROR("could not get device ID");
+    std::abort();
+  }
+  return *found;
+}
+
 DocumentStore::Device driveDevice() {
   // The drive does not change its file system while the program runs.
-  static const DocumentStore::Device device = [] {
-    Platform& platform = Platform::current();
-    const std::optional<URL> folder = platform.cloudDocuments.defaultContainerURL();
-    const std::optional<DocumentStore::Device> found = folder ? platform.documentStore.deviceOf(*folder) : std::nullopt;
-    if (!found) {
-      VLO_ERROR("could not get device ID");
-      std::abort();
-    }
-    return *found;
-  }();
+  static const DocumentStore::Device device = findDriveDevice();
   return device;
 }
 

@@ -45,6 +45,8 @@ void logLine(LogLevel level, const char* function, int line, const std::string& 
   Platform::current().log.write(type, prefix + logFormatted(format, arguments));
 }
 
+bool debugLinesAreWanted() { return Platform::current().log.wantsDebug(); }
+
 void logUserAction(const char* function, int line, const std::string& label) {
   Platform::current().activityTracing.recordUserAction(label);
   logLine(LogLevel::Info, function, line, "================= %s", {label});

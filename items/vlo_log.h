@@ -52,11 +52,13 @@ using LogArguments = std::vector<LogArgument>;
 
 enum class LogLevel { Error, Warning, Info, Debug };
 
-/// Fills the conversions of `format` ("%@", "%{public}@", "%d", "%s", "%1$@" ...) with the arguments; "%%" is a percent sign.
+/// Fills the conversions of `format` ("%@", "%{public}@", "%d", "%s", "%1$@" ...) with the arguments; "%%" is a percent
+/// sign.
 std::string logFormatted(const std::string& format, const std::vector<LogArgument>& arguments);
 /// Writes a line "(VLO)[LEVEL] function (line) message" to the platform's log.
 void logLine(LogLevel level, const char* function, int line, const std::string& format,
              const std::vector<LogArgument>& arguments);
+bool debugLinesAreWanted();
 /// Records what the user did with activity tracing and logs it.
 void logUserAction(const char* function, int line, const std::string& label);
 
@@ -67,5 +69,8 @@ void logUserAction(const char* function, int line, const std::string& label);
 #define VLO_ERROR(format, ...) VLO_LOG(::vaelo::LogLevel::Error, format __VA_OPT__(, ) __VA_ARGS__)
 #define VLO_WARNING(format, ...) VLO_LOG(::vaelo::LogLevel::Warning, format __VA_OPT__(, ) __VA_ARGS__)
 #define VLO_INFO(format, ...) VLO_LOG(::vaelo::LogLevel::Info, format __VA_OPT__(, ) __VA_ARGS__)
-#define VLO_DEBUG(format, ...) VLO_LOG(::vaelo::LogLevel::Debug, format __VA_OPT__(, ) __VA_ARGS__)
+// Its arguments are not made into text where nobody reads debug lines.
+#define VLO_DEBUG(format, ...)            \
+  (!::vaelo::debugLinesAreWanted() ? (void)0 \
+                                   : VLO_LOG(::vaelo::LogLevel::Debug, format __VA_OPT__(, ) __VA_ARGS__))
 #define VLO_USER_ACTION(label) ::vaelo::logUserAction(__func__, __LINE__, label)
