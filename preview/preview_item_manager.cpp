@@ -206,7 +206,9 @@ void PreviewItemManager::accommodatePresentedItemDeletionWithCompletionHandler(C
   VLO_INFO("Accommodate deletion: %@", itemURL());
   completion(std::nullopt);
   unregisterAsFilePresenter();
-  Platform::current().queues.main().async([self = shared_from_this()] {
+  const std::shared_ptr<PreviewItemManager> self = weak_from_this().lock();
+  if (!self) return;
+  Platform::current().queues.main().async([self] {
     if (const auto navigation = self->navigationController_.lock()) navigation->popViewControllerAnimated(true);
   });
 }

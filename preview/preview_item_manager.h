@@ -68,12 +68,12 @@ class PreviewItemManager : public FilePresenter, public std::enable_shared_from_
   std::shared_ptr<DRItem> item_;
   long mode_ = 0;
   std::weak_ptr<NavigationController> navigationController_;
-  std::shared_ptr<OperationQueue> fcQueue_;
   std::optional<Date> modifiedDate_;
   std::recursive_mutex lock_;          // guards the two flags
   bool filePresenterRegistered_ = false;
   bool refreshPending_ = false;
   std::vector<NotificationCenter::Token> observations_;
+  std::shared_ptr<OperationQueue> fcQueue_;  // last, so that it ends before what its callbacks use
 };
 
 }  // namespace vaelo
