@@ -37,11 +37,13 @@ def wait_for(what, condition, patience=PATIENCE):
 class Desktop:
     """An X server with a window manager and a session bus."""
 
-    def __init__(self, width=1280, height=800):
+    def __init__(self, width=1280, height=800, framebuffer=False):
         self.scratch = pathlib.Path(tempfile.mkdtemp(prefix="vaelo-e2e-"))
         self.processes = []
+        self.framebuffer = self.scratch  # holds the display's picture, when asked for
         reader, writer = os.pipe()
-        self.start(["Xvfb", "-displayfd", str(writer), "-screen", "0", f"{width}x{height}x24", "-nolisten", "tcp"], {}, (writer,))
+        self.start(["Xvfb", "-displayfd", str(writer), "-screen", "0", f"{width}x{height}x24", "-nolisten", "tcp",
+                    *(["-fbdir", str(self.scratch)] if framebuffer else [])], {}, (writer,))
         os.close(writer)
         with os.fdopen(reader) as display:
             number = display.readline().strip()
