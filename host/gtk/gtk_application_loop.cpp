@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/gtk_application_loop.h"
 
+#include <unicode/uloc.h>
+
 #include "host/drive/local_cloud_documents.h"
 #include "host/gtk/gtk_screens.h"
 #include "host/gtk/gtk_window.h"
@@ -25,6 +27,11 @@ int GtkApplicationLoop::run(int argc, char** argv, std::function<std::shared_ptr
   g_application_set_option_context_summary(G_APPLICATION(application_),
                                            "Browse and manage the documents of your cloud drive.\n"
                                            "LINK is one of the vaelodriveapp: scheme and opens that item.");
+  // Our texts follow the user's list of languages, so the direction does too, not the locale of numbers and dates.
+  g_signal_connect(application_, "startup", G_CALLBACK(+[](GApplication*, gpointer) {
+                     if (uloc_isRightToLeft(g_get_language_names()[0])) gtk_widget_set_default_direction(GTK_TEXT_DIR_RTL);
+                   }),
+                   nullptr);
   g_signal_connect_swapped(application_, "activate", G_CALLBACK(+[](GtkApplicationLoop* self) { self->activate(); }), this);
   g_signal_connect(application_, "command-line",
                    G_CALLBACK(+[](GApplication*, GApplicationCommandLine* line, GtkApplicationLoop* self) -> int {

@@ -106,6 +106,7 @@ void GtkWindowHost::stackChanged(const Stack&, const Stack& newStack, bool anima
     if (!page) {
       page = std::make_unique<ScreenPage>(screen, [this] { goBack(); }, G_MENU_MODEL(menu_));
       page->setToolbarHidden(!controller || controller->toolbarHidden());
+      page->setNarrow(traitCollection().horizontalSizeClass == SizeClass::Compact);
     }
     page->setCanGoBack(!widgets.empty());
     widgets.push_back(page->widget());
@@ -180,6 +181,9 @@ void GtkWindowHost::sizeChanged() {
   gtk_window_get_default_size(widget(), &width, &height);
   if (width <= 0 || height <= 0) return;
   setTraitCollection(traitsFor(width, height));
+  for (const auto& [screen, page] : pages_) {
+    page->setNarrow(traitCollection().horizontalSizeClass == SizeClass::Compact);
+  }
   resize(Size{static_cast<double>(width), static_cast<double>(height)}, false);
 }
 

@@ -71,6 +71,10 @@ void ScreenPage::setToolbarHidden(bool hidden) {
   showToolbar();
 }
 
+void ScreenPage::setNarrow(bool narrow) {
+  adw_header_bar_set_decoration_layout(ADW_HEADER_BAR(header_), narrow ? ":close" : nullptr);
+}
+
 void ScreenPage::showBar() {
   NavigationItem& item = screen_->navigationItem();
   adw_window_title_set_title(ADW_WINDOW_TITLE(title_), item.title().c_str());

@@ -27,6 +27,8 @@ class ScreenPage {
   HostScreen* hostScreen() const { return hostScreen_; }
   void setCanGoBack(bool can);
   void setToolbarHidden(bool hidden);
+  /// On a narrow window the title needs the room of the buttons that a phone's windows don't have.
+  void setNarrow(bool narrow);
 
  private:
   void showBar();
