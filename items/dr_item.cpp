@@ -20,9 +20,7 @@ bool skipUnreadable(const URL& entry, const Error& error) {
 
 }  // namespace
 
-std::shared_ptr<DRItem> DRItem::init() {
-  throw std::invalid_argument(logFormatted("Don't call %@.", {"-[DRItem init]"}));
-}
+std::shared_ptr<DRItem> DRItem::init() { throw std::invalid_argument(logFormatted("Don't call %@.", {"-[DRItem init]"})); }
 
 std::shared_ptr<DRItem> DRItem::initWithURL(const std::optional<URL>& url) {
   std::shared_ptr<DRItem> item(new DRItem());
@@ -62,9 +60,7 @@ const std::shared_ptr<OperationQueue>& DRItem::getThumbnailQueue() {
   return queue;
 }
 
-bool DRItem::isPromise() const {
-  return promiseURL_ && !(resolvedURL_ && promiseURL_->sameObject(*resolvedURL_));
-}
+bool DRItem::isPromise() const { return promiseURL_ && !(resolvedURL_ && promiseURL_->sameObject(*resolvedURL_)); }
 
 void DRItem::clearValues() {
   resolvedURL_.reset();
@@ -144,8 +140,8 @@ std::uint64_t DRItem::sizeOfPackage(const std::optional<URL>& url) const {
   }
   Platform& platform = Platform::current();
   std::uint64_t sum = 0;
-  const std::vector<ResourceKey> prefetched{ResourceKey::IsDirectory, ResourceKey::IsPackage,
-                                            ResourceKey::TotalFileSize, ResourceKey::FileSize};
+  const std::vector<ResourceKey> prefetched{ResourceKey::IsDirectory, ResourceKey::IsPackage, ResourceKey::TotalFileSize,
+                                            ResourceKey::FileSize};
   platform.fileManager.enumerate(
       *url, prefetched, EnumerateAll,
       [&](const URL& entry) {
@@ -164,10 +160,10 @@ std::string DRItem::description() const {
   const auto orSame = [&](const std::optional<URL>& other) {
     return other == url_ ? LogArgument("<same>") : LogArgument(other);
   };
-  return logFormatted("Name=%@, Size=%@, URL=%@, ResURL=%@, PromiseURL=%@, %@%@%@%@",
-                      {localizedName_, fileSize_, url_, orSame(resolvedURL_), orSame(promiseURL_),
-                       isDirectory_ ? "Directory, " : "", isPackage_ ? "Package, " : "",
-                       storedPromiseFlag_ ? "Promise, " : "Local,", isSymlink_ ? "Symlink, " : ""});
+  return logFormatted(
+      "Name=%@, Size=%@, URL=%@, ResURL=%@, PromiseURL=%@, %@%@%@%@",
+      {localizedName_, fileSize_, url_, orSame(resolvedURL_), orSame(promiseURL_), isDirectory_ ? "Directory, " : "",
+       isPackage_ ? "Package, " : "", storedPromiseFlag_ ? "Promise, " : "Local,", isSymlink_ ? "Symlink, " : ""});
 }
 
 ImageRef DRItem::thumbnail() {

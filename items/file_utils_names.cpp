@@ -26,8 +26,7 @@ bool FileUtils::isAudioVideoImageFile(const URL& url) {
   if (!type || type->empty()) return false;
   for (const char* media : {"public.image", "public.movie", "public.audio", "com.adobe.pdf"}) {
     if (Platform::current().types.conformsTo(*type, media)) {
-      VLO_DEBUG("isAudioVideoImageFile: Extension %@ is %@ which conforms to UTI %@", url.pathExtension(), *type,
-                media);
+      VLO_DEBUG("isAudioVideoImageFile: Extension %@ is %@ which conforms to UTI %@", url.pathExtension(), *type, media);
       return true;
     }
   }

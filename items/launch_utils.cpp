@@ -47,8 +47,7 @@ bool LaunchUtils::isUrlInDefaultContainer(const URL& url) {
   return cloud.containerIdentifierForURL(url) == cloud.defaultContainerIdentifier();
 }
 
-std::optional<ApplicationRecord> LaunchUtils::defaultAppForDocumentRequireOpenIn(const URL& document,
-                                                                                 bool requireOpenIn) {
+std::optional<ApplicationRecord> LaunchUtils::defaultAppForDocumentRequireOpenIn(const URL& document, bool requireOpenIn) {
   if (!FileUtils::exists(document)) VLO_DEBUG("Assuming apps can open a promised document...");
   return isUrlInDefaultContainer(document) ? appForDocumentInDrive(document, requireOpenIn)
                                            : appForDocumentInLibrary(document);
@@ -83,8 +82,7 @@ std::optional<ApplicationRecord> LaunchUtils::appForDocumentInDrive(const URL& d
 std::optional<ApplicationRecord> LaunchUtils::appForDocumentInLibrary(const URL& document) {
   Platform& platform = Platform::current();
   const std::optional<std::string> identifier = platform.cloudDocuments.containerIdentifierForURL(document);
-  const CloudContainerRef container =
-      identifier ? platform.cloudDocuments.containerWithIdentifier(*identifier) : nullptr;
+  const CloudContainerRef container = identifier ? platform.cloudDocuments.containerWithIdentifier(*identifier) : nullptr;
   if (!container) return std::nullopt;
   const std::vector<ApplicationRecord> candidates = candidatesFor(vlo_URLByResolvingBookmark(document));
   const std::string name = container->localizedName();
@@ -98,9 +96,8 @@ std::optional<ApplicationRecord> LaunchUtils::appForDocumentInLibrary(const URL&
     VLO_DEBUG("Container %@: Default app (%@) supports open in place", name, owner);
     if (std::find(candidates.begin(), candidates.end(), *app) != candidates.end()) return app;
     VLO_DEBUG("Container %@: Default app does NOT support/own this document type.", name);
-    const auto fallback = std::find_if(candidates.begin(), candidates.end(), [](const ApplicationRecord& candidate) {
-      return candidate.supportsOpenInPlace;
-    });
+    const auto fallback = std::find_if(candidates.begin(), candidates.end(),
+                                       [](const ApplicationRecord& candidate) { return candidate.supportsOpenInPlace; });
     if (fallback != candidates.end()) {
       VLO_DEBUG("Falling back to default open-in-place app instead: %@", fallback->description());
       return *fallback;
@@ -110,8 +107,7 @@ std::optional<ApplicationRecord> LaunchUtils::appForDocumentInLibrary(const URL&
   return std::nullopt;
 }
 
-std::optional<std::string> LaunchUtils::defaultAppNameForDocumentRequireOpenIn(const URL& document,
-                                                                               bool requireOpenIn) {
+std::optional<std::string> LaunchUtils::defaultAppNameForDocumentRequireOpenIn(const URL& document, bool requireOpenIn) {
   const std::optional<ApplicationRecord> app = defaultAppForDocumentRequireOpenIn(document, requireOpenIn);
   return app ? std::optional(app->localizedName) : std::nullopt;
 }

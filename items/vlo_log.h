@@ -23,8 +23,7 @@ class LogArgument {
   LogArgument(Date date) : LogArgument(Value(date)) {}
   LogArgument(bool flag) : text_(flag ? "1" : "0") {}
   template <std::integral T>
-    requires(!std::same_as<T, bool>)
-  LogArgument(T number) : text_(std::to_string(number)) {}
+  requires(!std::same_as<T, bool>) LogArgument(T number) : text_(std::to_string(number)) {}
   LogArgument(double number) : text_(std::to_string(number)) {}
   template <typename T>
   LogArgument(const std::optional<T>& value) : text_(value ? LogArgument(*value).text_ : "(null)") {}
@@ -36,10 +35,14 @@ class LogArgument {
   }
   /// An object with a class name or a description.
   template <typename T>
-    requires requires(const T& object) { { object->className() } -> std::convertible_to<std::string>; }
+  requires requires(const T& object) {
+    { object->className() } -> std::convertible_to<std::string>;
+  }
   LogArgument(const T& object) : text_(object ? object->className() : "(null)") {}
   template <typename T>
-    requires requires(const T& object) { { object->description() } -> std::convertible_to<std::string>; }
+  requires requires(const T& object) {
+    { object->description() } -> std::convertible_to<std::string>;
+  }
   LogArgument(const T& object) : text_(object ? object->description() : "(null)") {}
 
   const std::string& text() const { return text_; }
@@ -64,13 +67,11 @@ void logUserAction(const char* function, int line, const std::string& label);
 
 }  // namespace vaelo
 
-#define VLO_LOG(level, format, ...) \
-  ::vaelo::logLine(level, __func__, __LINE__, format, ::vaelo::LogArguments{__VA_ARGS__})
+#define VLO_LOG(level, format, ...) ::vaelo::logLine(level, __func__, __LINE__, format, ::vaelo::LogArguments{__VA_ARGS__})
 #define VLO_ERROR(format, ...) VLO_LOG(::vaelo::LogLevel::Error, format __VA_OPT__(, ) __VA_ARGS__)
 #define VLO_WARNING(format, ...) VLO_LOG(::vaelo::LogLevel::Warning, format __VA_OPT__(, ) __VA_ARGS__)
 #define VLO_INFO(format, ...) VLO_LOG(::vaelo::LogLevel::Info, format __VA_OPT__(, ) __VA_ARGS__)
 // Its arguments are not made into text where nobody reads debug lines.
-#define VLO_DEBUG(format, ...)            \
-  (!::vaelo::debugLinesAreWanted() ? (void)0 \
-                                   : VLO_LOG(::vaelo::LogLevel::Debug, format __VA_OPT__(, ) __VA_ARGS__))
+#define VLO_DEBUG(format, ...) \
+  (!::vaelo::debugLinesAreWanted() ? (void)0 : VLO_LOG(::vaelo::LogLevel::Debug, format __VA_OPT__(, ) __VA_ARGS__))
 #define VLO_USER_ACTION(label) ::vaelo::logUserAction(__func__, __LINE__, label)

@@ -21,8 +21,8 @@ class WorldCoordinator : public FileCoordinator {
     world_.calls.push_back("write " + std::to_string(options) + " " + url.path());
     return run([&] { accessor(given(url)); });
   }
-  std::optional<Error> coordinateWriting(const URL& first, unsigned firstOptions, const URL& second,
-                                         unsigned secondOptions, const PairAccessor& accessor) override {
+  std::optional<Error> coordinateWriting(const URL& first, unsigned firstOptions, const URL& second, unsigned secondOptions,
+                                         const PairAccessor& accessor) override {
     world_.calls.push_back("write " + std::to_string(firstOptions) + " " + first.path() + " " +
                            std::to_string(secondOptions) + " " + second.path());
     return run([&] { accessor(given(first), given(second)); });
@@ -107,7 +107,7 @@ ItemsWorld::ItemsWorld()
     : drive(std::make_shared<TestContainer>(DriveIdentifier, "Vaelo Drive", Drive)),
       library(std::make_shared<TestContainer>(LibraryIdentifier, "Sketchbook", LibraryDocuments)),
       containers{drive, library},
-      platform_{*this, *this, *this, *this, *this, *this, *this, *this, *this,
+      platform_{*this, *this,       *this,          *this, *this, *this, *this, *this, *this,
                 *this, recordedLog, notifications_, *this, *this, *this, *this, *this, *this} {
   Platform::install(&platform_);
 }
@@ -194,9 +194,8 @@ bool ItemsWorld::containsControlCharacter(const std::string& text) { return text
 bool ItemsWorld::containsNewline(const std::string& text) { return text.find('\n') != std::string::npos; }
 
 bool ItemsWorld::localizedCaseInsensitiveEquals(const std::string& a, const std::string& b) {
-  return std::equal(a.begin(), a.end(), b.begin(), b.end(), [](unsigned char x, unsigned char y) {
-    return std::tolower(x) == std::tolower(y);
-  });
+  return std::equal(a.begin(), a.end(), b.begin(), b.end(),
+                    [](unsigned char x, unsigned char y) { return std::tolower(x) == std::tolower(y); });
 }
 
 std::optional<DocumentStore::Device> ItemsWorld::deviceOf(const URL& folder) {
@@ -205,12 +204,14 @@ std::optional<DocumentStore::Device> ItemsWorld::deviceOf(const URL& folder) {
 }
 
 SystemResult<DocumentStore::FileID> ItemsWorld::resolveDocumentID(Device device, std::uint64_t documentID) {
-  calls.push_back("resolve " + std::to_string(device) + " " + std::to_string(documentID));
+  devices.insert(device);
+  calls.push_back("resolve " + std::to_string(documentID));
   return resolvedFile;
 }
 
 SystemResult<int> ItemsWorld::openByID(Device device, FileID file) {
-  calls.push_back("openByID " + std::to_string(device) + " " + std::to_string(file));
+  devices.insert(device);
+  calls.push_back("openByID " + std::to_string(file));
   return openedHandle;
 }
 

@@ -133,6 +133,7 @@ class ItemsWorld : public Application,
   SystemResult<int> openedHandle{7, {}};
   SystemResult<OpenFileAttributes> openAttributes{OpenFileAttributes{}, {}};
   std::optional<Device> device_ = 5;
+  std::set<Device> devices;  ///< that were asked
 
   // Applications and types.
   std::map<std::string, std::string> typeOfExtension;
@@ -238,8 +239,8 @@ class ItemsWorld : public Application,
   DispatchQueue& main() override { std::abort(); }
   std::shared_ptr<DispatchQueue> makeSerialQueue(const std::string&) override { return nullptr; }
   std::shared_ptr<OperationQueue> makeOperationQueue(const std::string& name, QualityOfService quality) override;
-  std::unique_ptr<TimerSource> makeTimer(std::shared_ptr<DispatchQueue>, std::chrono::nanoseconds,
-                                         std::chrono::nanoseconds, Block) override {
+  std::unique_ptr<TimerSource> makeTimer(std::shared_ptr<DispatchQueue>, std::chrono::nanoseconds, std::chrono::nanoseconds,
+                                         Block) override {
     return nullptr;
   }
   Date now() override { return now_; }
