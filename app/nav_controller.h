@@ -11,6 +11,7 @@
 #include "app/quota_fetcher.h"
 #include "platform/date.h"
 #include "platform/notifications.h"
+#include "platform/ui/document_interaction_controller.h"
 #include "platform/ui/document_list_controller_delegate.h"
 #include "platform/ui/navigation_controller.h"
 #include "platform/ui/upgrade_flow_manager.h"
@@ -18,6 +19,7 @@
 namespace vaelo {
 
 class DRItem;
+class FilenamePrompt;
 class PreviewItemManager;
 struct UbiquityIdentityToken;
 
@@ -27,6 +29,7 @@ struct UbiquityIdentityToken;
 class NavController : public NavigationController,
                       public NavigationControllerDelegate,
                       public DocumentListControllerDelegate,
+                      public DocumentInteractionControllerDelegate,
                       public QuotaFetcherDelegate,
                       public DocumentListControllerStatusBarDelegate {
  public:
@@ -42,11 +45,23 @@ class NavController : public NavigationController,
   void setSplitViewController(std::weak_ptr<ViewController> split) { splitViewController_ = std::move(split); }
   /// The title of the list configured last.
   const std::string& viewTitle() const { return viewTitle_; }
+  /// The toolbar's buttons in edit mode; null outside it.
+  const BarButtonItemRef& barButtonNewFolder() const { return barButtonNewFolder_; }
+  const BarButtonItemRef& barButtonDeleteItem() const { return barButtonDeleteItem_; }
+  const BarButtonItemRef& barButtonMoveItem() const { return barButtonMoveItem_; }
   /// Free bytes of the account, and when they were learnt.
   std::uint64_t quotaBytes() const { return quotaBytes_; }
   const std::optional<Date>& lastQuotaFetch() const { return lastQuotaFetch_; }
   /// Null while no account is signed in.
   const std::shared_ptr<QuotaFetcher>& quotaFetcher() const { return quotaFetcher_; }
+  /// The share sheet that was shown last, which must live while it is shown; null before the first.
+  const std::shared_ptr<DocumentInteractionController>& documentInteractionController() const {
+    return documentInteractionController_;
+  }
+  /// Of the item action that may still be going on; empty before the first.
+  const Completion& performActionCompletionBlock() const { return performActionCompletionBlock_; }
+  /// The question for a name that was asked last, for a new folder or another name; null before the first.
+  const std::shared_ptr<FilenamePrompt>& folderPromptAlert() const { return folderPromptAlert_; }
   /// Of the document being previewed; null for none.
   const std::shared_ptr<PreviewItemManager>& itemManager() const { return itemManager_; }
   const std::shared_ptr<UpgradeFlowManager>& upgradeFlowMgr() const { return upgradeFlowMgr_; }
@@ -118,7 +133,9 @@ class NavController : public NavigationController,
   void documentListControllerPerformActionURL(const DocumentListControllerRef& list, int action, const URL& url) override;
   ViewControllerRef documentListControllerViewControllerForPreviewingItemAtURL(const DocumentListControllerRef& list,
                                                                                const URL& url) override;
-  void documentInteractionControllerDidDismissOptionsMenu() {}
+
+  // DocumentInteractionControllerDelegate
+  void documentInteractionControllerDidDismissOptionsMenu(DocumentInteractionController&) override {}
 
  private:
   void observeNotifications();
@@ -132,6 +149,7 @@ class NavController : public NavigationController,
   void showPreviewSoon(const std::shared_ptr<DRItem>& item, long mode);
   std::shared_ptr<DRItem> targetOfLink(const DRItem& link) const;
   bool openInDefaultApp(const std::shared_ptr<DRItem>& item);
+  void showInfo(const URL& url);
   /// A new manager in the place of the present one, which no longer follows its document.
   std::shared_ptr<PreviewItemManager> replaceItemManager(long mode);
 
@@ -139,9 +157,15 @@ class NavController : public NavigationController,
   bool pickerIsAlive_ = false;
   std::weak_ptr<ViewController> splitViewController_;
   std::string viewTitle_;
+  BarButtonItemRef barButtonNewFolder_;
+  BarButtonItemRef barButtonDeleteItem_;
+  BarButtonItemRef barButtonMoveItem_;
   std::uint64_t quotaBytes_ = 0;
   std::optional<Date> lastQuotaFetch_;
   std::shared_ptr<QuotaFetcher> quotaFetcher_;
+  std::shared_ptr<DocumentInteractionController> documentInteractionController_;
+  Completion performActionCompletionBlock_;
+  std::shared_ptr<FilenamePrompt> folderPromptAlert_;
   std::shared_ptr<PreviewItemManager> itemManager_;
   std::shared_ptr<UpgradeFlowManager> upgradeFlowMgr_;
   StorageOfferRef upgradeOffer_;
