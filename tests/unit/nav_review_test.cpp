@@ -20,7 +20,7 @@ TEST_F(NavReviewTest, TheViewIsSetUpInItsOrder) {
   EXPECT_LT(lineOf("New DLC (0 items): "), lineOf("NavController viewDidLoad"));
   EXPECT_LT(lineOf("NavController viewDidLoad"), lineOf("Quota Offer level is not set"));
   EXPECT_LT(lineOf("Quota Offer level is not set"), log().lines().size());
-  EXPECT_EQ(topList()->view()->superview(), nav->view().get()) << "the base class came after the stack was built";
+  EXPECT_EQ(topList()->view()->superview(), nav->view().get());
 }
 
 TEST_F(NavReviewTest, WhatEditModeAndTheActionsKeepIsEmptyAtTheStart) {
@@ -391,6 +391,7 @@ TEST_F(NavReviewTest, TheFetchesAfterAnOfferAskWhoeverPollsByThen) {
   loadNav();
   becomeActive();
   runAllQueues();
+  const std::weak_ptr<QuotaFetcher> former = nav->quotaFetcher();
   offerChanged();
   signOut();
   identityChanged();
@@ -401,6 +402,7 @@ TEST_F(NavReviewTest, TheFetchesAfterAnOfferAskWhoeverPollsByThen) {
   identityChanged();
   runAllQueues();
   before = quotaFetches();
+  EXPECT_TRUE(former.expired()) << "nothing keeps the poller of the account that went away";
   advance(std::chrono::seconds(4));
   EXPECT_EQ(quotaFetches(), before + 1) << "the new account's";
 }
