@@ -52,7 +52,7 @@ void NavController::setupInitialViewController() {
     VLO_DEBUG("Vaelo is enabled");
     setToolbarHidden(false);
     const DocumentListControllerRef root = Platform::current().screens.makeRootList();
-    VLO_DEBUG("Contained items: %@", root ? std::optional(root->containedItems()) : std::nullopt);
+    VLO_DEBUG("Contained items: %@", root ? std::optional(root->containedItems().all()) : std::nullopt);
     if (root) {
       initNewListController(root);
       setViewControllers({root}, false);
@@ -89,7 +89,7 @@ void NavController::initNewListController(const DocumentListControllerRef& list)
             FileUtils::getResourceValueForURL(ResourceKey::TypeIdentifier, list->presentedURL()), list->presentedURL());
   // A list may have 100,000 items; their lines are made only for a log that takes them.
   if (Platform::current().log.wantsDebug()) {
-    for (const URL& item : list->containedItems()) {
+    for (const URL& item : list->containedItems().all()) {
       VLO_DEBUG("    %@", "..." + item.path().substr(item.path().rfind('/')));
     }
   }

@@ -1,10 +1,13 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
-// What making the record of a local document costs, beside the system calls that it can't do without: one statx and the two
-// extended attributes (sharing role, tags).
+// What making the record of a local document costs, beside the system calls that it can't do without: one statx, the two extended
+// attributes (sharing role, tags), and asking whether a link leads the path out of the drive.
 #include <benchmark/benchmark.h>
 #include <fcntl.h>
+#include <linux/openat2.h>
 #include <sys/stat.h>
+#include <sys/syscall.h>
 #include <sys/xattr.h>
+#include <unistd.h>
 
 #include <cstdlib>
 #include <filesystem>
@@ -62,6 +65,10 @@ void rawSystemCalls(benchmark::State& state) {
     benchmark::DoNotOptimize(statx(AT_FDCWD, path, AT_SYMLINK_NOFOLLOW, STATX_BASIC_STATS | STATX_BTIME, &info));
     benchmark::DoNotOptimize(lgetxattr(path, "user.vaelo.share", value, sizeof value));
     benchmark::DoNotOptimize(lgetxattr(path, "user.xdg.tags", value, sizeof value));
+    open_how how = {};
+    how.flags = O_PATH | O_CLOEXEC;
+    how.resolve = RESOLVE_NO_SYMLINKS;
+    close(static_cast<int>(syscall(SYS_openat2, AT_FDCWD, path, &how, sizeof how)));
   }
 }
 BENCHMARK(rawSystemCalls);

@@ -9,11 +9,13 @@
 #include "host/gtk/gtk_application_loop.h"
 #include "host/gtk/gtk_screens.h"
 #include "host/host_platform.h"
+#include "host/support/graphics_device.h"
 
 int main(int argc, char** argv) {
   std::setlocale(LC_ALL, "");
   bind_textdomain_codeset("vaelo-drive", "UTF-8");
   textdomain("vaelo-drive");
+  vaelo::drawWithoutGLWhereItIsEmulated();
   const vaelo::HostFolders folders = vaelo::HostFolders::fromEnvironment();
   vaelo::HostPlatform platform(folders);
   vaelo::GtkScreens screens(platform.drive());

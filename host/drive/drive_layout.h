@@ -8,7 +8,7 @@ namespace vaelo {
 
 /// `path` with every link followed and every "." and ".." gone. What does not exist keeps its last components; a link that
 /// leads nowhere leads to where it says. A link in a circle stays as it is. A path that is not absolute or holds a NUL comes
-/// back unchanged. One readlink a component; any thread.
+/// back unchanged. One open for a path without links, otherwise one readlink a component; any thread.
 std::string realLocation(const std::string& path);
 
 /// Where the drive keeps what. Immutable, so safe from any thread.

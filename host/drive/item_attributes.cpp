@@ -28,23 +28,19 @@ std::string trimmed(const std::string& text) {
 
 }  // namespace
 
-std::optional<std::string> sharedItemRoleOf(const std::string& path) {
-  const std::optional<std::string> physical = physicalPathOf(path);
-  if (!physical) return std::nullopt;
-  if (const auto promise = promiseAt(*physical)) return promise->share;
-  std::optional<std::string> role = extendedAttribute(*physical, "user.vaelo.share");
+std::optional<std::string> sharedItemRoleAt(const std::string& physical) {
+  if (const auto promise = promiseAt(physical)) return promise->share;
+  std::optional<std::string> role = extendedAttribute(physical, "user.vaelo.share");
   if (role != SharedItemRoleOwner && role != SharedItemRoleParticipant) return std::nullopt;
   return role;
 }
 
-std::vector<std::string> tagNamesOf(const std::string& path) {
-  const std::optional<std::string> physical = physicalPathOf(path);
-  if (!physical) return {};
+std::vector<std::string> tagNamesAt(const std::string& physical) {
   std::vector<std::string> kept;
-  if (const auto promise = promiseAt(*physical)) {
+  if (const auto promise = promiseAt(physical)) {
     kept = promise->tags;
   } else {
-    std::istringstream stream(extendedAttribute(*physical, "user.xdg.tags").value_or(""));
+    std::istringstream stream(extendedAttribute(physical, "user.xdg.tags").value_or(""));
     for (std::string tag; std::getline(stream, tag, ',');) kept.push_back(tag);
   }
   std::vector<std::string> names;

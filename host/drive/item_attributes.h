@@ -7,12 +7,13 @@
 
 namespace vaelo {
 
-/// What is kept in an item's extended attributes, and in its promise while it is not downloaded. Paths may be logical or
-/// physical; links are not followed. An item that is not there or has no such attribute has none. Safe from any thread.
+/// What is kept in an item's extended attributes, and in its promise while it is not downloaded. Paths are physical: the
+/// item itself or its promise; links are not followed. What is not there or has no such attribute has none. Safe from any
+/// thread.
 
 /// SharedItemRoleOwner or SharedItemRoleParticipant; nothing when the item is not shared or the attribute says neither.
-std::optional<std::string> sharedItemRoleOf(const std::string& path);
+std::optional<std::string> sharedItemRoleAt(const std::string& physical);
 /// Tag names in the order in which they are kept, trimmed, without empty and repeated ones and what is not UTF-8.
-std::vector<std::string> tagNamesOf(const std::string& path);
+std::vector<std::string> tagNamesAt(const std::string& physical);
 
 }  // namespace vaelo

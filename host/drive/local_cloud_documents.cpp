@@ -31,6 +31,12 @@ bool isRegularFile(const std::string& path) {
   return ::lstat(path.c_str(), &status) == 0 && S_ISREG(status.st_mode);
 }
 
+// Spares all other items the look at their container.
+bool isDocumentsFolderName(std::string_view relativeToMirror) {
+  if (relativeToMirror == DriveLayout::DefaultContainer) return true;
+  return relativeToMirror.ends_with("/Documents") && std::count(relativeToMirror.begin(), relativeToMirror.end(), '/') == 1;
+}
+
 // A promise counts as much as the item that it stands for: the account holds that.
 std::int64_t usedBytes(const std::string& mirror) {
   std::int64_t used = 0;
@@ -93,8 +99,11 @@ std::optional<std::string> LocalCloudDocuments::containerIdentifierForURL(const 
 }
 
 bool LocalCloudDocuments::isDocumentsContainer(const URL& url) {
-  const Result<CloudContainerRef> container = containerForURL(url);
-  return container && (*container.value)->documentsFolderURL() == realPathURL(url);
+  const std::optional<std::string> relative = layout_.relativeToMirror(url.path());
+  if (!relative || !isDocumentsFolderName(*relative)) return false;
+  const CloudContainerRef container = containers_.container(relative->substr(0, relative->find('/')));
+  return container && container->documentsFolderURL() &&
+         container->documentsFolderURL()->path() == layout_.mirrorRoot() + "/" + *relative;
 }
 
 std::optional<URL> LocalCloudDocuments::defaultContainerURL() {
@@ -144,8 +153,9 @@ URL LocalCloudDocuments::physicalURL(const URL& url) {
 }
 
 Result<std::vector<std::string>> LocalCloudDocuments::tagNames(const URL& url) {
-  if (!physicalPathOf(url.path())) return fileError(FileErrorCode::NoSuchFile, url.path(), "there is no such item");
-  return tagNamesOf(url.path());
+  const std::optional<std::string> physical = physicalPathOf(url.path());
+  if (!physical) return fileError(FileErrorCode::NoSuchFile, url.path(), "there is no such item");
+  return tagNamesAt(*physical);
 }
 
 bool LocalCloudDocuments::canMoveWithoutDownloading(const CloudContainer& from, const CloudContainer& to) {

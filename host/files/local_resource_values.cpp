@@ -105,7 +105,7 @@ class LocalResourceValues::Reader {
   const std::optional<std::string>& role() {
     if (!roleRead_) {
       roleRead_ = true;
-      role_ = promise_ ? promise_->share : sharedItemRoleOf(url_.path());
+      role_ = promise_ ? promise_->share : sharedItemRoleAt(url_.path());
     }
     return role_;
   }

@@ -72,12 +72,15 @@ URL FolderListScreen::urlOf(const std::string& name) const { return presentedURL
 
 std::vector<std::string> FolderListScreen::searchedFolders() const { return {presentedURL()->path()}; }
 
-void FolderListScreen::reportItems() {
-  std::vector<URL> items;
-  const std::size_t count = view_->itemCount();
-  items.reserve(count);
-  for (std::size_t i = 0; i < count; ++i) items.push_back(urlOf(view_->nameAt(i)));
-  itemsLoaded(std::move(items));
+void FolderListScreen::reportItems() { itemsLoaded(shownItems()); }
+
+URLList FolderListScreen::shownItems() {
+  const auto snapshot = view_->model().snapshot();
+  const URL folder = *presentedURL();
+  return {snapshot->size(), [snapshot, folder](std::size_t i) { return folder.appendingPathComponent(snapshot->name(i)); },
+          [snapshot, folder](const URL& url) {
+            return url.deletingLastPathComponent() == folder ? snapshot->indexOf(url.lastPathComponent()) : std::nullopt;
+          }};
 }
 
 void FolderListScreen::activated(FolderView& view, const std::string& name, const URL& url) {

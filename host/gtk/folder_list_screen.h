@@ -33,6 +33,8 @@ class FolderListScreen : public DocumentListController, public HostScreen {
   virtual void fill();
   /// The URL that a row's name stands for.
   virtual URL urlOf(const std::string& name) const;
+  /// The items of all rows, in their order.
+  virtual URLList shownItems();
   /// Where a search looks.
   virtual std::vector<std::string> searchedFolders() const;
   void reportItems();

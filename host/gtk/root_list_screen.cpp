@@ -46,6 +46,12 @@ std::vector<FolderEntry> RootListScreen::libraries() const {
   return entries;
 }
 
+URLList RootListScreen::shownItems() {
+  std::vector<URL> items;
+  for (std::size_t i = 0; i < folderView().itemCount(); ++i) items.push_back(URL(folderView().nameAt(i)));
+  return items;
+}
+
 std::vector<std::string> RootListScreen::searchedFolders() const {
   std::vector<std::string> folders{presentedURL()->path()};
   for (const FolderEntry& library : libraries()) folders.push_back(library.path);

@@ -17,6 +17,7 @@ class RootListScreen : public FolderListScreen {
  protected:
   void fill() override;
   URL urlOf(const std::string& name) const override { return URL(name); }
+  URLList shownItems() override;
   std::vector<std::string> searchedFolders() const override;
 
  private:

@@ -1,29 +1,11 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "platform/ui/document_list_controller.h"
 
-#include <algorithm>
 #include <utility>
 
 #include "platform/ui/search_controller.h"
 
 namespace vaelo {
-
-namespace {
-
-std::vector<URL> thoseAmong(const std::vector<URL>& all, const std::vector<URL>& wanted) {
-  const std::vector<URL> sorted = [&wanted] {
-    std::vector<URL> copy = wanted;
-    std::sort(copy.begin(), copy.end());
-    return copy;
-  }();
-  std::vector<URL> found;
-  for (const URL& url : all) {
-    if (std::binary_search(sorted.begin(), sorted.end(), url)) found.push_back(url);
-  }
-  return found;
-}
-
-}  // namespace
 
 DocumentListController::DocumentListController(std::optional<URL> presentedURL, bool allContainers)
     : presentedURL_(std::move(presentedURL)), allContainers_(allContainers) {}
@@ -33,7 +15,7 @@ DocumentListController::~DocumentListController() = default;
 DocumentListControllerRef DocumentListController::self() { return sharedSelf(this); }
 
 void DocumentListController::setSelectedItems(const std::vector<URL>& items) {
-  std::vector<URL> selected = thoseAmong(containedItems_, items);
+  std::vector<URL> selected = containedItems_.thoseOf(items);
   if (selected == selectedItems_) return;
   selectedItems_ = std::move(selected);
   listChanged_.emit(*this, DocumentListChange::Selection);
@@ -83,9 +65,9 @@ std::shared_ptr<void> DocumentListController::attachment(const std::string& key)
   return found == attachments_.end() ? nullptr : found->second;
 }
 
-void DocumentListController::itemsLoaded(std::vector<URL> items) {
+void DocumentListController::itemsLoaded(URLList items) {
   containedItems_ = std::move(items);
-  selectedItems_ = thoseAmong(containedItems_, selectedItems_);
+  selectedItems_ = containedItems_.thoseOf(selectedItems_);
   listChanged_.emit(*this, DocumentListChange::Items);
   if (const auto told = delegate()) told->documentListControllerItemsChanged(self());
 }

@@ -9,6 +9,7 @@
 #include <vector>
 
 #include "platform/ui/document_list_controller_delegate.h"
+#include "platform/ui/url_list.h"
 
 namespace vaelo {
 
@@ -31,7 +32,7 @@ class DocumentListController : public ViewController {
   const std::optional<URL>& presentedURL() const { return presentedURL_; }
   bool showsAllContainers() const { return allContainers_; }
   /// In the order in which they are shown.
-  const std::vector<URL>& containedItems() const { return containedItems_; }
+  const URLList& containedItems() const { return containedItems_; }
   const std::vector<URL>& selectedItems() const { return selectedItems_; }
   /// Selects those that the list contains, in the list's order, and reports itemsChanged if that changes the selection.
   void setSelectedItems(const std::vector<URL>& items);
@@ -60,7 +61,7 @@ class DocumentListController : public ViewController {
 
   // For the host.
   /// The folder's items are these now; selected ones that are gone are no longer selected. Always reports itemsChanged.
-  void itemsLoaded(std::vector<URL> items);
+  void itemsLoaded(URLList items);
   /// The folder moved or was renamed.
   void folderMoved(const URL& url);
   void folderWasRemoved();
@@ -80,7 +81,7 @@ class DocumentListController : public ViewController {
   bool allContainers_;
   bool editing_ = false;
   unsigned availableActions_ = 0;
-  std::vector<URL> containedItems_;
+  URLList containedItems_;
   std::vector<URL> selectedItems_;
   std::weak_ptr<DocumentListControllerDelegate> delegate_;
   std::map<std::string, std::shared_ptr<void>> attachments_;

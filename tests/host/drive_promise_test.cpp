@@ -145,26 +145,26 @@ TEST_F(DrivePromiseTest, ARealFileGoesBeforeItsPromise) {
 
 TEST_F(DrivePromiseTest, TagsAndSharesAreReadFromItemAndPromise) {
   write(drive + "/file");
-  EXPECT_TRUE(tagNamesOf(drive + "/file").empty());
-  EXPECT_EQ(sharedItemRoleOf(drive + "/file"), std::nullopt);
+  EXPECT_TRUE(tagNamesAt(drive + "/file").empty());
+  EXPECT_EQ(sharedItemRoleAt(drive + "/file"), std::nullopt);
   setAttribute(drive + "/file", "user.xdg.tags", "Red, Work ,,Red,\xff,Blue");
   setAttribute(drive + "/file", "user.vaelo.share", "owner");
-  EXPECT_EQ(tagNamesOf(drive + "/file"), (std::vector<std::string>{"Red", "Work", "Blue"}));
-  EXPECT_EQ(sharedItemRoleOf(drive + "/file"), "owner");
+  EXPECT_EQ(tagNamesAt(drive + "/file"), (std::vector<std::string>{"Red", "Work", "Blue"}));
+  EXPECT_EQ(sharedItemRoleAt(drive + "/file"), "owner");
   setAttribute(drive + "/file", "user.vaelo.share", "boss");
-  EXPECT_EQ(sharedItemRoleOf(drive + "/file"), std::nullopt);
+  EXPECT_EQ(sharedItemRoleAt(drive + "/file"), std::nullopt);
   PromiseInfo info = named("away");
   info.tags = {"Green"};
   info.share = "participant";
   ASSERT_FALSE(writePromise(drive, info));
-  EXPECT_EQ(tagNamesOf(drive + "/away"), (std::vector<std::string>{"Green"}));
-  EXPECT_EQ(sharedItemRoleOf(drive + "/away"), "participant");
+  EXPECT_EQ(tagNamesAt(promisePathFor(drive + "/away")), (std::vector<std::string>{"Green"}));
+  EXPECT_EQ(sharedItemRoleAt(promisePathFor(drive + "/away")), "participant");
 }
 
 TEST_F(DrivePromiseTest, LongTagListsAreReadWhole) {
   write(drive + "/file");
   setAttribute(drive + "/file", "user.xdg.tags", std::string(600, 'a') + "," + std::string(600, 'b'));
-  EXPECT_EQ(tagNamesOf(drive + "/file").size(), 2u);
+  EXPECT_EQ(tagNamesAt(drive + "/file").size(), 2u);
 }
 
 TEST_F(DrivePromiseTest, PackagesAreKnownByTheirExtension) {
