@@ -27,8 +27,8 @@ class AppDelegate : public ApplicationDelegate, public std::enable_shared_from_t
   /// False when a shortcut launched the application: it has been acted on already.
   bool applicationWillFinishLaunchingWithOptions(const LaunchOptions& options) override;
   bool applicationDidFinishLaunchingWithOptions(const LaunchOptions& options) override;
-  /// Follows a link "vaelodriveapp:/path?mode=preview|details|info". The path, names and values are percent-decoded twice, so
-  /// a literal percent sign is written %2525; the host is not looked at. False when the link can't be followed.
+  /// Follows a link "vaelodriveapp:/path?mode=preview|details|info". The path, names and values are percent-decoded twice,
+  /// so a literal percent sign is written %2525; the host is not looked at. False when the link can't be followed.
   bool applicationOpenURLOptions(const std::string& url, const Dictionary& options) override;
   void applicationWillResignActive() override;
   /// State is only saved, and only restored, while an account is signed in.

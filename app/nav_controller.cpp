@@ -24,8 +24,8 @@ void NavController::viewDidLoad() {
   observeNotifications();
   setupInitialViewController();
   NavigationController::viewDidLoad();
-  observations_.push_back(Platform::current().notifications.addObserver(
-      OfferChangedNotification, [weak = weakSelf(this)](const Notification&) {
+  observations_.push_back(
+      Platform::current().notifications.addObserver(OfferChangedNotification, [weak = weakSelf(this)](const Notification&) {
         if (const auto self = weak.lock()) self->offerChangedNotification();
       }));
   OfferManager& offers = Platform::current().offers;

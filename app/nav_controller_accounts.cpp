@@ -13,7 +13,9 @@ constexpr const char* TokenKey = "com.marrow.VaeloDriveApp.UbiquityIdentityToken
 
 }  // namespace
 
-bool NavController::checkVaeloState() const { return Platform::current().cloudDocuments.ubiquityIdentityToken().has_value(); }
+bool NavController::checkVaeloState() const {
+  return Platform::current().cloudDocuments.ubiquityIdentityToken().has_value();
+}
 
 void NavController::didBecomeActiveNotification(const Notification& notification) {
   VLO_INFO("Got %{public}@ (nav)", notification.name);

@@ -25,9 +25,7 @@ Error noSuchFile(const URL& url) {
   return error;
 }
 
-bool isInMirror(const std::optional<URL>& url) {
-  return url && Platform::current().cloudDocuments.URLIsInDriveMirror(*url);
-}
+bool isInMirror(const std::optional<URL>& url) { return url && Platform::current().cloudDocuments.URLIsInDriveMirror(*url); }
 
 }  // namespace
 
@@ -110,8 +108,8 @@ void NavController::showPreviewPreviewMode(const std::shared_ptr<DRItem>& item, 
   manager->previewItem(item);
 }
 
-ViewControllerRef NavController::documentListControllerViewControllerForPreviewingItemAtURL(
-    const DocumentListControllerRef&, const URL& url) {
+ViewControllerRef NavController::documentListControllerViewControllerForPreviewingItemAtURL(const DocumentListControllerRef&,
+                                                                                            const URL& url) {
   VLO_USER_ACTION("DLC Action Firmpress Peek");
   VLO_DEBUG("DLC asking for PeekVC for %@", url);
   Result<ResourceMap> read = Platform::current().resourceValues.promisedItemResourceValues(

@@ -64,9 +64,9 @@ void NavController::updateStatusUI(DocumentListControllerRef list) {
   if (!editMode_) return;
   Formatting& formatting = Platform::current().formatting;
   const std::size_t selected = list->selectedItems().size();
-  list->navigationItem().setTitle(selected > 0 ? formatting.localizedCount(".DICT.ITEMS_SELECTED.%d",
-                                                                           static_cast<std::int64_t>(selected))
-                                               : formatting.localizedString("Select Items"));
+  list->navigationItem().setTitle(
+      selected > 0 ? formatting.localizedCount(".DICT.ITEMS_SELECTED.%d", static_cast<std::int64_t>(selected))
+                   : formatting.localizedString("Select Items"));
 }
 
 }  // namespace vaelo

@@ -23,8 +23,8 @@ class QuotaFetcherDelegate {
   virtual void quotaFetcherDidUpdateValue(QuotaFetcher& fetcher, std::uint64_t freeBytes) = 0;
 };
 
-/// Asks now and then how many bytes are free in the account, while the application is in front. Dropping it stops the asking.
-/// Main thread, but for performFetch and fetchUserQuotaWithCompletion, which run on the fetcher's own queue.
+/// Asks now and then how many bytes are free in the account, while the application is in front. Dropping it stops the
+/// asking. Main thread, but for performFetch and fetchUserQuotaWithCompletion, which run on the fetcher's own queue.
 class QuotaFetcher : public std::enable_shared_from_this<QuotaFetcher> {
  public:
   using Completion = std::function<void(std::int64_t freeBytes, const std::optional<Error>& error)>;

@@ -1,6 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
-// What making the record of a local document costs, beside the system calls that it can't do without: one statx, the two extended
-// attributes (sharing role, tags), and asking whether a link leads the path out of the drive.
+// What making the record of a local document costs, beside the system calls that it can't do without: one statx, the two
+// extended attributes (sharing role, tags), and asking whether a link leads the path out of the drive.
 #include <benchmark/benchmark.h>
 #include <fcntl.h>
 #include <linux/openat2.h>

@@ -68,8 +68,7 @@ void UIUtils::showItemExistsAlertMovingToDirParentViewController(const std::stri
     return;
   }
   const std::string extension = URL("/" + basename).pathExtension();
-  const std::string stem =
-      extension.empty() ? basename : basename.substr(0, basename.size() - extension.size() - 1);
+  const std::string stem = extension.empty() ? basename : basename.substr(0, basename.size() - extension.size() - 1);
   const std::string title =
       extension.empty()
           ? formatting.filled(localized("The name “%@” is already taken."), {stem})

@@ -56,9 +56,9 @@ struct UbiquityIdentityToken {
   friend bool operator==(const UbiquityIdentityToken&, const UbiquityIdentityToken&) = default;
 };
 
-/// The local mirror of the drive and what the account knows of its items. Calls may touch the disk, never the network, unless
-/// said; safe from any thread. Location tests look at the real place of an item: "..", links and look-alike prefixes don't
-/// fool them.
+/// The local mirror of the drive and what the account knows of its items. Calls may touch the disk, never the network,
+/// unless said; safe from any thread. Location tests look at the real place of an item: "..", links and look-alike prefixes
+/// don't fool them.
 class CloudDocuments {
  public:
   virtual ~CloudDocuments() = default;

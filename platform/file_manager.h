@@ -31,7 +31,8 @@ enum EnumerationOptions : unsigned {
 
 /// The file system, as it stands on the disk. Calls block and are safe from any thread.
 ///
-/// Errors are in FileErrorDomain: 4 or 260 no such file, 513 no permission, 516 exists, 640 disk full, 642 read-only, 512 other.
+/// Errors are in FileErrorDomain: 4 or 260 no such file, 513 no permission, 516 exists, 640 disk full, 642 read-only, 512
+/// other.
 class FileManager {
  public:
   virtual ~FileManager() = default;
@@ -48,7 +49,8 @@ class FileManager {
   /// exists, with DestinationFilePathErrorKey in the user information.
   virtual std::optional<Error> moveItemAtURL(const URL& source, const URL& destination) = 0;
   /// Walks the tree below `url`, parents before children; links are not followed. `visit` returns false to end the walk;
-  /// `onError` (entry, error) returns true to go on. `prefetch` is a hint. Items not downloaded come under their logical URL.
+  /// `onError` (entry, error) returns true to go on. `prefetch` is a hint. Items not downloaded come under their logical
+  /// URL.
   virtual void enumerate(const URL& url, const std::vector<ResourceKey>& prefetch, unsigned options,
                          const std::function<bool(const URL&)>& visit,
                          const std::function<bool(const URL&, const Error&)>& onError) = 0;

@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "platform/url.h"
 
-#include "platform/url_components.h"
-
 #include <algorithm>
 #include <cctype>
+
+#include "platform/url_components.h"
 
 namespace vaelo {
 
@@ -50,9 +50,11 @@ std::optional<std::string> percentDecodedBytes(std::string_view text) {
 bool isUtf8(std::string_view text) {
   for (std::size_t i = 0; i < text.size();) {
     const auto lead = static_cast<unsigned char>(text[i]);
-    const std::size_t length = lead < 0x80 ? 1 : lead >= 0xC2 && lead < 0xE0 ? 2 : (lead & 0xF0) == 0xE0 ? 3
-                               : lead >= 0xF0 && lead < 0xF5                                            ? 4
-                                                                                                        : 0;
+    const std::size_t length = lead < 0x80                   ? 1
+                               : lead >= 0xC2 && lead < 0xE0 ? 2
+                               : (lead & 0xF0) == 0xE0       ? 3
+                               : lead >= 0xF0 && lead < 0xF5 ? 4
+                                                             : 0;
     if (length == 0 || i + length > text.size()) return false;
     unsigned long code = length == 1 ? lead : lead & (0xFFu >> (length + 1));
     for (std::size_t k = 1; k < length; ++k) {
@@ -145,7 +147,8 @@ std::string percentEncoded(std::string_view text, std::string_view alsoAllowed) 
   std::string result;
   for (char c : text) {
     const auto byte = static_cast<unsigned char>(c);
-    const bool unreserved = byte < 0x80 && (std::isalnum(byte) || std::string_view("-._~").find(c) != std::string_view::npos);
+    const bool unreserved =
+        byte < 0x80 && (std::isalnum(byte) || std::string_view("-._~").find(c) != std::string_view::npos);
     if (unreserved || alsoAllowed.find(c) != std::string_view::npos) {
       result.push_back(c);
     } else {

@@ -9,7 +9,8 @@
 
 namespace vaelo {
 
-/// The place of a file or folder: an absolute path of bytes (names need not be UTF-8), with a hint whether it names a folder.
+/// The place of a file or folder: an absolute path of bytes (names need not be UTF-8), with a hint whether it names a
+/// folder.
 ///
 /// A value that is cheap to copy: copies share one object, which sameObject() can tell from an equal URL made elsewhere.
 /// Equality is that of the paths, byte for byte; the folder hint does not count. Safe to read from any thread.

@@ -13,15 +13,14 @@ namespace {
 /// Characters that RFC 3986 allows somewhere in a URL; anything else makes the text no URL at all.
 bool mayStandInURL(char c) {
   const auto byte = static_cast<unsigned char>(c);
-  return byte < 0x80 && (std::isalnum(byte) ||
-                         std::string_view("-._~:/?#[]@!$&'()*+,;=%").find(c) != std::string_view::npos);
+  return byte < 0x80 &&
+         (std::isalnum(byte) || std::string_view("-._~:/?#[]@!$&'()*+,;=%").find(c) != std::string_view::npos);
 }
 
 bool isScheme(std::string_view text) {
   return !text.empty() && std::isalpha(static_cast<unsigned char>(text.front())) &&
-         std::all_of(text.begin(), text.end(), [](char c) {
-           return std::isalnum(static_cast<unsigned char>(c)) || c == '+' || c == '-' || c == '.';
-         });
+         std::all_of(text.begin(), text.end(),
+                     [](char c) { return std::isalnum(static_cast<unsigned char>(c)) || c == '+' || c == '-' || c == '.'; });
 }
 
 bool parseQuery(std::string_view query, std::vector<URLComponents::QueryItem>& items) {

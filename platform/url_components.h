@@ -20,7 +20,8 @@ struct URLComponents {
   std::string path;
   std::vector<QueryItem> queryItems;
 
-  /// Nothing when the text has characters that no URL may hold, broken percent-encoding, or encodes bytes that are not UTF-8.
+  /// Nothing when the text has characters that no URL may hold, broken percent-encoding, or encodes bytes that are not
+  /// UTF-8.
   static std::optional<URLComponents> parse(std::string_view text);
 };
 

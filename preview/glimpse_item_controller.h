@@ -11,7 +11,9 @@ namespace vaelo {
 class PreviewItemManager;
 
 /// The one screen that shows a document's content: each PreviewItemManager points it at its own document. Main thread.
-class GlimpseItemController : public PreviewController, public PreviewControllerDataSource, public PreviewControllerDelegate {
+class GlimpseItemController : public PreviewController,
+                              public PreviewControllerDataSource,
+                              public PreviewControllerDelegate {
  public:
   /// The shared screen, made on first use; safe from any thread.
   static const std::shared_ptr<GlimpseItemController>& defaultController();

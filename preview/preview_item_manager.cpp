@@ -78,8 +78,7 @@ ViewControllerRef PreviewItemManager::prepareToPreviewItem(const std::shared_ptr
   }
   modifiedDate_ = item->contentModificationDate();
   registerAsFilePresenter();
-  const bool exists =
-      item->resolvedURL() && Platform::current().fileManager.fileExistsAtPath(item->resolvedURL()->path());
+  const bool exists = item->resolvedURL() && Platform::current().fileManager.fileExistsAtPath(item->resolvedURL()->path());
   const std::shared_ptr<GlimpseItemController> screen = createGlimpseController();
   VLO_DEBUG("Preview: Using %{public}@, %{public}@", screen->className(), exists ? "File Exists" : "File doesn't exist");
   return screen;

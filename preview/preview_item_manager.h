@@ -16,8 +16,8 @@ namespace vaelo {
 
 class GlimpseItemController;
 
-/// Owns the showing of one document: puts its screen on the stack, and follows the document while the application is in front.
-/// Main thread, but for the file-presenter callbacks, which come on fcQueue.
+/// Owns the showing of one document: puts its screen on the stack, and follows the document while the application is in
+/// front. Main thread, but for the file-presenter callbacks, which come on fcQueue.
 class PreviewItemManager : public FilePresenter, public std::enable_shared_from_this<PreviewItemManager> {
  public:
   /// `mode` 0 is the quick preview. The navigation controller is held weakly.
@@ -69,7 +69,7 @@ class PreviewItemManager : public FilePresenter, public std::enable_shared_from_
   long mode_ = 0;
   std::weak_ptr<NavigationController> navigationController_;
   std::optional<Date> modifiedDate_;
-  std::recursive_mutex lock_;          // guards the two flags
+  std::recursive_mutex lock_;  // guards the two flags
   bool filePresenterRegistered_ = false;
   bool refreshPending_ = false;
   std::vector<NotificationCenter::Token> observations_;

@@ -16,13 +16,19 @@ struct SystemLook {
 
 SystemLook lookOf(SystemItem item) {
   switch (item) {
-    case SystemItem::Cancel: return {nullptr, "Cancel"};
-    case SystemItem::Done: return {nullptr, "Done"};
-    case SystemItem::Trash: return {"user-trash-symbolic", "Delete"};
-    case SystemItem::Action: return {"emblem-shared-symbolic", "Share"};
-    case SystemItem::Organize: return {"folder-symbolic", "Move"};
+    case SystemItem::Cancel:
+      return {nullptr, "Cancel"};
+    case SystemItem::Done:
+      return {nullptr, "Done"};
+    case SystemItem::Trash:
+      return {"user-trash-symbolic", "Delete"};
+    case SystemItem::Action:
+      return {"emblem-shared-symbolic", "Share"};
+    case SystemItem::Organize:
+      return {"folder-symbolic", "Move"};
     case SystemItem::FlexibleSpace:
-    case SystemItem::FixedSpace: break;
+    case SystemItem::FixedSpace:
+      break;
   }
   return {nullptr, nullptr};
 }

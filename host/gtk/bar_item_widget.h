@@ -7,8 +7,8 @@
 
 namespace vaelo {
 
-/// Makes the widget of a bar button, which follows the item while both live. Spaces become empty boxes, a label becomes text.
-/// The caller sinks the reference. Main thread.
+/// Makes the widget of a bar button, which follows the item while both live. Spaces become empty boxes, a label becomes
+/// text. The caller sinks the reference. Main thread.
 GtkWidget* makeBarItemWidget(const BarButtonItemRef& item);
 
 }  // namespace vaelo

@@ -5,8 +5,7 @@
 
 namespace vaelo {
 
-DriveUnavailableController::DriveUnavailableController()
-    : page_(GTK_WIDGET(g_object_ref_sink(adw_status_page_new()))) {
+DriveUnavailableController::DriveUnavailableController() : page_(GTK_WIDGET(g_object_ref_sink(adw_status_page_new()))) {
   adw_status_page_set_icon_name(ADW_STATUS_PAGE(page_), "network-offline-symbolic");
   adw_status_page_set_title(ADW_STATUS_PAGE(page_), "Vaelo Drive is not available");
   adw_status_page_set_description(ADW_STATUS_PAGE(page_),

@@ -127,7 +127,8 @@ void FolderListScreen::showSearch(const std::shared_ptr<SearchController>& searc
   if (!searchBar_) {
     searchBar_ = gtk_search_bar_new();
     searchEntry_ = gtk_search_entry_new();
-    gtk_accessible_update_property(GTK_ACCESSIBLE(searchEntry_), GTK_ACCESSIBLE_PROPERTY_LABEL, "Search below this folder", -1);
+    gtk_accessible_update_property(GTK_ACCESSIBLE(searchEntry_), GTK_ACCESSIBLE_PROPERTY_LABEL, "Search below this folder",
+                                   -1);
     GtkWidget* clamp = adw_clamp_new();
     gtk_widget_set_hexpand(clamp, TRUE);
     adw_clamp_set_child(ADW_CLAMP(clamp), searchEntry_);
@@ -139,10 +140,10 @@ void FolderListScreen::showSearch(const std::shared_ptr<SearchController>& searc
     FolderViewEvents events;
     events.activated = [this](const std::string& path) { activated(*results_, path, URL(path)); };
     results_->setEvents(std::move(events));
-    g_signal_connect_swapped(searchEntry_, "search-changed",
-                             G_CALLBACK(+[](FolderListScreen* self) { self->queryTyped(); }), this);
-    g_signal_connect_swapped(searchEntry_, "stop-search",
-                             G_CALLBACK(+[](FolderListScreen* self) { self->closeSearch(); }), this);
+    g_signal_connect_swapped(searchEntry_, "search-changed", G_CALLBACK(+[](FolderListScreen* self) { self->queryTyped(); }),
+                             this);
+    g_signal_connect_swapped(searchEntry_, "stop-search", G_CALLBACK(+[](FolderListScreen* self) { self->closeSearch(); }),
+                             this);
   }
   gtk_editable_set_text(GTK_EDITABLE(searchEntry_), search->query().c_str());
   gtk_search_bar_set_search_mode(GTK_SEARCH_BAR(searchBar_), TRUE);

@@ -42,7 +42,8 @@ class Searching {
         const std::string name(reading.snapshot->name(i));
         const EntryKind kind = reading.snapshot->kind(i);
         const std::string path = folder + "/" + name;
-        if (folded(name).find(query_) != std::string::npos) add({takeString(g_filename_display_name(name.c_str())), path, kind, ""});
+        if (folded(name).find(query_) != std::string::npos)
+          add({takeString(g_filename_display_name(name.c_str())), path, kind, ""});
         if (kind == EntryKind::Folder) folders.push_back(path);
       }
       tellIfDue();
@@ -89,8 +90,9 @@ void FolderSearch::start(std::vector<std::string> folders, const std::string& qu
   stopped_ = std::make_shared<std::atomic<bool>>(false);
   Searching searching(folded(query), stopped_, std::make_shared<Found>(std::move(found)));
   // Detached, since a folder on a slow disk may keep it for long; it touches nothing of ours once it is stopped.
-  std::thread([searching = std::move(searching), folders = std::move(folders)]() mutable { searching.run(std::move(folders)); })
-      .detach();
+  std::thread([searching = std::move(searching), folders = std::move(folders)]() mutable {
+    searching.run(std::move(folders));
+  }).detach();
 }
 
 void FolderSearch::stop() {

@@ -11,8 +11,8 @@
 
 namespace vaelo {
 
-/// Looks for items by name below a folder, on a thread of its own. Names alone are read, never content; links are not followed.
-/// Main thread.
+/// Looks for items by name below a folder, on a thread of its own. Names alone are read, never content; links are not
+/// followed. Main thread.
 class FolderSearch {
  public:
   /// Called with what was found since the last call, and whether the search is over.

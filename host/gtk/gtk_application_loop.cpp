@@ -45,11 +45,20 @@ int GtkApplicationLoop::run(int argc, char** argv, std::function<std::shared_ptr
                    }),
                    this);
   static const GActionEntry entries[] = {
-      {"about", [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkApplicationLoop*>(self)->showAbout(); }, nullptr,
-       nullptr, nullptr, {0, 0, 0}},
-      {"quit", [](GSimpleAction*, GVariant*, gpointer self) {
+      {"about",
+       [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkApplicationLoop*>(self)->showAbout(); },
+       nullptr,
+       nullptr,
+       nullptr,
+       {0, 0, 0}},
+      {"quit",
+       [](GSimpleAction*, GVariant*, gpointer self) {
          g_application_quit(G_APPLICATION(static_cast<GtkApplicationLoop*>(self)->application_));
-       }, nullptr, nullptr, nullptr, {0, 0, 0}}};
+       },
+       nullptr,
+       nullptr,
+       nullptr,
+       {0, 0, 0}}};
   g_action_map_add_action_entries(G_ACTION_MAP(application_), entries, G_N_ELEMENTS(entries), this);
   const char* quitKeys[] = {"<Control>q", nullptr};
   gtk_application_set_accels_for_action(GTK_APPLICATION(application_), "app.quit", quitKeys);

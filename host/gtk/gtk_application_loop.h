@@ -15,8 +15,8 @@ namespace vaelo {
 
 class GtkScreens;
 
-/// The application loop on GApplication: one instance a session, links handed to it over D-Bus, and the window's focus told as
-/// active and inactive. Main thread.
+/// The application loop on GApplication: one instance a session, links handed to it over D-Bus, and the window's focus told
+/// as active and inactive. Main thread.
 class GtkApplicationLoop : public Application {
  public:
   GtkApplicationLoop(GtkScreens& screens, NotificationCenter& notifications, RestorationStore restoration);

@@ -14,7 +14,9 @@ class GtkDocumentInteraction : public DocumentInteractionController {
   URL url() const override { return url_; }
   std::string name() const override { return name_; }
   void setName(std::string name) override { name_ = std::move(name); }
-  void setDelegate(std::weak_ptr<DocumentInteractionControllerDelegate> delegate) override { delegate_ = std::move(delegate); }
+  void setDelegate(std::weak_ptr<DocumentInteractionControllerDelegate> delegate) override {
+    delegate_ = std::move(delegate);
+  }
   bool presentOptionsMenuFromRect(const Rect& rect, const ViewRef& view, bool animated) override;
   bool presentOptionsMenuFromBarButtonItem(const BarButtonItemRef& item, bool animated) override;
   bool openInPlaceWith(const ApplicationRecord& application) override;

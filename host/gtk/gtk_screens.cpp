@@ -70,7 +70,8 @@ Screen GtkScreens::mainScreen() {
 InterfaceOrientation GtkScreens::statusBarOrientation() {
   const auto shown = window();
   if (!shown) return InterfaceOrientation::Unknown;
-  return shown->bounds().width > shown->bounds().height ? InterfaceOrientation::LandscapeLeft : InterfaceOrientation::Portrait;
+  return shown->bounds().width > shown->bounds().height ? InterfaceOrientation::LandscapeLeft
+                                                        : InterfaceOrientation::Portrait;
 }
 
 }  // namespace vaelo

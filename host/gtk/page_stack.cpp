@@ -11,8 +11,7 @@ PageStack::PageStack() : leaflet_(ADW_LEAFLET(g_object_ref_sink(adw_leaflet_new(
   adw_leaflet_set_can_unfold(leaflet_, FALSE);
   adw_leaflet_set_can_navigate_back(leaflet_, TRUE);
   adw_leaflet_set_transition_type(leaflet_, ADW_LEAFLET_TRANSITION_TYPE_OVER);
-  g_signal_connect_swapped(leaflet_, "notify::child-transition-running",
-                           G_CALLBACK(+[](PageStack* self) {
+  g_signal_connect_swapped(leaflet_, "notify::child-transition-running", G_CALLBACK(+[](PageStack* self) {
                              if (!self->settingPages_ && !adw_leaflet_get_child_transition_running(self->leaflet_)) {
                                self->slideEnded();
                              }

@@ -56,8 +56,8 @@ class CairoContext : public DrawingContext {
     const auto* held = dynamic_cast<const GtkImageData*>(image.get());
     if (!held || !GDK_IS_TEXTURE(held->paintable())) return;
     GdkTexture* texture = GDK_TEXTURE(held->paintable());
-    cairo_surface_t* surface = cairo_image_surface_create(CAIRO_FORMAT_ARGB32, gdk_texture_get_width(texture),
-                                                          gdk_texture_get_height(texture));
+    cairo_surface_t* surface =
+        cairo_image_surface_create(CAIRO_FORMAT_ARGB32, gdk_texture_get_width(texture), gdk_texture_get_height(texture));
     gdk_texture_download(texture, cairo_image_surface_get_data(surface),
                          static_cast<gsize>(cairo_image_surface_get_stride(surface)));
     cairo_surface_mark_dirty(surface);

@@ -20,7 +20,8 @@ class PangoGraphics : public Graphics {
 /// An image as the toolkit holds it.
 class GtkImageData : public Image {
  public:
-  GtkImageData(GdkPaintable* paintable, double width, double height) : paintable_(paintable), width_(width), height_(height) {}
+  GtkImageData(GdkPaintable* paintable, double width, double height)
+      : paintable_(paintable), width_(width), height_(height) {}
   ~GtkImageData() override { g_object_unref(paintable_); }
   double width() const override { return width_; }
   double height() const override { return height_; }

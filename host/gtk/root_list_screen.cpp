@@ -8,8 +8,10 @@ namespace vaelo {
 
 void RootListScreen::fill() {
   const std::string folder = presentedURL()->path();
-  ownFolder_.start(folder, [this](const FolderChanges&) { read(); }, [this] { folderWasRemoved(); });
-  mirror_.start(URL(folder).deletingLastPathComponent().path(), [this](const FolderChanges&) { read(); }, [] {});
+  ownFolder_.start(
+      folder, [this](const FolderChanges&) { read(); }, [this] { folderWasRemoved(); });
+  mirror_.start(
+      URL(folder).deletingLastPathComponent().path(), [this](const FolderChanges&) { read(); }, [] {});
   read();
 }
 
@@ -23,7 +25,8 @@ void RootListScreen::read() {
       std::size_t i = 0;
       const auto add = [&] {
         const std::string name(reading.snapshot->name(i));
-        entries.push_back({takeString(g_filename_display_name(name.c_str())), folder + "/" + name, reading.snapshot->kind(i), ""});
+        entries.push_back(
+            {takeString(g_filename_display_name(name.c_str())), folder + "/" + name, reading.snapshot->kind(i), ""});
       };
       // Libraries stand behind the folders and before the documents.
       for (; i < count && isListedAsFolder(reading.snapshot->kind(i)); ++i) add();

@@ -19,8 +19,8 @@ class MemoryCoordinator : public FileCoordinator {
   std::optional<Error> coordinateWriting(const URL& url, unsigned options, const Accessor& accessor) override {
     return run("write " + url.path() + " " + std::to_string(options), [&] { accessor(url); });
   }
-  std::optional<Error> coordinateWriting(const URL& first, unsigned firstOptions, const URL& second,
-                                         unsigned secondOptions, const PairAccessor& accessor) override {
+  std::optional<Error> coordinateWriting(const URL& first, unsigned firstOptions, const URL& second, unsigned secondOptions,
+                                         const PairAccessor& accessor) override {
     return run("write " + first.path() + " " + std::to_string(firstOptions) + " " + second.path() + " " +
                    std::to_string(secondOptions),
                [&] { accessor(first, second); });

@@ -8,7 +8,8 @@ namespace vaelo {
 
 std::optional<std::string> MemoryTypes::preferredIdentifierForExtension(const std::string& extension) {
   std::string lower = extension;
-  std::transform(lower.begin(), lower.end(), lower.begin(), [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
+  std::transform(lower.begin(), lower.end(), lower.begin(),
+                 [](unsigned char c) { return static_cast<char>(std::tolower(c)); });
   if (lower.empty() || lower == "untyped") return std::nullopt;
   if (lower == "pdf") return "com.adobe.pdf";
   if (lower == "png") return "public.png";
@@ -66,6 +67,7 @@ MemoryPlatform::MemoryPlatform()
                 .documentStore = documentStore,
                 .fileCoordination = drive,
                 .fileManager = drive,
+                .fileProgress = fileProgress,
                 .fileProvider = fileProvider,
                 .formatting = formatting,
                 .launchServices = launchServices,
@@ -76,7 +78,8 @@ MemoryPlatform::MemoryPlatform()
                 .queues = queues,
                 .resourceValues = drive,
                 .screens = screens,
-                .types = types} {
+                .types = types,
+                .userActivities = userActivities} {
   Platform::install(&platform_);
 }
 

@@ -8,6 +8,8 @@
 #include "platform/platform.h"
 #include "platform/ui/screen_factory.h"
 #include "tests/support/memory_drive.h"
+#include "tests/support/memory_file_progress.h"
+#include "tests/support/memory_user_activities.h"
 #include "tests/support/recording_log.h"
 
 namespace vaelo {
@@ -129,6 +131,8 @@ class MemoryPlatform {
   ::testing::NiceMock<MockApplication> application;
   ::testing::NiceMock<MockTracing> tracing;
   ::testing::NiceMock<MockDocumentStore> documentStore;
+  MemoryFileProgress fileProgress;
+  MemoryUserActivities userActivities;
   ::testing::NiceMock<MockFileProvider> fileProvider;
   ::testing::NiceMock<MockLaunchServices> launchServices;
   ::testing::NiceMock<MockOffers> offers;

@@ -1,12 +1,13 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
+#include "app/app_delegate.h"
+
 #include <gmock/gmock.h>
 
-#include "app/app_delegate.h"
 #include "app/main.h"
 #include "app/settings.h"
-#include "tests/unit/app_fixture.h"
 #include "platform/archive.h"
 #include "platform/ui/search_controller.h"
+#include "tests/unit/app_fixture.h"
 
 namespace vaelo {
 namespace {
@@ -143,8 +144,8 @@ TEST_F(AppDelegateTest, ARecentDocumentIsFoundByItsAliasFirst) {
   const URL other = addFile("Plans/b.txt");
   giveDocumentID(other, 77);
   launch();
-  shortcut(RecentDocumentShortcutType, {{RecentDocumentAliasURLKey, archiveURL(document)},
-                                        {RecentDocumentDocIDKey, std::uint64_t{77}}});
+  shortcut(RecentDocumentShortcutType,
+           {{RecentDocumentAliasURLKey, archiveURL(document)}, {RecentDocumentDocIDKey, std::uint64_t{77}}});
   EXPECT_EQ(shown(), document);
   EXPECT_TRUE(logged("INFO", "Shortcut recent document: " + document.absoluteString()));
   EXPECT_TRUE(logged("INFO", "================= Firmpress: Recent Document"));
@@ -233,8 +234,8 @@ TEST_F(AppDelegateTest, AnUnknownActivityIsRefused) {
   EXPECT_TRUE(logged("INFO", "applicationWillContinueUserActivityWithType: activity type is t"));
   const Error error{FileErrorDomain, 4, {}, "no", {}};
   delegate->applicationDidFailToContinueUserActivityWithTypeError("t", error);
-  EXPECT_TRUE(logged("ERROR", "applicationDidFailToContinueUserActivityWithTypeError: activity type is t: Error " +
-                                  error.description()));
+  EXPECT_TRUE(logged(
+      "ERROR", "applicationDidFailToContinueUserActivityWithTypeError: activity type is t: Error " + error.description()));
 }
 
 TEST_F(AppDelegateTest, StateIsKeptOnlyWhileSomeoneIsSignedIn) {

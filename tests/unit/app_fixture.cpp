@@ -4,8 +4,8 @@
 #include <deque>
 #include <set>
 
-#include "tests/unit/app_world.h"
 #include "platform/archive.h"
+#include "tests/unit/app_world.h"
 
 namespace vaelo {
 
@@ -37,8 +37,8 @@ struct AppWorld : Application,
   };
 
   AppWorld()
-      : platform{*this, *this, *this, *this, *this, *this, *this, *this, *this, *this, recordedLog,
-                 notifications, *this, *this, *this, *this, *this, *this} {
+      : platform{*this, *this,       *this,         *this, *this, *this, *this, *this, *this,
+                 *this, recordedLog, notifications, *this, *this, *this, *this, *this, *this} {
     addFolder(Drive);
     Platform::install(&platform);
   }
@@ -130,9 +130,7 @@ struct AppWorld : Application,
   }
 
   // Files
-  std::unique_ptr<FileCoordinator> makeCoordinator(FilePresenter*) override {
-    return std::make_unique<Coordinator>();
-  }
+  std::unique_ptr<FileCoordinator> makeCoordinator(FilePresenter*) override { return std::make_unique<Coordinator>(); }
   void addFilePresenter(FilePresenter&) override {}
   void removeFilePresenter(FilePresenter&) override {}
   bool fileExistsAtPath(const std::string& path, bool* isDirectory) override {
@@ -199,9 +197,7 @@ struct AppWorld : Application,
     return std::to_string(bytes / (style == ByteCountStyle::Binary ? 1024 : 1000)) + (withUnit ? " KB" : "");
   }
   std::string localizedDate(Date, DateStyle, DateStyle) override { return "date"; }
-  std::string localizedString(const std::string& key) override {
-    return key;
-  }
+  std::string localizedString(const std::string& key) override { return key; }
   std::string localizedAmount(const std::string&, double number, const std::string& text) override {
     return text + " (" + std::to_string(static_cast<int>(number)) + ") available";
   }

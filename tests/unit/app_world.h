@@ -73,8 +73,8 @@ class ClockTimer : public TimerSource {
   }
 
  private:
-  static void fire(const std::shared_ptr<Clock>& clock, std::chrono::nanoseconds delay,
-                   std::chrono::nanoseconds interval, const std::weak_ptr<Block>& weak) {
+  static void fire(const std::shared_ptr<Clock>& clock, std::chrono::nanoseconds delay, std::chrono::nanoseconds interval,
+                   const std::weak_ptr<Block>& weak) {
     clock->post(delay, [weakClock = std::weak_ptr<Clock>(clock), interval, weak] {
       const auto handler = weak.lock();
       const auto alive = weakClock.lock();

@@ -134,9 +134,8 @@ TEST_F(DRItemTest, APromisedAliasIsTriedWithAWarning) {
   alias.promised = true;
   alias.values[ResourceKey::LocalizedTypeDescription] = Value("Alias");
   make(Drive + "/alias");
-  EXPECT_TRUE(platform.log.has("WARNING",
-                               "Rover Alias is promised -- unable to determine target without downloading: file://" + Drive +
-                                   "/alias"));
+  EXPECT_TRUE(platform.log.has(
+      "WARNING", "Rover Alias is promised -- unable to determine target without downloading: file://" + Drive + "/alias"));
 }
 
 TEST_F(DRItemTest, ALinkToTheRootLeavesNothing) {

@@ -29,9 +29,10 @@ TEST_F(NamesAndPlacesTest, NamesAreJudged) {
 }
 
 TEST_F(NamesAndPlacesTest, MediaAreToldByExtension) {
-  for (const char* name : {"/a.png", "/a.mov", "/a.mp3", "/a.PDF"}) EXPECT_TRUE(FileUtils::isAudioVideoImageFile(URL(name))) << name;
-  EXPECT_TRUE(platform.log.has(
-      "DEBUG", "isAudioVideoImageFile: Extension png is public.png which conforms to UTI public.image"));
+  for (const char* name : {"/a.png", "/a.mov", "/a.mp3", "/a.PDF"})
+    EXPECT_TRUE(FileUtils::isAudioVideoImageFile(URL(name))) << name;
+  EXPECT_TRUE(
+      platform.log.has("DEBUG", "isAudioVideoImageFile: Extension png is public.png which conforms to UTI public.image"));
   platform.log.clear();
   EXPECT_FALSE(FileUtils::isAudioVideoImageFile(URL("/a.txt")));
   EXPECT_TRUE(platform.log.has("DEBUG", "isAudioVideoImageFile: Extension txt is type.txt which is not."));
@@ -80,7 +81,8 @@ TEST_F(NamesAndPlacesTest, AURLSplitsIntoContainerAndNames) {
 
 TEST_F(NamesAndPlacesTest, ANameThatCannotBeReadIsThatOfThePath) {
   std::vector<std::string> names;
-  EXPECT_FALSE(FileUtils::containerAndRelativePathforURLContainerRelativePathComponents(inLibrary("gone.png"), nullptr, &names));
+  EXPECT_FALSE(
+      FileUtils::containerAndRelativePathforURLContainerRelativePathComponents(inLibrary("gone.png"), nullptr, &names));
   EXPECT_EQ(names, std::vector<std::string>{"gone.png"});
   EXPECT_NE(platform.log.lines().back().find("Can't get localizedName for URL file://"), std::string::npos);
 }
@@ -98,10 +100,14 @@ TEST_F(NamesAndPlacesTest, TheTopFolderItselfHasNoNamesAndAboveItIsAnError) {
 TEST_F(NamesAndPlacesTest, ALookupErrorIsReturnedEvenWhenTheTableKnowsTheContainer) {
   platform.drive.containerLookupError = Error{FileErrorDomain, 99, {}, {}, {}};
   CloudContainerRef container;
-  EXPECT_EQ(FileUtils::containerAndRelativePathforURLContainerRelativePathComponents(inLibrary("a"), &container, nullptr)->code, 99);
+  EXPECT_EQ(
+      FileUtils::containerAndRelativePathforURLContainerRelativePathComponents(inLibrary("a"), &container, nullptr)->code,
+      99);
   EXPECT_EQ(container, library);
   container.reset();
-  EXPECT_EQ(FileUtils::containerAndRelativePathforURLContainerRelativePathComponents(URL("/outside"), &container, nullptr)->code, 99);
+  EXPECT_EQ(
+      FileUtils::containerAndRelativePathforURLContainerRelativePathComponents(URL("/outside"), &container, nullptr)->code,
+      99);
   EXPECT_EQ(container, nullptr);
   EXPECT_NE(platform.log.lines().back().find("(VLO)[WARNING]"), std::string::npos);
 }

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <gmock/gmock.h>
 
-#include "tests/unit/app_fixture.h"
 #include "platform/archive.h"
+#include "tests/unit/app_fixture.h"
 
 namespace vaelo {
 namespace {

@@ -2,8 +2,8 @@
 #include <gmock/gmock.h>
 
 #include "app/peek_folder_view_controller.h"
-#include "tests/unit/app_fixture.h"
 #include "platform/ui/search_controller.h"
+#include "tests/unit/app_fixture.h"
 
 namespace vaelo {
 namespace {
@@ -108,8 +108,7 @@ TEST_F(NavSelectionTest, ALinkToNothingIsIgnored) {
   topList()->userSelectedItem(link);
   runMainQueue();
   EXPECT_EQ(nav->viewControllers().size(), 1u);
-  EXPECT_TRUE(
-      logged("DEBUG", "DLC Selection is symlink that didn't resolve to valid target: " + gone.absoluteString()));
+  EXPECT_TRUE(logged("DEBUG", "DLC Selection is symlink that didn't resolve to valid target: " + gone.absoluteString()));
 }
 
 TEST_F(NavSelectionTest, ALinkToALinkOutOfTheDriveIsIgnored) {

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <gmock/gmock.h>
 
-#include "tests/unit/app_fixture.h"
 #include "platform/ui/search_controller.h"
+#include "tests/unit/app_fixture.h"
 
 namespace vaelo {
 namespace {
@@ -100,8 +100,8 @@ TEST_F(NavStackTest, AChosenFolderIsPushed) {
 TEST_F(NavStackTest, AChosenFolderWithoutAListIsLogged) {
   loadNav();
   nav->documentListControllerDidSelectContainerWithViewController(topList(), nullptr);
-  nav->documentListControllerDidSelectContainerWithViewController(
-      topList(), std::make_shared<DocumentListController>(std::nullopt));
+  nav->documentListControllerDidSelectContainerWithViewController(topList(),
+                                                                  std::make_shared<DocumentListController>(std::nullopt));
   EXPECT_EQ(nav->viewControllers().size(), 1u);
   EXPECT_EQ(log().count("WARNING", "New DLC is nil"), 2u);
 }
@@ -254,8 +254,7 @@ TEST_F(NavStackTest, RestoresThePreviewOfADocumentOnly) {
   nav->decodeRestorableStateWithCoder(DictionaryRestorationCoder({{"url", folder}, {"PreviewMode", std::int64_t{1}}}));
   nav->decodeRestorableStateWithCoder(DictionaryRestorationCoder({{"url", URL("/gone")}}));
   EXPECT_EQ(nav->itemManager(), nullptr);
-  nav->decodeRestorableStateWithCoder(
-      DictionaryRestorationCoder({{"url", document}, {"PreviewMode", std::int64_t{1}}}));
+  nav->decodeRestorableStateWithCoder(DictionaryRestorationCoder({{"url", document}, {"PreviewMode", std::int64_t{1}}}));
   ASSERT_NE(nav->itemManager(), nullptr);
   EXPECT_EQ(nav->itemManager()->mode(), 1);
   EXPECT_EQ(nav->itemManager()->item()->url(), document);

@@ -52,9 +52,8 @@ TEST_F(NavStatusTest, FreeSpaceIsShownOnceItIsKnownBeItZero) {
   EXPECT_EQ(items, platform().formatting.localizedCount(".DICT.ITEMS.%d", 3));
   nav->quotaFetcherDidUpdateValue(*nav->quotaFetcher(), 0);
   EXPECT_TRUE(nav->okToShowQuota());
-  EXPECT_EQ(nav->toolbarStatusText(3),
-            platform().formatting.filled(platform().formatting.localizedString("%1$@, %2$@"),
-                                         {items, nav->quotaAvailableString()}));
+  EXPECT_EQ(nav->toolbarStatusText(3), platform().formatting.filled(platform().formatting.localizedString("%1$@, %2$@"),
+                                                                    {items, nav->quotaAvailableString()}));
 }
 
 TEST_F(NavStatusTest, FreeSpaceIsCountedIn1024s) {

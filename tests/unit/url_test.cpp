@@ -46,7 +46,8 @@ TEST(URLTest, fileURLStringsRoundTripAnyBytes) {
 }
 
 TEST(URLTest, refusesWhatIsNoLocalFile) {
-  for (const char* text : {"http:///a", "file://elsewhere/a", "file:relative", "file:///a%2", "file:///a%zz", "file:///%00", ""}) {
+  for (const char* text :
+       {"http:///a", "file://elsewhere/a", "file:relative", "file:///a%2", "file:///a%zz", "file:///%00", ""}) {
     EXPECT_EQ(URL::fromFileURLString(text), std::nullopt) << text;
   }
   EXPECT_EQ(URL::fromFileURLString("file://localhost/a"), URL("/a"));
@@ -66,7 +67,8 @@ TEST(URLComponentsTest, splitsAndDecodesOnce) {
 }
 
 TEST(URLComponentsTest, refusesWhatNoURLMayHold) {
-  for (const char* text : {"scheme:/a b", "scheme:/%zz", "scheme:/%ff", "scheme:/%00", "1x:/a", "scheme:/\xc3\xa4", "s:/?a=%2"}) {
+  for (const char* text :
+       {"scheme:/a b", "scheme:/%zz", "scheme:/%ff", "scheme:/%00", "1x:/a", "scheme:/\xc3\xa4", "s:/?a=%2"}) {
     EXPECT_FALSE(URLComponents::parse(text)) << text;
   }
 }
