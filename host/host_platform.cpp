@@ -16,6 +16,8 @@ HostPlatform::HostPlatform(const HostFolders& folders)
       documentStore_(drive_.index()),
       fileProvider_(drive_.layout(), drive_.index(), queues_),
       resourceValues_(drive_.layout(), drive_.index(), types_),
+      fileProgress_(drive_.layout()),
+      userActivities_(drive_.layout()),
       coordination_(folders.data + "/coordination.lock"),
       preferences_(folders.preferencesFile, log_) {}
 
@@ -31,6 +33,7 @@ void HostPlatform::install(Application& application, ScreenFactory& screens) {
                                .documentStore = documentStore_,
                                .fileCoordination = coordination_,
                                .fileManager = fileManager_,
+                               .fileProgress = fileProgress_,
                                .fileProvider = fileProvider_,
                                .formatting = formatting_,
                                .launchServices = launchServices_,
@@ -41,7 +44,8 @@ void HostPlatform::install(Application& application, ScreenFactory& screens) {
                                .queues = queues_,
                                .resourceValues = resourceValues_,
                                .screens = screens,
-                               .types = types_});
+                               .types = types_,
+                               .userActivities = userActivities_});
   Platform::install(platform_.get());
 }
 

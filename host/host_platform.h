@@ -5,6 +5,8 @@
 
 #include "host/desktop/gio_launch_services.h"
 #include "host/desktop/no_offers.h"
+#include "host/drive/drive_file_progress.h"
+#include "host/drive/drive_user_activities.h"
 #include "host/drive/local_cloud_documents.h"
 #include "host/drive/local_document_store.h"
 #include "host/drive/local_file_provider.h"
@@ -63,6 +65,8 @@ class HostPlatform {
   LocalDocumentStore documentStore_;
   LocalFileProvider fileProvider_;
   LocalResourceValues resourceValues_;
+  DriveFileProgress fileProgress_;
+  DriveUserActivities userActivities_;
   LocalFileCoordination coordination_;
   GioLaunchServices launchServices_;
   NoOffers offers_;

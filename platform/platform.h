@@ -6,6 +6,7 @@
 #include "platform/document_store.h"
 #include "platform/file_coordinator.h"
 #include "platform/file_manager.h"
+#include "platform/file_progress.h"
 #include "platform/file_provider.h"
 #include "platform/formatting.h"
 #include "platform/launch_services.h"
@@ -32,6 +33,7 @@ struct Platform {
   DocumentStore& documentStore;
   FileCoordination& fileCoordination;
   FileManager& fileManager;
+  FileProgress& fileProgress;
   FileProvider& fileProvider;
   Formatting& formatting;
   LaunchServices& launchServices;
@@ -43,6 +45,7 @@ struct Platform {
   ResourceValues& resourceValues;
   ScreenFactory& screens;
   TypeIdentifiers& types;
+  UserActivities& userActivities;
 
   /// The installed platform. Calling it before install() is a programming error and ends the process.
   static Platform& current();

@@ -47,11 +47,11 @@ void GtkWindowHost::addActions() {
   static const GActionEntry entries[] = {
       {"refresh", [](GSimpleAction*, GVariant*, gpointer self) {
          ScreenPage* page = static_cast<GtkWindowHost*>(self)->topPage();
-         if (page && page->hostScreen()) page->hostScreen()->refresh();
+         if (page) page->refresh();
        }, nullptr, nullptr, nullptr, {0, 0, 0}},
       {"search", [](GSimpleAction*, GVariant*, gpointer self) {
          ScreenPage* page = static_cast<GtkWindowHost*>(self)->topPage();
-         if (page && page->hostScreen()) page->hostScreen()->toggleSearch();
+         if (page) page->toggleSearch();
        }, nullptr, nullptr, nullptr, {0, 0, 0}},
       {"back", [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkWindowHost*>(self)->goBack(); }, nullptr,
        nullptr, nullptr, {0, 0, 0}},
@@ -155,7 +155,7 @@ void GtkWindowHost::goBack() {
 
 void GtkWindowHost::escape() {
   ScreenPage* page = topPage();
-  if (page && page->hostScreen() && page->hostScreen()->closeSearch()) return;
+  if (page && page->closeSearch()) return;
   goBack();
 }
 

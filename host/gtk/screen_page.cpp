@@ -3,7 +3,7 @@
 
 #include "host/gtk/bar_item_widget.h"
 #include "host/gtk/host_screen.h"
-#include "host/gtk/preview_page.h"
+#include "host/gtk/preview/preview_page.h"
 
 namespace vaelo {
 
@@ -36,7 +36,7 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
     gtk_widget_set_vexpand(content, TRUE);
     gtk_box_append(GTK_BOX(box_), content);
   } else if (const auto preview = std::dynamic_pointer_cast<PreviewController>(screen_)) {
-    preview_ = std::make_unique<PreviewPage>(preview);
+    preview_ = std::make_unique<PreviewPage>(preview, [this] { showBar(); });
     gtk_widget_set_vexpand(preview_->widget(), TRUE);
     gtk_box_append(GTK_BOX(box_), preview_->widget());
   }
@@ -54,6 +54,7 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
 }
 
 ScreenPage::~ScreenPage() {
+  preview_.reset();  // while there is a bar that it may change
   g_signal_handlers_disconnect_by_data(back_, this);
   if (hostScreen_ && gtk_widget_get_parent(hostScreen_->contentWidget()) == box_) {
     gtk_box_remove(GTK_BOX(box_), hostScreen_->contentWidget());
@@ -75,6 +76,15 @@ void ScreenPage::setNarrow(bool narrow) {
   adw_header_bar_set_decoration_layout(ADW_HEADER_BAR(header_), narrow ? ":close" : nullptr);
 }
 
+bool ScreenPage::toggleSearch() { return hostScreen_ ? hostScreen_->toggleSearch() : preview_ && preview_->toggleFind(); }
+
+bool ScreenPage::closeSearch() { return hostScreen_ ? hostScreen_->closeSearch() : preview_ && preview_->closeFind(); }
+
+void ScreenPage::refresh() {
+  if (hostScreen_) hostScreen_->refresh();
+  if (preview_) preview_->refresh();
+}
+
 void ScreenPage::showBar() {
   NavigationItem& item = screen_->navigationItem();
   adw_window_title_set_title(ADW_WINDOW_TITLE(title_), item.title().c_str());
@@ -89,6 +99,10 @@ void ScreenPage::showBar() {
   for (const BarButtonItemRef& right : item.rightBarButtonItems()) {
     barWidgets_.push_back(makeBarItemWidget(right));
     adw_header_bar_pack_end(ADW_HEADER_BAR(header_), barWidgets_.back());
+  }
+  for (GtkWidget* widget : preview_ ? preview_->headerWidgets() : std::vector<GtkWidget*>()) {
+    barWidgets_.push_back(widget);
+    adw_header_bar_pack_end(ADW_HEADER_BAR(header_), widget);
   }
 }
 

@@ -25,6 +25,11 @@ class ScreenPage {
   GtkWidget* widget() const { return box_; }
   const ViewControllerRef& screen() const { return screen_; }
   HostScreen* hostScreen() const { return hostScreen_; }
+  /// The search in the page's folder or document: opens or closes it; closes it; false when there is nothing to do.
+  bool toggleSearch();
+  bool closeSearch();
+  /// Reads what is shown anew.
+  void refresh();
   void setCanGoBack(bool can);
   void setToolbarHidden(bool hidden);
   /// On a narrow window the title needs the room of the buttons that a phone's windows don't have.

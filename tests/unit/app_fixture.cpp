@@ -5,6 +5,8 @@
 #include <set>
 
 #include "platform/archive.h"
+#include "tests/support/memory_file_progress.h"
+#include "tests/support/memory_user_activities.h"
 #include "tests/unit/app_world.h"
 
 namespace vaelo {
@@ -37,8 +39,8 @@ struct AppWorld : Application,
   };
 
   AppWorld()
-      : platform{*this, *this,       *this,         *this, *this, *this, *this, *this, *this,
-                 *this, recordedLog, notifications, *this, *this, *this, *this, *this, *this} {
+      : platform{*this, *this, *this,       *this,         *this, *this, *this, fileProgress, *this, *this,
+                 *this, recordedLog, notifications, *this, *this, *this, *this, *this, *this, userActivities} {
     addFolder(Drive);
     Platform::install(&platform);
   }
@@ -306,6 +308,8 @@ struct AppWorld : Application,
   bool offerIsBeingFetched = false;
   Result<std::int64_t> quota{std::int64_t{4096}};
   int quotaFetches = 0;
+  MemoryFileProgress fileProgress;
+  MemoryUserActivities userActivities;
   bool noRootList = false;
   bool noUnavailableScreen = false;
   bool noHierarchies = false;

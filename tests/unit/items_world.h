@@ -11,6 +11,8 @@
 
 #include "platform/platform.h"
 #include "platform/ui/screen_factory.h"
+#include "tests/support/memory_file_progress.h"
+#include "tests/support/memory_user_activities.h"
 #include "tests/support/recording_log.h"
 
 namespace vaelo {
@@ -262,6 +264,8 @@ class ItemsWorld : public Application,
   Result<ResourceMap> valuesOf(const URL& url, const std::vector<ResourceKey>& keys, bool promised);
 
   NotificationCenter notifications_;
+  MemoryFileProgress fileProgress;
+  MemoryUserActivities userActivities;
   Platform platform_;
 };
 

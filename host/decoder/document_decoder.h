@@ -1,0 +1,17 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include "host/decoder/decoder.h"
+
+namespace vaelo {
+
+class DocumentDecoder : public Decoder {
+ public:
+  explicit DocumentDecoder(UniqueFd document);
+  DecoderMessage answer(const std::string& request) override;
+
+ private:
+  UniqueFd document_;
+};
+
+}  // namespace vaelo

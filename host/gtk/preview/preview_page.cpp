@@ -1,0 +1,160 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/gtk/preview/preview_page.h"
+
+#include "host/gtk/bar_item_widget.h"
+
+namespace vaelo {
+
+namespace {
+
+constexpr guint LoadingNoticeAfter = 200;  // milliseconds; what is quicker needs no notice
+
+constexpr const char* QueriedAttributes = G_FILE_ATTRIBUTE_STANDARD_TYPE "," G_FILE_ATTRIBUTE_STANDARD_CONTENT_TYPE;
+
+}  // namespace
+
+PreviewPage::PreviewPage(std::shared_ptr<PreviewController> controller, std::function<void()> headerChanged)
+    : controller_(std::move(controller)),
+      headerChanged_(std::move(headerChanged)),
+      stack_(GTK_WIDGET(g_object_ref_sink(gtk_stack_new()))),
+      loading_(adw_status_page_new()),
+      spinner_(gtk_spinner_new()) {
+  gtk_widget_set_size_request(spinner_, 48, 48);
+  gtk_widget_set_halign(spinner_, GTK_ALIGN_CENTER);
+  gtk_accessible_update_property(GTK_ACCESSIBLE(spinner_), GTK_ACCESSIBLE_PROPERTY_LABEL, "Loading", -1);
+  adw_status_page_set_child(ADW_STATUS_PAGE(loading_), spinner_);
+  // Empty until the document, or a notice that it takes long, is there to be shown.
+  gtk_stack_add_named(GTK_STACK(stack_), gtk_box_new(GTK_ORIENTATION_VERTICAL, 0), "empty");
+  gtk_stack_add_named(GTK_STACK(stack_), loading_, "loading");
+  gtk_stack_add_named(GTK_STACK(stack_), facts_.widget(), "facts");
+  token_ = controller_->previewChanged().connect([this](PreviewController&, PreviewChange change) { changed(change); });
+  load();
+}
+
+PreviewPage::~PreviewPage() {
+  stopLoading();
+  dropView();
+  g_object_unref(stack_);
+}
+
+std::optional<URL> PreviewPage::item() const {
+  if (controller_->itemCount() == 0) return std::nullopt;
+  return controller_->itemAtIndex(0);
+}
+
+std::vector<GtkWidget*> PreviewPage::headerWidgets() const {
+  std::vector<GtkWidget*> widgets;
+  for (const BarButtonItemRef& item : controller_->additionalRightBarButtonItems()) widgets.push_back(makeBarItemWidget(item));
+  if (view_ && gtk_stack_get_visible_child(GTK_STACK(stack_)) == view_->widget()) {
+    for (GtkWidget* widget : view_->headerWidgets()) widgets.push_back(widget);
+  }
+  return widgets;
+}
+
+void PreviewPage::changed(PreviewChange change) {
+  switch (change) {
+    case PreviewChange::AllItems: return load();
+    case PreviewChange::CurrentItem: return refresh();
+    case PreviewChange::BarButtonItems: return headerChanged_();
+  }
+}
+
+// The same kind of document is read anew in its place, so that the user keeps the place too.
+void PreviewPage::refresh() {
+  const std::optional<URL> shown = item();
+  const bool same = view_ && shown && gtk_stack_get_visible_child(GTK_STACK(stack_)) == view_->widget();
+  same ? view_->refresh() : load();
+}
+
+void PreviewPage::dropView() {
+  if (!view_) return;
+  gtk_stack_remove(GTK_STACK(stack_), view_->widget());
+  view_.reset();
+  headerChanged_();
+}
+
+void PreviewPage::stopLoading() {
+  if (reading_) g_cancellable_cancel(reading_.get());
+  reading_.reset();
+  g_clear_handle_id(&loadingTimer_, g_source_remove);
+  gtk_spinner_stop(GTK_SPINNER(spinner_));
+}
+
+void PreviewPage::load() {
+  stopLoading();
+  dropView();
+  const std::optional<URL> shown = item();
+  if (!shown) {
+    facts_.showNothing();
+    gtk_stack_set_visible_child(GTK_STACK(stack_), facts_.widget());
+    return;
+  }
+  if (!FactsPage::isDownloaded(*shown)) return showFacts("");
+  showLoadingSoon();
+  reading_.reset(g_cancellable_new());
+  const GRef<GFile> file(g_file_new_for_path(shown->path().c_str()));
+  g_file_query_info_async(file.get(), QueriedAttributes, G_FILE_QUERY_INFO_NONE, G_PRIORITY_DEFAULT, reading_.get(),
+                          +[](GObject* source, GAsyncResult* result, gpointer self) {
+    GError* error = nullptr;
+    const GRef<GFileInfo> info(g_file_query_info_finish(G_FILE(source), result, &error));
+    const GErrorPtr owned(error);
+    // A cancelled one belongs to a page that may be gone.
+    if (!g_error_matches(error, G_IO_ERROR, G_IO_ERROR_CANCELLED)) static_cast<PreviewPage*>(self)->infoRead(info.get());
+  }, this);
+}
+
+void PreviewPage::infoRead(GFileInfo* info) {
+  reading_.reset();
+  if (!info) return showFacts("This document is no longer there.");
+  const char* type = g_file_info_get_content_type(info);
+  const bool isFile = g_file_info_get_file_type(info) == G_FILE_TYPE_REGULAR;
+  isFile && type && hasDocumentView(type) ? makeView(type) : showFacts("");
+}
+
+void PreviewPage::makeView(const std::string& contentType) {
+  const std::optional<URL> shown = item();
+  if (!shown) return;
+  DocumentViewEvents events;
+  events.shown = [this] { showView(); };
+  events.failed = [this](const std::string& sentence) { showFacts(sentence); };
+  events.progress = [this](const std::string& sentence) {
+    adw_status_page_set_description(ADW_STATUS_PAGE(loading_), sentence.c_str());
+  };
+  events.shouldSave = [this] {
+    const std::optional<URL> edited = item();
+    return edited && controller_->shouldSaveEditedItem(*edited);
+  };
+  adw_status_page_set_description(ADW_STATUS_PAGE(loading_), nullptr);
+  const PreviewedDocument document{shown->path(), shown->lastPathComponent(), contentType, controller_->canEditItem(*shown)};
+  view_ = makeDocumentView(document, std::move(events));
+  gtk_stack_add_child(GTK_STACK(stack_), view_->widget());
+}
+
+void PreviewPage::showView() {
+  stopLoading();
+  if (!view_ || gtk_stack_get_visible_child(GTK_STACK(stack_)) == view_->widget()) return;
+  gtk_stack_set_visible_child(GTK_STACK(stack_), view_->widget());
+  headerChanged_();
+}
+
+// The failed view is called back from itself here, so it goes away later.
+void PreviewPage::showFacts(const std::string& message) {
+  stopLoading();
+  if (const std::optional<URL> shown = item()) facts_.show(*shown, message);
+  gtk_stack_set_visible_child(GTK_STACK(stack_), facts_.widget());
+  headerChanged_();
+}
+
+void PreviewPage::showLoadingSoon() {
+  gtk_stack_set_visible_child_name(GTK_STACK(stack_), "empty");
+  loadingTimer_ = g_timeout_add(LoadingNoticeAfter, +[](gpointer data) -> gboolean {
+    auto* self = static_cast<PreviewPage*>(data);
+    self->loadingTimer_ = 0;
+    gtk_stack_set_visible_child(GTK_STACK(self->stack_), self->loading_);
+    adw_status_page_set_title(ADW_STATUS_PAGE(self->loading_), "Loading…");
+    gtk_spinner_start(GTK_SPINNER(self->spinner_));
+    return G_SOURCE_REMOVE;
+  }, this);
+}
+
+}  // namespace vaelo

@@ -1,0 +1,62 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <adwaita.h>
+
+#include <functional>
+#include <memory>
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "host/gtk/preview/document_view.h"
+#include "host/gtk/preview/facts_page.h"
+#include "host/support/glib_ptr.h"
+#include "platform/ui/preview_controller.h"
+
+namespace vaelo {
+
+/// The content of a preview's page: the document, or what is known of it. It follows the controller while it lives. Main
+/// thread; nothing that reads the document runs there.
+class PreviewPage {
+ public:
+  /// `headerChanged` is called when headerWidgets() would answer something else.
+  PreviewPage(std::shared_ptr<PreviewController> controller, std::function<void()> headerChanged);
+  ~PreviewPage();
+  PreviewPage(const PreviewPage&) = delete;
+  PreviewPage& operator=(const PreviewPage&) = delete;
+  GtkWidget* widget() const { return stack_; }
+
+  /// The controller's own bar buttons and the shown view's widgets, from the outer edge inwards; made anew for each call.
+  std::vector<GtkWidget*> headerWidgets() const;
+  bool toggleFind() { return view_ && view_->toggleFind(); }
+  bool closeFind() { return view_ && view_->closeFind(); }
+  /// Reads the document anew.
+  void refresh();
+
+ private:
+  void changed(PreviewChange change);
+  void load();
+  void dropView();
+  void infoRead(GFileInfo* info);
+  void makeView(const std::string& contentType);
+  void showView();
+  void showFacts(const std::string& message);
+  void showLoadingSoon();
+  void stopLoading();
+  std::optional<URL> item() const;
+
+  std::shared_ptr<PreviewController> controller_;
+  std::function<void()> headerChanged_;
+  FactsPage facts_;
+  GtkWidget* stack_;
+  GtkWidget* loading_;
+  GtkWidget* spinner_;
+  std::unique_ptr<DocumentView> view_;
+  std::string viewedType_;
+  GRef<GCancellable> reading_;
+  guint loadingTimer_ = 0;
+  std::shared_ptr<void> token_;
+};
+
+}  // namespace vaelo
