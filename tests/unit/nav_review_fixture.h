@@ -155,24 +155,28 @@ class NavReviewTest : public AppFixture {
   CloudWithReferences cloud{original.cloudDocuments};
   FollowedDocuments files{original.fileCoordination};
   PromptFileProvider provider;
-  Platform swapped{original.application,
-                   original.activityTracing,
-                   cloud,
-                   original.characterClasses,
-                   original.documentStore,
-                   files,
-                   original.fileManager,
-                   provider,
-                   original.formatting,
-                   original.launchServices,
-                   original.log,
-                   original.notifications,
-                   original.offers,
-                   original.preferences,
-                   original.queues,
-                   original.resourceValues,
-                   original.screens,
-                   original.types};
+  Platform swapped = [this] {
+    return Platform{original.application,
+                    original.activityTracing,
+                    cloud,
+                    original.characterClasses,
+                    original.documentStore,
+                    files,
+                    original.fileManager,
+                    original.fileProgress,
+                    provider,
+                    original.formatting,
+                    original.launchServices,
+                    original.log,
+                    original.notifications,
+                    original.offers,
+                    original.preferences,
+                    original.queues,
+                    original.resourceValues,
+                    original.screens,
+                    original.types,
+                    original.userActivities};
+  }();
   AnimationRecorder shown;
   WindowRef window = std::make_shared<Window>();
   std::shared_ptr<AppDelegate> delegate;
