@@ -157,7 +157,7 @@ void ViewController::finishPresented(bool animated, std::function<void()> comple
     const bool lowest = std::next(screen) == leaving.rend();
     (*screen)->view()->endEditing(true);
     (*screen)->beginAppearanceTransition(false, animated && lowest);
-    auto done = [gone = *screen, after = lowest ? std::move(completion) : std::function<void()>()] {
+    auto done = [gone = *screen, after = lowest ? std::exchange(completion, nullptr) : nullptr] {
       // It may be presented anew already.
       if (!gone->presenting_) {
         gone->view()->setWindow(nullptr);
