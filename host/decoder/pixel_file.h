@@ -7,8 +7,8 @@
 
 namespace vaelo {
 
-/// Memory that is handed to the application: zeroes at first, of a size that can't change any more. The mapping lives as long
-/// as the object, the file as long as anybody holds it.
+/// Memory that is handed to the application: zeroes at first, of a size that can't change any more. The mapping lives as
+/// long as the object, the file as long as anybody holds it.
 class PixelFile {
  public:
   explicit PixelFile(std::size_t bytes);

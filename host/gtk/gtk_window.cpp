@@ -45,24 +45,44 @@ GtkWindowHost::~GtkWindowHost() {
 
 void GtkWindowHost::addActions() {
   static const GActionEntry entries[] = {
-      {"refresh", [](GSimpleAction*, GVariant*, gpointer self) {
+      {"refresh",
+       [](GSimpleAction*, GVariant*, gpointer self) {
          ScreenPage* page = static_cast<GtkWindowHost*>(self)->topPage();
          if (page) page->refresh();
-       }, nullptr, nullptr, nullptr, {0, 0, 0}},
-      {"search", [](GSimpleAction*, GVariant*, gpointer self) {
+       },
+       nullptr,
+       nullptr,
+       nullptr,
+       {0, 0, 0}},
+      {"search",
+       [](GSimpleAction*, GVariant*, gpointer self) {
          ScreenPage* page = static_cast<GtkWindowHost*>(self)->topPage();
          if (page) page->toggleSearch();
-       }, nullptr, nullptr, nullptr, {0, 0, 0}},
-      {"back", [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkWindowHost*>(self)->goBack(); }, nullptr,
-       nullptr, nullptr, {0, 0, 0}},
-      {"escape", [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkWindowHost*>(self)->escape(); }, nullptr,
-       nullptr, nullptr, {0, 0, 0}},
+       },
+       nullptr,
+       nullptr,
+       nullptr,
+       {0, 0, 0}},
+      {"back",
+       [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkWindowHost*>(self)->goBack(); },
+       nullptr,
+       nullptr,
+       nullptr,
+       {0, 0, 0}},
+      {"escape",
+       [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkWindowHost*>(self)->escape(); },
+       nullptr,
+       nullptr,
+       nullptr,
+       {0, 0, 0}},
   };
   g_action_map_add_action_entries(G_ACTION_MAP(window_), entries, G_N_ELEMENTS(entries), this);
   GtkEventController* shortcuts = gtk_shortcut_controller_new();
   gtk_shortcut_controller_set_scope(GTK_SHORTCUT_CONTROLLER(shortcuts), GTK_SHORTCUT_SCOPE_GLOBAL);
-  constexpr const char* keys[][2] = {
-      {"F5|<Control>r", "win.refresh"}, {"<Control>f", "win.search"}, {"<Alt>Left|Back", "win.back"}, {"Escape", "win.escape"}};
+  constexpr const char* keys[][2] = {{"F5|<Control>r", "win.refresh"},
+                                     {"<Control>f", "win.search"},
+                                     {"<Alt>Left|Back", "win.back"},
+                                     {"Escape", "win.escape"}};
   for (const auto& [trigger, action] : keys) {
     gtk_shortcut_controller_add_shortcut(
         GTK_SHORTCUT_CONTROLLER(shortcuts),
@@ -104,7 +124,8 @@ void GtkWindowHost::stackChanged(const Stack&, const Stack& newStack, bool anima
   for (const ViewControllerRef& screen : newStack) {
     std::unique_ptr<ScreenPage>& page = pages_[screen.get()];
     if (!page) {
-      page = std::make_unique<ScreenPage>(screen, [this] { goBack(); }, G_MENU_MODEL(menu_));
+      page = std::make_unique<ScreenPage>(
+          screen, [this] { goBack(); }, G_MENU_MODEL(menu_));
       page->setToolbarHidden(!controller || controller->toolbarHidden());
       page->setNarrow(traitCollection().horizontalSizeClass == SizeClass::Compact);
     }
@@ -170,8 +191,8 @@ TraitCollection GtkWindowHost::traitsFor(int width, int height) const {
   traits.verticalSizeClass = height < compactBelow ? SizeClass::Compact : SizeClass::Regular;
   traits.idiom = width < compactBelow || height < compactBelow ? InterfaceIdiom::Phone : InterfaceIdiom::Slate;
   traits.displayScale = gtk_widget_get_scale_factor(GTK_WIDGET(window_));
-  traits.layoutDirection = gtk_widget_get_default_direction() == GTK_TEXT_DIR_RTL ? LayoutDirection::RightToLeft
-                                                                                  : LayoutDirection::LeftToRight;
+  traits.layoutDirection =
+      gtk_widget_get_default_direction() == GTK_TEXT_DIR_RTL ? LayoutDirection::RightToLeft : LayoutDirection::LeftToRight;
   return traits;
 }
 

@@ -9,8 +9,8 @@
 
 namespace vaelo {
 
-/// What the application and the decoder of previews send each other over a SOCK_SEQPACKET socket: a line of words, and a file
-/// for what is long (pixels, text). What comes from the decoder has seen hostile documents and is read with care.
+/// What the application and the decoder of previews send each other over a SOCK_SEQPACKET socket: a line of words, and a
+/// file for what is long (pixels, text). What comes from the decoder has seen hostile documents and is read with care.
 struct DecoderMessage {
   static constexpr std::size_t MaximumText = 64 * 1024;
 

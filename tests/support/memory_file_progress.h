@@ -19,7 +19,9 @@ class MemoryProgress : public Progress {
   std::string kind() const override { return kind_; }
   std::int64_t completedUnits() const override { return completed_; }
   std::int64_t totalUnits() const override { return total_; }
-  std::string description() const override { return "progress " + std::to_string(completed_) + "/" + std::to_string(total_); }
+  std::string description() const override {
+    return "progress " + std::to_string(completed_) + "/" + std::to_string(total_);
+  }
   std::shared_ptr<void> observe(const std::string& keyPath, std::function<void(const std::string&)> changed) override {
     auto observer = std::make_shared<Observer>(Observer{keyPath, std::move(changed)});
     observers_.emplace(observer.get(), observer);

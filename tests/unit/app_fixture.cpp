@@ -39,8 +39,8 @@ struct AppWorld : Application,
   };
 
   AppWorld()
-      : platform{*this, *this, *this,       *this,         *this, *this, *this, fileProgress, *this, *this,
-                 *this, recordedLog, notifications, *this, *this, *this, *this, *this, *this, userActivities} {
+      : platform{*this, *this,       *this,         *this, *this, *this, *this, fileProgress, *this, *this,
+                 *this, recordedLog, notifications, *this, *this, *this, *this, *this,        *this, userActivities} {
     addFolder(Drive);
     Platform::install(&platform);
   }

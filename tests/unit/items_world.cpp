@@ -107,8 +107,8 @@ ItemsWorld::ItemsWorld()
     : drive(std::make_shared<TestContainer>(DriveIdentifier, "Vaelo Drive", Drive)),
       library(std::make_shared<TestContainer>(LibraryIdentifier, "Sketchbook", LibraryDocuments)),
       containers{drive, library},
-      platform_{*this, *this, *this,       *this,          *this, *this, *this, fileProgress, *this, *this,
-                *this, recordedLog, notifications_, *this, *this, *this, *this, *this, *this, userActivities} {
+      platform_{*this, *this,       *this,          *this, *this, *this, *this, fileProgress, *this, *this,
+                *this, recordedLog, notifications_, *this, *this, *this, *this, *this,        *this, userActivities} {
   Platform::install(&platform_);
 }
 

@@ -48,8 +48,9 @@ struct DecoderProcess::State : std::enable_shared_from_this<DecoderProcess::Stat
     g_subprocess_launcher_take_stdin_fd(launcher.get(), ends[1]);
     process.reset(g_subprocess_launcher_spawn(launcher.get(), nullptr, decoderPath().c_str(), kind.c_str(), nullptr));
     if (!process || !sendDecoderMessage(socket.get(), {path, UniqueFd()})) return end(DecoderError::Crashed);
-    watch = g_unix_fd_add(socket.get(), static_cast<GIOCondition>(G_IO_IN | G_IO_HUP),
-                          +[](int, GIOCondition, gpointer self) -> gboolean { return static_cast<State*>(self)->answered(); }, this);
+    watch = g_unix_fd_add(
+        socket.get(), static_cast<GIOCondition>(G_IO_IN | G_IO_HUP),
+        +[](int, GIOCondition, gpointer self) -> gboolean { return static_cast<State*>(self)->answered(); }, this);
   }
 
   gboolean answered() {
@@ -73,12 +74,15 @@ struct DecoderProcess::State : std::enable_shared_from_this<DecoderProcess::Stat
   void startTimer() {
     g_clear_handle_id(&timer, g_source_remove);
     if (waiting.empty()) return;
-    timer = g_timeout_add(static_cast<guint>(waiting.front().limit.count()), +[](gpointer data) -> gboolean {
-      auto* self = static_cast<State*>(data);
-      self->timer = 0;
-      self->end(DecoderError::TooSlow);
-      return G_SOURCE_REMOVE;
-    }, this);
+    timer = g_timeout_add(
+        static_cast<guint>(waiting.front().limit.count()),
+        +[](gpointer data) -> gboolean {
+          auto* self = static_cast<State*>(data);
+          self->timer = 0;
+          self->end(DecoderError::TooSlow);
+          return G_SOURCE_REMOVE;
+        },
+        this);
   }
 
   void stop() {
@@ -102,11 +106,14 @@ struct DecoderProcess::State : std::enable_shared_from_this<DecoderProcess::Stat
       std::weak_ptr<State> state;
       Done done;
     };
-    g_idle_add_full(G_PRIORITY_DEFAULT, +[](gpointer data) -> gboolean {
-      const auto* pending = static_cast<Failure*>(data);
-      if (const auto state = pending->state.lock()) pending->done({state->failure, "", UniqueFd()});
-      return G_SOURCE_REMOVE;
-    }, new Failure{weak_from_this(), std::move(done)}, +[](gpointer data) { delete static_cast<Failure*>(data); });
+    g_idle_add_full(
+        G_PRIORITY_DEFAULT,
+        +[](gpointer data) -> gboolean {
+          const auto* pending = static_cast<Failure*>(data);
+          if (const auto state = pending->state.lock()) pending->done({state->failure, "", UniqueFd()});
+          return G_SOURCE_REMOVE;
+        },
+        new Failure{weak_from_this(), std::move(done)}, +[](gpointer data) { delete static_cast<Failure*>(data); });
   }
 };
 

@@ -11,8 +11,8 @@
 
 namespace vaelo {
 
-/// A process that decodes one document, so that a hostile one can neither crash nor stall nor fill the application. It starts
-/// with the object and is killed with it. Main thread; nothing blocks.
+/// A process that decodes one document, so that a hostile one can neither crash nor stall nor fill the application. It
+/// starts with the object and is killed with it. Main thread; nothing blocks.
 class DecoderProcess {
  public:
   /// What a request brought: the answer without its first word, or why there is none (a word of DecoderError).

@@ -20,13 +20,14 @@ struct PreviewedDocument {
 
 /// What a view tells its page. All on the main thread, none before the view's constructor returned.
 struct DocumentViewEvents {
-  std::function<void()> shown;                                   ///< the first screen is painted or about to be
-  std::function<void(const std::string& sentence)> failed;       ///< why it can't be shown, for a person
-  std::function<void(const std::string& sentence)> progress;     ///< what takes long, while it loads
-  std::function<bool()> shouldSave;                              ///< asked before an edit is written to the document
+  std::function<void()> shown;                                ///< the first screen is painted or about to be
+  std::function<void(const std::string& sentence)> failed;    ///< why it can't be shown, for a person
+  std::function<void(const std::string& sentence)> progress;  ///< what takes long, while it loads
+  std::function<bool()> shouldSave;                           ///< asked before an edit is written to the document
 };
 
-/// Shows the content of one document. It loads off the main loop from its construction on, and stops when it goes. Main thread.
+/// Shows the content of one document. It loads off the main loop from its construction on, and stops when it goes. Main
+/// thread.
 class DocumentView {
  public:
   virtual ~DocumentView() = default;

@@ -118,9 +118,10 @@ void FactsPage::showIcon(const URL& item) {
 void FactsPage::followDownload(const URL& item) {
   subscription_ = Platform::current().fileProgress.subscribe(item, [this](std::shared_ptr<Progress> progress) {
     if (progress->kind() != FileProgressKind) return FileProgress::Withdrawn([] {});
-    observation_ = progress->observe("fractionCompleted", [this, weak = std::weak_ptr<Progress>(progress)](const std::string&) {
-      if (const auto alive = weak.lock()) progressChanged(alive);
-    });
+    observation_ =
+        progress->observe("fractionCompleted", [this, weak = std::weak_ptr<Progress>(progress)](const std::string&) {
+          if (const auto alive = weak.lock()) progressChanged(alive);
+        });
     progressChanged(progress);
     return FileProgress::Withdrawn([this] {
       observation_.reset();
@@ -134,13 +135,13 @@ void FactsPage::progressChanged(const std::shared_ptr<Progress>& progress) {
   const std::int64_t total = progress->totalUnits();
   const double fraction = total > 0 ? static_cast<double>(progress->completedUnits()) / static_cast<double>(total) : 0;
   gtk_progress_bar_set_fraction(GTK_PROGRESS_BAR(bar_), fraction);
-  gtk_progress_bar_set_text(GTK_PROGRESS_BAR(bar_), ("Downloading… " + std::to_string(std::lround(fraction * 100)) + "%").c_str());
+  gtk_progress_bar_set_text(GTK_PROGRESS_BAR(bar_),
+                            ("Downloading… " + std::to_string(std::lround(fraction * 100)) + "%").c_str());
 }
 
 void FactsPage::openElsewhere() {
   const GRef<GFile> file(g_file_new_for_path(path_.c_str()));
-  GtkWidget* chooser =
-      gtk_app_chooser_dialog_new(GTK_WINDOW(gtk_widget_get_root(page_)), GTK_DIALOG_MODAL, file.get());
+  GtkWidget* chooser = gtk_app_chooser_dialog_new(GTK_WINDOW(gtk_widget_get_root(page_)), GTK_DIALOG_MODAL, file.get());
   g_signal_connect(chooser, "response", G_CALLBACK(applicationChosen), nullptr);
   gtk_window_present(GTK_WINDOW(chooser));
 }

@@ -11,8 +11,8 @@
 
 namespace vaelo {
 
-/// What is shown of a document that has no preview: icon, name, kind and size, why there is no preview, how far a download has
-/// come, and a button that opens the document elsewhere. Main thread.
+/// What is shown of a document that has no preview: icon, name, kind and size, why there is no preview, how far a download
+/// has come, and a button that opens the document elsewhere. Main thread.
 class FactsPage {
  public:
   FactsPage();

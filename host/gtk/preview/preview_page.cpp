@@ -44,7 +44,8 @@ std::optional<URL> PreviewPage::item() const {
 
 std::vector<GtkWidget*> PreviewPage::headerWidgets() const {
   std::vector<GtkWidget*> widgets;
-  for (const BarButtonItemRef& item : controller_->additionalRightBarButtonItems()) widgets.push_back(makeBarItemWidget(item));
+  for (const BarButtonItemRef& item : controller_->additionalRightBarButtonItems())
+    widgets.push_back(makeBarItemWidget(item));
   if (view_ && gtk_stack_get_visible_child(GTK_STACK(stack_)) == view_->widget()) {
     for (GtkWidget* widget : view_->headerWidgets()) widgets.push_back(widget);
   }
@@ -53,9 +54,12 @@ std::vector<GtkWidget*> PreviewPage::headerWidgets() const {
 
 void PreviewPage::changed(PreviewChange change) {
   switch (change) {
-    case PreviewChange::AllItems: return load();
-    case PreviewChange::CurrentItem: return refresh();
-    case PreviewChange::BarButtonItems: return headerChanged_();
+    case PreviewChange::AllItems:
+      return load();
+    case PreviewChange::CurrentItem:
+      return refresh();
+    case PreviewChange::BarButtonItems:
+      return headerChanged_();
   }
 }
 
@@ -93,14 +97,16 @@ void PreviewPage::load() {
   showLoadingSoon();
   reading_.reset(g_cancellable_new());
   const GRef<GFile> file(g_file_new_for_path(shown->path().c_str()));
-  g_file_query_info_async(file.get(), QueriedAttributes, G_FILE_QUERY_INFO_NONE, G_PRIORITY_DEFAULT, reading_.get(),
-                          +[](GObject* source, GAsyncResult* result, gpointer self) {
-    GError* error = nullptr;
-    const GRef<GFileInfo> info(g_file_query_info_finish(G_FILE(source), result, &error));
-    const GErrorPtr owned(error);
-    // A cancelled one belongs to a page that may be gone.
-    if (!g_error_matches(error, G_IO_ERROR, G_IO_ERROR_CANCELLED)) static_cast<PreviewPage*>(self)->infoRead(info.get());
-  }, this);
+  g_file_query_info_async(
+      file.get(), QueriedAttributes, G_FILE_QUERY_INFO_NONE, G_PRIORITY_DEFAULT, reading_.get(),
+      +[](GObject* source, GAsyncResult* result, gpointer self) {
+        GError* error = nullptr;
+        const GRef<GFileInfo> info(g_file_query_info_finish(G_FILE(source), result, &error));
+        const GErrorPtr owned(error);
+        // A cancelled one belongs to a page that may be gone.
+        if (!g_error_matches(error, G_IO_ERROR, G_IO_ERROR_CANCELLED)) static_cast<PreviewPage*>(self)->infoRead(info.get());
+      },
+      this);
 }
 
 void PreviewPage::infoRead(GFileInfo* info) {
@@ -108,7 +114,7 @@ void PreviewPage::infoRead(GFileInfo* info) {
   if (!info) return showFacts("This document is no longer there.");
   const char* type = g_file_info_get_content_type(info);
   const bool isFile = g_file_info_get_file_type(info) == G_FILE_TYPE_REGULAR;
-  isFile && type && hasDocumentView(type) ? makeView(type) : showFacts("");
+  isFile&& type&& hasDocumentView(type) ? makeView(type) : showFacts("");
 }
 
 void PreviewPage::makeView(const std::string& contentType) {
@@ -147,14 +153,17 @@ void PreviewPage::showFacts(const std::string& message) {
 
 void PreviewPage::showLoadingSoon() {
   gtk_stack_set_visible_child_name(GTK_STACK(stack_), "empty");
-  loadingTimer_ = g_timeout_add(LoadingNoticeAfter, +[](gpointer data) -> gboolean {
-    auto* self = static_cast<PreviewPage*>(data);
-    self->loadingTimer_ = 0;
-    gtk_stack_set_visible_child(GTK_STACK(self->stack_), self->loading_);
-    adw_status_page_set_title(ADW_STATUS_PAGE(self->loading_), "Loading…");
-    gtk_spinner_start(GTK_SPINNER(self->spinner_));
-    return G_SOURCE_REMOVE;
-  }, this);
+  loadingTimer_ = g_timeout_add(
+      LoadingNoticeAfter,
+      +[](gpointer data) -> gboolean {
+        auto* self = static_cast<PreviewPage*>(data);
+        self->loadingTimer_ = 0;
+        gtk_stack_set_visible_child(GTK_STACK(self->stack_), self->loading_);
+        adw_status_page_set_title(ADW_STATUS_PAGE(self->loading_), "Loading…");
+        gtk_spinner_start(GTK_SPINNER(self->spinner_));
+        return G_SOURCE_REMOVE;
+      },
+      this);
 }
 
 }  // namespace vaelo
