@@ -1,11 +1,16 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <functional>
 #include <optional>
 #include <string>
+#include <vector>
 
 #include "platform/error.h"
+#include "platform/ui/alert_action.h"
+#include "platform/ui/bar_button_item.h"
 #include "platform/ui/view_controller.h"
+#include "platform/url.h"
 
 namespace vaelo {
 
@@ -32,6 +37,15 @@ class UIUtils {
   static void showInvalidItemNameAlertParentViewController(const std::string& basename, const ViewControllerRef& parent);
   /// The alert for something that can't be done with this item.
   static void showUnsupportedError(const ViewControllerRef& parent);
+  /// Gets the chosen action, null when nothing was asked, and whether the user gave up.
+  using DeleteAnswer = std::function<void(const AlertActionRef& action, bool cancelled)>;
+  /// Asks whether the items may go, in a sheet over `parent` that points at the view, or without one at the button. No
+  /// items: given up at once. Items without a message: nothing is asked, and nobody answers.
+  static void showDeleteWarningAlertHasContainerViewControllerUsingViewUsingButtonCompletion(
+      const std::vector<URL>& urls, bool hasContainer, const ViewControllerRef& parent, const ViewRef& view,
+      const BarButtonItemRef& button, const DeleteAnswer& completion);
+  /// What will go, in a sentence; nothing for an item that can't be read or has no name.
+  static std::optional<std::string> messageForDeletePrompt(const std::vector<URL>& urls);
   /// One line for the error, empty for none.
   static std::string bestMessage(const std::optional<Error>& error);
   /// True on a tablet-class device.

@@ -14,7 +14,7 @@ inline constexpr const char* SearchResultActivityType = "com.marrow.search.resul
 inline constexpr const char* SearchResultIdentifierKey = "search-result-identifier";  ///< string, a document identifier
 inline constexpr const char* UserActivityDocumentURLKey = "activity-document-url";    ///< string, a bookmarkable string
 
-/// What the user is doing, offered to (or received from) another device or the search index. Main thread.
+/// What the user is doing, offered to (or received from) another device or the search index. Safe from any thread.
 class UserActivity {
  public:
   virtual ~UserActivity() = default;
@@ -26,7 +26,7 @@ class UserActivity {
   virtual void resignCurrent() = 0;
 };
 
-/// Makes activities.
+/// Makes activities. Any thread.
 class UserActivities {
  public:
   virtual ~UserActivities() = default;

@@ -4,30 +4,36 @@
 #include "items/dr_item.h"
 #include "items/vlo_log.h"
 #include "platform/platform.h"
+#include "platform/ui/shared_self.h"
 #include "preview/preview_item_manager.h"
 
 namespace vaelo {
 
-namespace {
-
-/// The screen is its own data source and delegate, which it can only say once somebody owns it.
-std::shared_ptr<GlimpseItemController> makeController() {
+// The screen is its own data source and delegate, which it can only say once somebody owns it.
+std::shared_ptr<GlimpseItemController> GlimpseItemController::make() {
   auto controller = std::make_shared<GlimpseItemController>();
   controller->setDelegate(controller);
   controller->setDataSource(controller);
+  const auto weak = weakSelf(controller.get());
+  const auto deletes = [weak](const BarButtonItemRef& sender) {
+    if (const auto self = weak.lock()) self->showWarningAndDeleteDocument(sender);
+  };
+  const auto moves = [weak](const BarButtonItemRef& sender) {
+    if (const auto self = weak.lock()) self->showMoveTarget(sender);
+  };
+  controller->setAdditionalRightBarButtonItems(
+      {BarButtonItem::system(SystemItem::Trash, deletes), BarButtonItem::system(SystemItem::Organize, moves)});
   return controller;
 }
 
-}  // namespace
-
 const std::shared_ptr<GlimpseItemController>& GlimpseItemController::defaultController() {
-  static const std::shared_ptr<GlimpseItemController> shared = makeController();
+  static const std::shared_ptr<GlimpseItemController> shared = make();
   return shared;
 }
 
 std::shared_ptr<GlimpseItemController> GlimpseItemController::initWithItemManager(
     const std::shared_ptr<PreviewItemManager>& manager) {
-  std::shared_ptr<GlimpseItemController> controller = makeController();
+  std::shared_ptr<GlimpseItemController> controller = make();
   controller->takeDocumentsOf(manager);
   return controller;
 }
@@ -52,6 +58,17 @@ bool GlimpseItemController::isVisible() const {
 void GlimpseItemController::viewWillDisappear(bool animated) {
   if (const auto manager = itemManager_.lock()) manager->viewControllerWillDisappear(shared_from_this());
   PreviewController::viewWillDisappear(animated);
+}
+
+void GlimpseItemController::showMoveTarget(const BarButtonItemRef&) {
+  VLO_USER_ACTION("Pressed Move (GL)");
+  VLO_INFO("Pressed Move");
+  if (const auto manager = itemManager_.lock()) manager->showMoveTarget(shared_from_this());
+}
+
+void GlimpseItemController::showWarningAndDeleteDocument(const BarButtonItemRef& sender) {
+  VLO_USER_ACTION("Pressed Delete (GL)");
+  if (const auto manager = itemManager_.lock()) manager->showWarningAndDeleteDocumentBarButton(shared_from_this(), sender);
 }
 
 std::size_t GlimpseItemController::numberOfPreviewItemsInPreviewController(PreviewController&) {

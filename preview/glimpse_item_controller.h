@@ -27,6 +27,12 @@ class GlimpseItemController : public PreviewController,
   /// True while the view is in a window; never loads the view to find out.
   bool isVisible() const;
   std::shared_ptr<PreviewItemManager> itemManager() const { return itemManager_.lock(); }
+  const std::optional<std::vector<URL>>& arrayOfDocuments() const { return arrayOfDocuments_; }
+  /// What a peek offers; nobody sets it, so it is empty.
+  const std::vector<BarButtonItemRef>& previewActionItems() const { return previewActionItems_; }
+
+  void showMoveTarget(const BarButtonItemRef& sender);
+  void showWarningAndDeleteDocument(const BarButtonItemRef& sender);
 
   void viewWillDisappear(bool animated) override;
   std::size_t numberOfPreviewItemsInPreviewController(PreviewController& controller) override;
@@ -38,11 +44,13 @@ class GlimpseItemController : public PreviewController,
   GlimpseItemController() = default;
 
  private:
+  static std::shared_ptr<GlimpseItemController> make();
   static bool glPreviewItemIsPDFKind(const URL& item);
   void takeDocumentsOf(const std::shared_ptr<PreviewItemManager>& manager);
 
   std::weak_ptr<PreviewItemManager> itemManager_;
   std::optional<std::vector<URL>> arrayOfDocuments_;
+  std::vector<BarButtonItemRef> previewActionItems_;
 };
 
 }  // namespace vaelo

@@ -6,14 +6,9 @@
 #include "platform/ui/screen_factory.h"
 #include "platform/ui/search_controller.h"
 #include "preview/glimpse_item_controller.h"
+#include "preview/preview_details_view_controller.h"
 
 namespace vaelo {
-
-namespace {
-
-std::string pathOf(const std::optional<URL>& url) { return url ? url->path() : std::string(); }
-
-}  // namespace
 
 PreviewItemManager::PreviewItemManager() = default;
 
@@ -22,6 +17,7 @@ std::shared_ptr<PreviewItemManager> PreviewItemManager::newItemManagerWithModeNa
   const std::shared_ptr<PreviewItemManager> manager(new PreviewItemManager());
   manager->observeActivity();
   manager->fcQueue_ = Platform::current().queues.makeOperationQueue("fcQueue", QualityOfService::Default);
+  manager->downloadQueue_ = Platform::current().queues.makeSerialQueue("downloadQueue");
   GlimpseItemController::defaultController();
   manager->navigationController_ = navigation;
   manager->mode_ = mode;
@@ -62,16 +58,17 @@ void PreviewItemManager::setItemUpdatePreview(const std::shared_ptr<DRItem>& ite
     if (const ViewControllerRef screen = prepareToPreviewItem(item)) replaceLastViewController(screen);
     return;
   }
+  storeItem(item);
+}
+
+void PreviewItemManager::storeItem(const std::shared_ptr<DRItem>& item) {
   const std::lock_guard lock(itemMutex_);
   item_ = item;
 }
 
 ViewControllerRef PreviewItemManager::prepareToPreviewItem(const std::shared_ptr<DRItem>& item) {
   if (itemURL() != (item ? item->url() : std::nullopt)) unregisterAsFilePresenter();
-  {
-    const std::lock_guard lock(itemMutex_);
-    item_ = item;
-  }
+  storeItem(item);
   if (!item || (!item->isSymlink() && !item->resolvedURL())) {
     VLO_WARNING("no preview URL, nothing to show");
     return nullptr;
@@ -79,13 +76,26 @@ ViewControllerRef PreviewItemManager::prepareToPreviewItem(const std::shared_ptr
   modifiedDate_ = item->contentModificationDate();
   registerAsFilePresenter();
   const bool exists = item->resolvedURL() && Platform::current().fileManager.fileExistsAtPath(item->resolvedURL()->path());
-  const std::shared_ptr<GlimpseItemController> screen = createGlimpseController();
+  detailsViewController_ = nullptr;
+  ViewControllerRef screen;
+  if (mode_ == 0) {
+    screen = createGlimpseController();
+  } else {
+    screen = createDetailsViewController();
+  }
   VLO_DEBUG("Preview: Using %{public}@, %{public}@", screen->className(), exists ? "File Exists" : "File doesn't exist");
   return screen;
 }
 
 std::shared_ptr<GlimpseItemController> PreviewItemManager::currentGlimpseController() {
   return GlimpseItemController::defaultController();
+}
+
+std::shared_ptr<PreviewDetailsViewController> PreviewItemManager::createDetailsViewController() {
+  detailsViewController_ = std::make_shared<PreviewDetailsViewController>();
+  detailsViewController_->setMode(mode_);
+  detailsViewController_->setItemManager(shared_from_this());
+  return detailsViewController_;
 }
 
 std::shared_ptr<GlimpseItemController> PreviewItemManager::createGlimpseController() {
@@ -96,7 +106,8 @@ std::shared_ptr<GlimpseItemController> PreviewItemManager::createGlimpseControll
 }
 
 bool PreviewItemManager::isPreviewControllerDisplayed(const ViewControllerRef& screen) const {
-  return std::dynamic_pointer_cast<GlimpseItemController>(screen) != nullptr;
+  return std::dynamic_pointer_cast<PreviewBaseViewController>(screen) ||
+         std::dynamic_pointer_cast<GlimpseItemController>(screen);
 }
 
 void PreviewItemManager::replaceLastViewController(const ViewControllerRef& screen) {
@@ -116,115 +127,8 @@ void PreviewItemManager::replaceLastViewController(const ViewControllerRef& scre
   }
 }
 
-void PreviewItemManager::viewControllerWillDisappear(const ViewControllerRef&) {}
-
-void PreviewItemManager::registerAsFilePresenter() {
-  const std::lock_guard lock(lock_);
-  if (filePresenterRegistered_) return;
-  Platform::current().fileCoordination.addFilePresenter(*this);
-  filePresenterRegistered_ = true;
-}
-
-void PreviewItemManager::unregisterAsFilePresenter() {
-  const std::lock_guard lock(lock_);
-  if (!filePresenterRegistered_) return;
-  Platform::current().fileCoordination.removeFilePresenter(*this);
-  filePresenterRegistered_ = false;
-}
-
-std::optional<URL> PreviewItemManager::presentedItemURL() {
-  const std::optional<URL> url = itemURL();
-  VLO_DEBUG("presentedItemURL %@", url);
-  return url;
-}
-
-void PreviewItemManager::presentedItemDidChange() {
-  VLO_INFO("presentedItemDidChange: %@", itemURL());
-  {
-    const std::lock_guard lock(lock_);
-    if (refreshPending_) return;
-    refreshPending_ = true;
-  }
-  const std::weak_ptr<PreviewItemManager> weakSelf = weak_from_this();
-  Platform::current().queues.main().after(std::chrono::seconds(1), [weakSelf] {
-    const auto self = weakSelf.lock();
-    if (!self) return;
-    if (const auto url = self->itemURL()) self->refreshItem(*url);
-    self->refreshPending_ = false;
-  });
-}
-
-void PreviewItemManager::refreshItem(const URL& url) {
-  const std::shared_ptr<DRItem> fresh = DRItem::initWithURL(url);
-  if (!fresh) return;
-  const std::string oldPath = pathOf(itemURL());
-  const std::string newPath = pathOf(fresh->url());
-  const bool pathChanged = oldPath != newPath;
-  if (pathChanged) {
-    VLO_ERROR("UNEXPECTED: path changed but we only got a presentedItemDidChange: %@ to %@", oldPath, newPath);
-  }
-  const std::optional<Date> date = fresh->contentModificationDate();
-  VLO_DEBUG("%@: modDate %{public}@ vs %{public}@", fresh->url(), modifiedDate_, date);
-  const bool later = modifiedDate_ && date && *modifiedDate_ < *date;
-  modifiedDate_ = date;
-  setItemUpdatePreview(fresh, pathChanged);
-  VLO_INFO("Refreshing %@", itemURL());
-  const std::shared_ptr<GlimpseItemController>& glimpse = GlimpseItemController::defaultController();
-  glimpse->setTitle(fresh->localizedName().value_or(""));
-  if (later && glimpse->isVisible()) {
-    VLO_DEBUG("GLPreviewController: refreshCurrentPreviewItem");
-    glimpse->refreshCurrentPreviewItem();
-  }
-}
-
-void PreviewItemManager::presentedItemDidMoveToURL(const URL& url) {
-  CloudDocuments& cloud = Platform::current().cloudDocuments;
-  const URL real = cloud.realPathURL(url);
-  VLO_INFO("presentedItemDidMoveToURL: %@ changed to %@", itemURL(), real);
-  if (cloud.URLIsInDriveTrash(real) || !cloud.URLIsInDriveMirror(real)) {
-    accommodatePresentedItemDeletionWithCompletionHandler([](std::optional<Error>) {});
-    return;
-  }
-  if (pathOf(itemURL()) == real.path()) {
-    VLO_WARNING("UNEXPECTED: duplicate calls to presentedItemDidMoveToURL: %@", real.path());
-    return;
-  }
-  const std::weak_ptr<PreviewItemManager> weakSelf = weak_from_this();
-  Platform::current().queues.main().async([weakSelf, real] {
-    const auto self = weakSelf.lock();
-    if (!self) return;
-    if (pathOf(self->itemURL()) == real.path()) {
-      VLO_WARNING("UNEXPECTED: duplicate calls to presentedItemDidMoveToURL: %@", real.path());
-    } else {
-      self->setItem(DRItem::initWithURL(real));
-    }
-  });
-}
-
-void PreviewItemManager::accommodatePresentedItemDeletionWithCompletionHandler(Completion completion) {
-  VLO_INFO("Accommodate deletion: %@", itemURL());
-  completion(std::nullopt);
-  unregisterAsFilePresenter();
-  const std::shared_ptr<PreviewItemManager> self = weak_from_this().lock();
-  if (!self) return;
-  Platform::current().queues.main().async([self] {
-    if (const auto navigation = self->navigationController_.lock()) navigation->popViewControllerAnimated(true);
-  });
-}
-
-void PreviewItemManager::accommodatePresentedSubitemDeletionAtURL(const URL& url, Completion completion) {
-  VLO_INFO("%@ accommodate subitem deletion at %@", itemURL(), url);
-  completion(std::nullopt);
-  unregisterAsFilePresenter();
-  const std::weak_ptr<PreviewItemManager> weakSelf = weak_from_this();
-  Platform::current().queues.main().after(std::chrono::seconds(1), [weakSelf] {
-    const auto self = weakSelf.lock();
-    if (!self) return;
-    VLO_INFO("Refreshing %@", self->itemURL());
-    const std::shared_ptr<GlimpseItemController>& glimpse = GlimpseItemController::defaultController();
-    if (glimpse->isVisible()) glimpse->refreshCurrentPreviewItem();
-    self->refreshPending_ = false;
-  });
+void PreviewItemManager::viewControllerWillDisappear(const ViewControllerRef& screen) {
+  if (screen == detailsViewController_) detailsViewController_ = nullptr;
 }
 
 bool PreviewItemManager::warpToNewURL(const URL& url) {

@@ -24,7 +24,9 @@ class CloudWithReferences : public CloudDocuments {
 
   bool isExternalDocumentReference(const URL& url) override { return bookmarks.contains(url.path()); }
   Result<URL> resolveExternalDocumentReference(const URL& url) override {
-    const URL target = bookmarks.at(url.path());
+    const auto found = bookmarks.find(url.path());
+    if (found == bookmarks.end()) return cloud_.resolveExternalDocumentReference(url);
+    const URL target = found->second;
     if (target.path() == "/") return Error{FileErrorDomain, FileErrorCode::NoSuchFile, {}, "gone", {}};
     return target;
   }
