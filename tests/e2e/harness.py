@@ -41,25 +41,30 @@ class Desktop:
         self.scratch = pathlib.Path(tempfile.mkdtemp(prefix="vaelo-e2e-"))
         self.processes = []
         self.framebuffer = self.scratch  # holds the display's picture, when asked for
-        reader, writer = os.pipe()
-        self.start(["Xvfb", "-displayfd", str(writer), "-screen", "0", f"{width}x{height}x24", "-nolisten", "tcp",
-                    *(["-fbdir", str(self.scratch)] if framebuffer else [])], {}, (writer,))
-        os.close(writer)
-        with os.fdopen(reader) as display:
-            number = display.readline().strip()
         runtime = self.scratch / "run"
         runtime.mkdir(mode=0o700)
         home = self.scratch / "home"
         home.mkdir()
         self.environment = {
             **{key: value for key, value in os.environ.items() if not key.startswith(("XDG_", "DBUS_", "WAYLAND", "AT_SPI"))},
-            "DISPLAY": f":{number}", "GDK_BACKEND": "x11", "GSK_RENDERER": "cairo", "XDG_RUNTIME_DIR": str(runtime),
-            "HOME": str(home), "GSETTINGS_BACKEND": "memory", "GTK_A11Y": "atspi", "ADW_DISABLE_PORTAL": "1",
-            "LC_ALL": "C.UTF-8", "NO_AT_BRIDGE": "0"}
+            "GSK_RENDERER": "cairo", "XDG_RUNTIME_DIR": str(runtime), "HOME": str(home), "GSETTINGS_BACKEND": "memory",
+            "GTK_A11Y": "atspi", "ADW_DISABLE_PORTAL": "1", "LC_ALL": "C.UTF-8", "NO_AT_BRIDGE": "0"}
+        self.start_display(width, height, framebuffer)
         bus = subprocess.run(["dbus-daemon", "--session", "--fork", "--print-address=1", "--print-pid=1"], check=True,
                              capture_output=True, text=True, env=self.environment).stdout.split()
         self.environment["DBUS_SESSION_BUS_ADDRESS"] = bus[0]
         self.bus_pid = int(bus[1])
+        self.start_window_manager()
+
+    def start_display(self, width, height, framebuffer):
+        reader, writer = os.pipe()
+        self.start(["Xvfb", "-displayfd", str(writer), "-screen", "0", f"{width}x{height}x24", "-nolisten", "tcp",
+                    *(["-fbdir", str(self.scratch)] if framebuffer else [])], {}, (writer,))
+        os.close(writer)
+        with os.fdopen(reader) as display:
+            self.environment.update({"DISPLAY": f":{display.readline().strip()}", "GDK_BACKEND": "x11"})
+
+    def start_window_manager(self):
         self.start(["openbox", "--sm-disable"], self.environment)
 
     def start(self, command, environment, descriptors=(), log=None):
@@ -108,8 +113,10 @@ class Accessibility:
 class App:
     """The application on a data folder of its own."""
 
+    desktop_type = Desktop
+
     def __init__(self, size=(800, 640), demo=False, prepare=None, arguments=(), screen=(1280, 800), **environment):
-        self.desktop = Desktop(*screen)
+        self.desktop = self.desktop_type(*screen)
         self.base = self.desktop.scratch / "drive"
         self.data = self.base / "data" / "vaelo-drive"
         self.drive = self.data / "mirror" / "com~marrow~Kestrel"
@@ -123,10 +130,13 @@ class App:
         if prepare:
             prepare(self)
         self.process = self.desktop.start([PROGRAM, *arguments], self.desktop.environment, log=self.log_file)
+        self.show_window(size)
+        self.accessibility = Accessibility(self.desktop)
+
+    def show_window(self, size):
         self.window = wait_for("the window", self.find_window).split()[0]
         self.desktop.tool("xdotool", "windowsize", "--sync", self.window, str(size[0]), str(size[1]))
         self.desktop.tool("xdotool", "windowmove", self.window, "0", "0")
-        self.accessibility = Accessibility(self.desktop)
 
     def find_window(self):
         if self.process.poll() is not None:

@@ -1,0 +1,70 @@
+# SPDX-License-Identifier: GPL-3.0-or-later
+"""Fingers on a drive in a real window."""
+import re
+import unittest
+
+from harness import wait_for
+from touch_display import TouchApp
+
+
+class Touch(unittest.TestCase):
+    def setUp(self):
+        self.app = TouchApp(demo=True, size=(400, 720), screen=(800, 740))
+        self.addCleanup(self.app.close)
+        self.app.wait("Documents,", "list item")
+
+    def open_many(self):
+        self.app.tap("Five thousand", "list item")
+        self.app.wait_title("Five thousand")
+        wait_for("the rows", lambda: self.first_row() == 1)
+
+    def first_row(self):
+        """The number of the uppermost row that shows whole, in the folder of 5,000."""
+        rows = [row for row in self.app.accessibility.showing() if row[0] == "list item" and row[3] >= 40]
+        return int(re.search(r"\d+", min(rows, key=lambda row: row[3])[1])[0]) if rows else None
+
+    def test_a_tap_opens_a_folder_and_the_back_button_leaves_it(self):
+        app = self.app
+        app.tap("Documents,", "list item")
+        app.wait_title("Documents")
+        app.wait("Minutes 2.txt", "list item")
+        app.tap("Back")
+        app.wait_title("Vaelo Drive")
+
+    def test_rows_and_buttons_are_large_enough_for_a_finger(self):
+        for role, name, _, _, _, height, _ in self.app.accessibility.showing():
+            if role == "list item":
+                self.assertGreaterEqual(height, 44, name)
+
+    def test_a_swipe_from_the_edge_goes_back(self):
+        app = self.app
+        app.tap("Documents,", "list item")
+        app.wait("Minutes 2.txt", "list item")
+        app.desktop.screen.drag((4, 400), (360, 400), 0.25)
+        app.wait_title("Vaelo Drive")
+        app.wait("Documents,", "list item")
+
+    def test_a_swipe_that_turns_back_stays(self):
+        app = self.app
+        app.tap("Documents,", "list item")
+        app.wait("Minutes 2.txt", "list item")
+        app.desktop.screen.drag((4, 400), (90, 400), 0.6, steps=30)
+        app.wait_title("Documents")
+        app.wait("Minutes 2.txt", "list item")
+
+    def test_a_flick_scrolls_on_after_the_finger_is_lifted(self):
+        self.open_many()
+        self.app.desktop.screen.drag((200, 600), (200, 200), 0.12)
+        rows_under_the_finger = 400 // 44
+        wait_for("the list to go on by itself", lambda: self.first_row() > 1 + rows_under_the_finger)
+
+    def test_a_slow_drag_moves_the_list_with_the_finger_and_opens_nothing(self):
+        self.open_many()
+        self.app.desktop.screen.drag((200, 500), (200, 300), 1.5, steps=30)
+        wait_for("the list to move", lambda: self.first_row() > 1)
+        self.assertLessEqual(self.first_row(), 1 + 250 // 44)
+        self.app.wait_title("Five thousand")
+
+
+if __name__ == "__main__":
+    unittest.main()
