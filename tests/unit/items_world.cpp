@@ -72,7 +72,7 @@ class WorldInteraction : public DocumentInteractionController {
   bool presentOptionsMenuFromBarButtonItem(const BarButtonItemRef&, bool) override { return false; }
   bool openInPlaceWith(const ApplicationRecord& application) override {
     world_.calls.push_back("open " + url_.path() + " with " + application.bundleIdentifier);
-    return true;
+    return world_.opensInPlace;
   }
 
  private:

@@ -3,6 +3,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdio>
 #include <map>
 #include <memory>
 #include <set>
@@ -31,10 +32,12 @@ struct TypedLog : RecordingLog {
   void write(LogType type, const std::string& line) override {
     types.push_back(type);
     RecordingLog::write(type, line);
+    if (echoes) std::fprintf(stderr, "%s\n", line.c_str());
   }
   bool wantsDebug() override { return debugIsWanted; }
   std::vector<LogType> types;
   bool debugIsWanted = true;
+  bool echoes = false;  ///< to the error stream, which outlives the program
 };
 
 /// A container whose answers a test sets.
@@ -145,6 +148,7 @@ class ItemsWorld : public Application,
   std::map<std::string, ApplicationRecord> applications;
   std::set<std::string> unpreviewable;
   bool holdsOpening = false;
+  bool opensInPlace = true;
   std::function<void()> heldOpening;
   ViewControllerRef openingPresenter;
   bool rightToLeft = false;
