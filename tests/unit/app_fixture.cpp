@@ -284,14 +284,17 @@ struct AppWorld : Application,
   std::shared_ptr<UpgradeFlowManager> makeUpgradeFlow(StorageOfferRef flowOffer) override {
     return std::make_shared<Flow>(std::move(flowOffer), flowPresenter);
   }
-  void runPreOpenAlert(const URL&, const ViewControllerRef&, std::function<void()> open) override { open(); }
+  void runPreOpenAlert(const URL&, const ViewControllerRef& presenter, std::function<void()> open) override {
+    openingPresenter = presenter;
+    open();
+  }
   FontMetrics fontMetrics(const Font& font) override { return {font.pointSize, font.pointSize, 0, 0, font.pointSize}; }
   Size measure(const std::string& text, const Font& font, double, int) override {
     return {static_cast<double>(text.size()) * 5, text.empty() ? 0 : font.pointSize};
   }
   ImageRef renderImage(const Size&, const std::function<void(DrawingContext&)>&) override { return nullptr; }
   ImageRef documentIcon(const std::string&, const std::optional<std::string>&, IconFormat) override { return nullptr; }
-  InterfaceIdiom userInterfaceIdiom() override { return InterfaceIdiom::Phone; }
+  InterfaceIdiom userInterfaceIdiom() override { return idiom; }
   Screen mainScreen() override { return {{0, 0, 360, 720}, 2}; }
   Rect statusBarFrame() override { return {}; }
   InterfaceOrientation statusBarOrientation() override { return InterfaceOrientation::Portrait; }
@@ -313,6 +316,8 @@ struct AppWorld : Application,
   bool noRootList = false;
   bool noUnavailableScreen = false;
   bool noHierarchies = false;
+  InterfaceIdiom idiom = InterfaceIdiom::Phone;
+  ViewControllerRef openingPresenter;
   std::set<URL> unpreviewable;
   std::set<URL> owned;
   ViewControllerRef flowPresenter;
@@ -374,6 +379,8 @@ std::shared_ptr<DocumentListController> AppFixture::topList() { return nav->getT
 void AppFixture::makeNoRootList() { world_->noRootList = true; }
 void AppFixture::makeNoUnavailableScreen() { world_->noUnavailableScreen = true; }
 void AppFixture::makeNoHierarchies() { world_->noHierarchies = true; }
+void AppFixture::makeTablet() { world_->idiom = InterfaceIdiom::Slate; }
+ViewControllerRef AppFixture::openingPresenter() { return world_->openingPresenter; }
 void AppFixture::presentSomething() { nav->presentViewController(std::make_shared<ViewController>(), false); }
 std::shared_ptr<AlertController> AppFixture::presentedAlert() {
   return std::dynamic_pointer_cast<AlertController>(nav->presentedViewController());

@@ -63,6 +63,9 @@ class AppFixture : public ::testing::Test {
   void makeNoRootList();
   void makeNoUnavailableScreen();
   void makeNoHierarchies();
+  void makeTablet();
+  /// The screen over which a document was handed to an application last.
+  ViewControllerRef openingPresenter();
   void presentSomething();
   std::shared_ptr<AlertController> presentedAlert();
   std::string statusText();
