@@ -57,20 +57,28 @@ int inNotes(const Reader& notes) {
   return 1;
 }
 
-int inJpeg(const Reader& file) {
+/// The markers before the pixels of a JPEG file.
+struct JpegHead {
+  int orientation = 1;
+  std::size_t pixels = 0;  // where they begin; 0 when they don't
+};
+
+JpegHead readJpegHead(const Reader& file) {
   constexpr std::string_view mark("Exif\0\0", 6);
+  JpegHead head;
   for (std::size_t at = 2; at + 4 <= file.size() && file.big(at, 1) == 0xFF;) {
     const std::uint32_t kind = file.big(at + 1, 1);
     if (kind == 0xFF) {  // padding
       ++at;
       continue;
     }
+    if (kind == 0xDA) head.pixels = at;
     if (kind == 0xDA || kind == 0xD9) break;
     const std::size_t length = file.big(at + 2, 2);
-    if (kind == 0xE1 && file.has(at + 4, mark)) return inNotes(file.from(at + 10, length));
+    if (kind == 0xE1 && file.has(at + 4, mark)) head.orientation = inNotes(file.from(at + 10, length));
     at += 2 + length;
   }
-  return 1;
+  return head;
 }
 
 int inPng(const Reader& file) {
@@ -97,10 +105,19 @@ int inWebp(const Reader& file) {
 
 int pictureOrientation(const unsigned char* data, std::size_t size) {
   const Reader file(data, size);
-  if (file.has(0, "\xFF\xD8\xFF")) return inJpeg(file);
+  if (file.has(0, "\xFF\xD8\xFF")) return readJpegHead(file).orientation;
   if (file.has(0, "\x89PNG\r\n\x1A\n")) return inPng(file);
   if (file.has(0, "RIFF") && file.has(8, "WEBP")) return inWebp(file);
   return 1;
+}
+
+bool isCutJpeg(const unsigned char* data, std::size_t size) {
+  const Reader file(data, size);
+  const std::size_t pixels = readJpegHead(file).pixels;
+  // What some cameras write behind the end doesn't matter.
+  std::size_t at = size;
+  while (pixels != 0 && at > pixels && !file.has(at, "\xFF\xD9")) --at;
+  return at == pixels;
 }
 
 PicturePart partBeforeTurn(int orientation, PictureSize shown, const PicturePart& part) {

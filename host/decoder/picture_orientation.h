@@ -11,6 +11,9 @@ namespace vaelo {
 /// How the camera was held, as its notes in a JPEG, PNG or WebP file say: 1 to 8, as EXIF numbers them; 1 without notes.
 int pictureOrientation(const unsigned char* file, std::size_t size);
 
+/// True when the file is a JPEG file that is cut off.
+bool isCutJpeg(const unsigned char* file, std::size_t size);
+
 /// True when it exchanges width and height.
 inline bool turnsSideways(int orientation) { return orientation >= 5; }
 /// Where the part is in a picture of the size `shown` before it is turned.

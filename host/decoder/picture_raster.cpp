@@ -14,7 +14,8 @@ namespace vaelo {
 
 namespace {
 
-constexpr gint64 MaximumPixels = 128 * 1024 * 1024;  // half a gibibyte
+constexpr gint64 MaximumPixels = 128 * 1024 * 1024;       // half a gibibyte
+constexpr gint64 MaximumPhotograph = 1024 * 1024 * 1024;  // which are decoded smaller, but not in no time
 constexpr std::size_t Chunk = 64 * 1024;
 constexpr int ShortestDelay = 20;  // milliseconds; a picture that is due sooner is a mistake of its maker
 constexpr int MissingDelay = 100;
@@ -78,7 +79,7 @@ struct PictureRaster::Loading {
     if (self->isPhotograph) {
       while (denominator < 8 && (fits(denominator * 2) || pixels(denominator) > MaximumPixels)) denominator *= 2;
     }
-    self->tooBig = pixels(denominator) > MaximumPixels;
+    self->tooBig = pixels(denominator) > MaximumPixels || pixels(1) > MaximumPhotograph;
     if (self->tooBig) {
       gdk_pixbuf_loader_set_size(loader, 0, 0);  // so that it gives up before it takes memory
     } else if (denominator > 1) {
@@ -129,6 +130,8 @@ const char* PictureRaster::load(PictureSize wanted) {
   if (const char* problem = take(loader.get())) return problem;
   stored_ = isPhotograph_ ? loading.stored : decoded();
   partial_ = comesInRows && loading.rows < decoded().height;
+  // The loader ends a photograph in grey without a word.
+  if (isPhotograph_) partial_ = partial_ || isCutJpeg(file_, bytes_);
   return nullptr;
 }
 
