@@ -16,8 +16,7 @@ HostPlatform::HostPlatform(const HostFolders& folders)
       documentStore_(drive_.index()),
       fileProvider_(drive_.layout(), drive_.index(), queues_),
       resourceValues_(drive_.layout(), drive_.index(), types_),
-      fileProgress_(drive_.layout()),
-      userActivities_(drive_.layout()),
+      userActivities_(drive_.layout(), log_, queues_),
       coordination_(folders.data + "/coordination.lock"),
       preferences_(folders.preferencesFile, log_) {}
 

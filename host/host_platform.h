@@ -51,6 +51,7 @@ class HostPlatform {
   FileCoordination& fileCoordination() { return coordination_; }
   DocumentStore& documentStore() { return documentStore_; }
   FileProvider& fileProvider() { return fileProvider_; }
+  DriveUserActivities& userActivities() { return userActivities_; }
 
  private:
   GLibLog log_;

@@ -3,15 +3,23 @@
 
 #include <unicode/uloc.h>
 
+#include "host/drive/drive_user_activities.h"
 #include "host/drive/local_cloud_documents.h"
+#include "host/gtk/continue_banner.h"
 #include "host/gtk/gtk_screens.h"
 #include "host/gtk/gtk_window.h"
 #include "host/support/glib_ptr.h"
+#include "platform/platform.h"
 
 namespace vaelo {
 
-GtkApplicationLoop::GtkApplicationLoop(GtkScreens& screens, NotificationCenter& notifications, RestorationStore restoration)
-    : screens_(screens), notifications_(notifications), restoration_(std::move(restoration)), application_(nullptr) {}
+GtkApplicationLoop::GtkApplicationLoop(GtkScreens& screens, NotificationCenter& notifications,
+                                       DriveUserActivities& activities, RestorationStore restoration)
+    : screens_(screens),
+      notifications_(notifications),
+      activities_(activities),
+      restoration_(std::move(restoration)),
+      application_(nullptr) {}
 
 GtkApplicationLoop::~GtkApplicationLoop() {
   if (application_) g_object_unref(application_);
@@ -84,11 +92,35 @@ void GtkApplicationLoop::launch() {
   if (!window) return;
   g_signal_connect_swapped(window->widget(), "notify::is-active",
                            G_CALLBACK(+[](GtkApplicationLoop* self) { self->windowFocusChanged(); }), this);
+  offerToContinue();
   rebuiltToken_ = notifications_.addObserver(DocumentIndexRebuiltNotification, [this](const Notification&) {
     if (const auto shown = screens_.window()) {
       shown->showToast("The drive’s index was damaged. It has been rebuilt, and the old one kept.");
     }
   });
+}
+
+void GtkApplicationLoop::offerToContinue() {
+  Platform& platform = Platform::current();
+  const auto nameOf = [&platform](const URL& document) {
+    const Result<ResourceMap> values =
+        platform.resourceValues.promisedItemResourceValues(document, {ResourceKey::LocalizedName});
+    const auto name = values.value ? values.value->find(ResourceKey::LocalizedName) : ResourceMap::const_iterator();
+    const std::string* text = values.value && name != values.value->end() ? name->second.get<std::string>() : nullptr;
+    return text ? *text : document.lastPathComponent();
+  };
+  continueOffer_ =
+      std::make_shared<ContinueOffer>(platform.fileProvider, platform.queues, nameOf,
+                                      [this](const std::shared_ptr<UserActivity>& activity) { continueActivity(activity); });
+  screens_.window()->setPageBanner([offer = continueOffer_] { return makeContinueBanner(offer); });
+  activities_.watchOthers([weak = std::weak_ptr(continueOffer_)](const std::optional<OfferedActivity>& offered) {
+    if (const auto offer = weak.lock()) offer->setActivity(offered);
+  });
+}
+
+void GtkApplicationLoop::continueActivity(const std::shared_ptr<UserActivity>& activity) {
+  if (!delegate_->applicationWillContinueUserActivityWithType(activity->activityType())) return;
+  delegate_->applicationContinueUserActivityRestorationHandler(activity, [] {});
 }
 
 int GtkApplicationLoop::commandLine(GApplicationCommandLine* line) {

@@ -13,13 +13,17 @@
 
 namespace vaelo {
 
+class ContinueOffer;
+class DriveUserActivities;
 class GtkScreens;
 
 /// The application loop on GApplication: one instance a session, links handed to it over D-Bus, and the window's focus told
 /// as active and inactive. Main thread.
 class GtkApplicationLoop : public Application {
  public:
-  GtkApplicationLoop(GtkScreens& screens, NotificationCenter& notifications, RestorationStore restoration);
+  /// All outlive it.
+  GtkApplicationLoop(GtkScreens& screens, NotificationCenter& notifications, DriveUserActivities& activities,
+                     RestorationStore restoration);
   ~GtkApplicationLoop() override;
   int run(int argc, char** argv, std::function<std::shared_ptr<ApplicationDelegate>()> makeDelegate) override;
   bool isRightToLeft() override { return gtk_widget_get_default_direction() == GTK_TEXT_DIR_RTL; }
@@ -31,6 +35,8 @@ class GtkApplicationLoop : public Application {
   int commandLine(GApplicationCommandLine* line);
   /// True when the application took the link.
   bool openLink(const std::string& link);
+  void offerToContinue();
+  void continueActivity(const std::shared_ptr<UserActivity>& activity);
   void windowFocusChanged();
   void restore();
   void saveState();
@@ -38,11 +44,13 @@ class GtkApplicationLoop : public Application {
 
   GtkScreens& screens_;
   NotificationCenter& notifications_;
+  DriveUserActivities& activities_;
   RestorationStore restoration_;
   AdwApplication* application_;
   std::function<std::shared_ptr<ApplicationDelegate>()> makeDelegate_;
   std::shared_ptr<ApplicationDelegate> delegate_;
   std::shared_ptr<void> rebuiltToken_;
+  std::shared_ptr<ContinueOffer> continueOffer_;
   bool active_ = false;
 };
 

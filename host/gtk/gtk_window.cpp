@@ -126,6 +126,7 @@ void GtkWindowHost::stackChanged(const Stack&, const Stack& newStack, bool anima
     if (!page) {
       page = std::make_unique<ScreenPage>(
           screen, [this] { goBack(); }, G_MENU_MODEL(menu_));
+      if (makeBanner_) page->setBanner(makeBanner_());
       page->setToolbarHidden(!controller || controller->toolbarHidden());
       page->setNarrow(traitCollection().horizontalSizeClass == SizeClass::Compact);
     }
@@ -182,6 +183,11 @@ void GtkWindowHost::escape() {
 
 void GtkWindowHost::showToast(const std::string& text) {
   adw_toast_overlay_add_toast(ADW_TOAST_OVERLAY(toasts_), adw_toast_new(text.c_str()));
+}
+
+void GtkWindowHost::setPageBanner(std::function<GtkWidget*()> make) {
+  makeBanner_ = std::move(make);
+  for (const auto& [screen, page] : pages_) page->setBanner(makeBanner_());
 }
 
 TraitCollection GtkWindowHost::traitsFor(int width, int height) const {

@@ -3,6 +3,7 @@
 
 #include <adwaita.h>
 
+#include <functional>
 #include <map>
 #include <memory>
 
@@ -24,6 +25,8 @@ class GtkWindowHost : public Window, private NavigationHost, private Presentatio
   GtkWindow* widget() const { return GTK_WINDOW(window_); }
   /// A short message at the bottom of the window.
   void showToast(const std::string& text);
+  /// Puts what `make` makes between header and content of each page, of those that are shown and those to come.
+  void setPageBanner(std::function<GtkWidget*()> make);
 
  private:
   void stackChanged(const Stack& oldStack, const Stack& newStack, bool animated, std::function<void()> done) override;
@@ -45,6 +48,7 @@ class GtkWindowHost : public Window, private NavigationHost, private Presentatio
   GtkWidget* toasts_;
   GMenu* menu_;
   PageStack stack_;
+  std::function<GtkWidget*()> makeBanner_;
   std::map<ViewController*, std::unique_ptr<ScreenPage>> pages_;
   std::map<ViewController*, GtkWindow*> dialogs_;
 };

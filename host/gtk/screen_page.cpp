@@ -76,6 +76,8 @@ void ScreenPage::setNarrow(bool narrow) {
   adw_header_bar_set_decoration_layout(ADW_HEADER_BAR(header_), narrow ? ":close" : nullptr);
 }
 
+void ScreenPage::setBanner(GtkWidget* banner) { gtk_box_insert_child_after(GTK_BOX(box_), banner, header_); }
+
 bool ScreenPage::toggleSearch() { return hostScreen_ ? hostScreen_->toggleSearch() : preview_ && preview_->toggleFind(); }
 
 bool ScreenPage::closeSearch() { return hostScreen_ ? hostScreen_->closeSearch() : preview_ && preview_->closeFind(); }

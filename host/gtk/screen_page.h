@@ -30,6 +30,8 @@ class ScreenPage {
   bool closeSearch();
   /// Reads what is shown anew.
   void refresh();
+  /// A widget between header and content; the page owns it.
+  void setBanner(GtkWidget* banner);
   void setCanGoBack(bool can);
   void setToolbarHidden(bool hidden);
   /// On a narrow window the title needs the room of the buttons that a phone's windows don't have.
