@@ -12,15 +12,12 @@
 #include "app/document_list_controller_status_bar.h"
 #include "app/nav_controller.h"
 #include "items/dr_item.h"
-#include "platform/platform.h"
 #include "platform/ui/alert_controller.h"
 #include "preview/glimpse_item_controller.h"
 #include "preview/preview_item_manager.h"
-#include "tests/support/recording_log.h"
+#include "tests/support/memory_platform.h"
 
 namespace vaelo {
-
-struct AppWorld;
 
 /// A drive in memory with somebody signed in, on a virtual clock; nav is made by loadNav.
 class AppFixture : public ::testing::Test {
@@ -32,6 +29,8 @@ class AppFixture : public ::testing::Test {
   URL addFolder(const std::string& path);
   URL addFile(const std::string& path);
   URL addLink(const std::string& path, const URL& target);
+  /// The logical URL of an item that is not downloaded.
+  URL addPromise(const std::string& path);
   URL addTrashedFile(const std::string& name);
   URL addOutsideFile(const std::string& path);
   void giveDocumentID(const URL& url, std::int64_t number);
@@ -84,11 +83,8 @@ class AppFixture : public ::testing::Test {
   Platform& platform() { return Platform::current(); }
   Preferences& preferences() { return platform().preferences; }
 
- private:
   // Before nav, which uses it until it is gone.
-  std::unique_ptr<AppWorld> world_;
-
- protected:
+  MemoryPlatform memory;
   std::shared_ptr<NavController> nav;
 };
 

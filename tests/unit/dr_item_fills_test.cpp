@@ -16,7 +16,9 @@ std::uint64_t bytes(int count) { return static_cast<std::uint64_t>(count); }
 class DRItemFillsTest : public ItemsTest {
  protected:
   std::shared_ptr<DRItem> filled(ResourceMap values) {
-    world.addFile(Item, std::move(values));
+    const bool isFolder = values.contains(K::IsDirectory) || values.contains(K::IsPackage);
+    MemoryItem& item = isFolder ? world.addFolder(Item) : world.addFile(Item);
+    item.values = std::move(values);
     return DRItem::initWithURL(Item);
   }
   /// A record of what the disk tells, since its values can't be read.
@@ -81,7 +83,7 @@ TEST_F(DRItemFillsTest, anAliasThatLeadsNowhereIsAnItemWithoutResolvedURL) {
   EXPECT_TRUE(item->isSymlink());
   EXPECT_FALSE(item->resolvedURL());
   EXPECT_FALSE(item->canPreview());
-  EXPECT_TRUE(logged("WARNING", "Error resolving Alias: " + fileError(FileErrorCode::NoSuchFile).description()));
+  EXPECT_TRUE(logged("WARNING", "Error resolving Alias: " + world.values.resolveAliasFile(Item).error->description()));
 }
 
 TEST_F(DRItemFillsTest, aPromisedAliasIsToldOfAndTriedAllTheSame) {
@@ -96,8 +98,8 @@ TEST_F(DRItemFillsTest, aPromisedAliasIsToldOfAndTriedAllTheSame) {
 TEST_F(DRItemFillsTest, theSizeIsANumberOrAbsent) {
   const auto item = filled({{K::FileSize, bytes(1500)}});
   EXPECT_EQ(item->fileSize(), bytes(1500));
-  EXPECT_EQ(item->friendlyFileSize(), "1500 file bytes");
-  EXPECT_EQ(filled({{K::FileSize, bytes(0)}})->friendlyFileSize(), "0 file bytes");
+  EXPECT_EQ(item->friendlyFileSize(), "2 KB");
+  EXPECT_EQ(filled({{K::FileSize, bytes(0)}})->friendlyFileSize(), "0 bytes");
   for (const Value& none : {Value("1500"), Value(true), Value()}) {
     const auto without = filled({{K::FileSize, none}});
     EXPECT_FALSE(without->fileSize());
@@ -132,7 +134,7 @@ TEST_F(DRItemFillsTest, aPackageWithoutSizeHasThatOfItsContents) {
   world.addFile(Item.appendingPathComponent("in/.b"), {{K::FileSize, bytes(22)}}).isPromise = true;
   const auto item = filled({{K::IsPackage, true}});
   EXPECT_EQ(item->fileSize(), bytes(42));
-  EXPECT_EQ(item->friendlyFileSize(), "42 file bytes");
+  EXPECT_EQ(item->friendlyFileSize(), "42 bytes");
 }
 
 TEST_F(DRItemFillsTest, aPackageThatHasASizeKeepsItAndAnEmptyOneHasNone) {
@@ -147,7 +149,7 @@ TEST_F(DRItemFillsTest, aPackageThatHasASizeKeepsItAndAnEmptyOneHasNone) {
 TEST_F(DRItemFillsTest, aSumGoesOnPastWhatCannotBeRead) {
   world.addFile(Item.appendingPathComponent("a"), {{K::FileSize, bytes(20)}});
   world.enumerationError = fileError(FileErrorCode::ReadNoPermission);
-  const auto item = filled({});
+  const auto item = filled({{K::IsDirectory, true}});
   EXPECT_EQ(item->sizeOfPackage(Item), bytes(20));
   EXPECT_TRUE(logged("INFO", "Error enumerating " + Item.appendingPathComponent("locked").absoluteString() + ": " +
                                  world.enumerationError->description()));
@@ -220,7 +222,7 @@ TEST_F(DRItemFillsTest, attributesOfAFile) {
   EXPECT_EQ(item->resolvedURL(), Item);
   EXPECT_EQ(item->promiseURL(), physical);
   EXPECT_EQ(item->fileSize(), bytes(7));
-  EXPECT_EQ(item->friendlyFileSize(), "7 file bytes");
+  EXPECT_EQ(item->friendlyFileSize(), "7 bytes");
   EXPECT_EQ(item->creationDate(), Noon);
   EXPECT_EQ(item->contentModificationDate(), Noon + std::chrono::hours(2));
   EXPECT_TRUE(item->hasHiddenExtension());
@@ -245,7 +247,7 @@ TEST_F(DRItemFillsTest, attributesOfALinkFollowItsStoredTarget) {
   for (const Case& link : {Case{"/elsewhere/target", "/elsewhere/target"}, Case{"up/there", "up/there"},
                            Case{"neighbour", "/drive/mirror/com~marrow~Kestrel/neighbour"},
                            Case{"folder/", "/drive/mirror/com~marrow~Kestrel/folder"}, Case{"/", "/"}}) {
-    WorldItem& linkItem = world.addFile(Item);
+    MemoryItem& linkItem = world.addFile(Item);
     linkItem.attributes.type = FileType::SymbolicLink;
     linkItem.linkTarget = link.target;
     const URL physical("/physical");

@@ -8,9 +8,7 @@
 namespace vaelo {
 namespace {
 
-using ::testing::Return;
-
-const std::string Drive = "/drive/mirror/com~marrow~Kestrel";
+const std::string DrivePath = Drive.path();
 
 class TestImage : public Image {
  public:
@@ -36,40 +34,41 @@ TEST_F(DRItemTest, ThePlainInitialiserIsForbidden) {
 TEST_F(DRItemTest, WithoutAURLOrAnItemThereIsNoRecord) {
   EXPECT_EQ(DRItem::initWithURL(std::nullopt), nullptr);
   EXPECT_TRUE(platform.log.has("ERROR", "Failed to cache values for URL (null)"));
-  EXPECT_EQ(make(Drive + "/gone"), nullptr);
-  EXPECT_TRUE(platform.log.has("ERROR", "Failed to cache values for URL file://" + Drive + "/gone"));
+  EXPECT_EQ(make(DrivePath + "/gone"), nullptr);
+  EXPECT_TRUE(platform.log.has("ERROR", "Failed to cache values for URL file://" + DrivePath + "/gone"));
 }
 
 TEST_F(DRItemTest, FieldsComeFromTheResourceValues) {
-  auto& item = platform.drive.add(Drive + "/a.txt");
+  platform.clock->origin = Date(std::chrono::seconds(1000));
+  auto& item = platform.disk.add(DrivePath + "/a.txt");
   item.values[ResourceKey::FileSize] = Value(std::uint64_t{1234});
   item.values[ResourceKey::LocalizedTypeDescription] = Value("Text");
   item.values[ResourceKey::DownloadingStatus] = Value(DownloadingStatusCurrent);
   item.values[ResourceKey::HasHiddenExtension] = Value(true);
   item.tags = {"Red", "Blue"};
-  ON_CALL(platform.screens, canPreviewItem).WillByDefault(Return(true));
-  const auto record = make(Drive + "/a.txt");
+  const auto record = make(DrivePath + "/a.txt");
   ASSERT_TRUE(record);
   EXPECT_EQ(record->localizedName(), "a.txt");
-  EXPECT_EQ(record->typeIdentifier(), "public.data");
+  EXPECT_EQ(record->typeIdentifier(), "public.plain-text");
   EXPECT_EQ(record->localizedTypeDescription(), "Text");
   EXPECT_EQ(record->fileSize(), 1234u);
-  EXPECT_EQ(record->friendlyFileSize(), "1234 bytes");
-  EXPECT_EQ(record->parentDirectoryURL(), URL(Drive));
+  EXPECT_EQ(record->friendlyFileSize(), "1 KB");
+  EXPECT_EQ(record->parentDirectoryURL(), Drive);
   EXPECT_EQ(record->tags(), (std::vector<std::string>{"Red", "Blue"}));
   EXPECT_TRUE(record->canPreview());
   EXPECT_TRUE(record->isDownloaded());
   EXPECT_TRUE(record->hasHiddenExtension());
   EXPECT_TRUE(record->renameable());
   EXPECT_FALSE(record->isPromise());
-  EXPECT_EQ(record->friendlyCreationDate(DateStyle::Long), "1000 in 3,1");
-  EXPECT_EQ(record->friendlyContentModificationDate(DateStyle::Short), "1000 in 1,1");
+  EXPECT_EQ(record->friendlyCreationDate(DateStyle::Long), "1000 s, date 3, time 1");
+  EXPECT_EQ(record->friendlyContentModificationDate(DateStyle::Short), "1000 s, date 1, time 1");
 }
 
 TEST_F(DRItemTest, AbsentValuesHaveTheirDefaults) {
-  auto& item = platform.drive.add(Drive + "/a.txt");
+  auto& item = platform.disk.add(DrivePath + "/a.txt");
   item.values = {{ResourceKey::Name, "a.txt"}, {ResourceKey::FileSize, Value("no number")}};
-  const auto record = make(Drive + "/a.txt");
+  item.hasOnlyValues = true;
+  const auto record = make(DrivePath + "/a.txt");
   EXPECT_EQ(record->localizedName(), "a.txt");
   EXPECT_EQ(record->fileSize(), std::nullopt);
   EXPECT_FALSE(record->isDownloaded());
@@ -78,35 +77,35 @@ TEST_F(DRItemTest, AbsentValuesHaveTheirDefaults) {
 }
 
 TEST_F(DRItemTest, TheNotDownloadedStatusIsNotDownloaded) {
-  platform.drive.add(Drive + "/a").values[ResourceKey::DownloadingStatus] = Value(DownloadingStatusNotDownloaded);
-  EXPECT_FALSE(make(Drive + "/a")->isDownloaded());
+  platform.disk.add(DrivePath + "/a").values[ResourceKey::DownloadingStatus] = Value(DownloadingStatusNotDownloaded);
+  EXPECT_FALSE(make(DrivePath + "/a")->isDownloaded());
 }
 
 TEST_F(DRItemTest, ThePlatformsTypeDescriptionWins) {
-  platform.drive.add(Drive + "/f", FileType::Directory).values[ResourceKey::LocalizedTypeDescription] = Value("other");
-  const auto record = make(Drive + "/f");
+  platform.disk.add(DrivePath + "/f", FileType::Directory).values[ResourceKey::LocalizedTypeDescription] = Value("other");
+  const auto record = make(DrivePath + "/f");
   EXPECT_EQ(record->localizedTypeDescription(), "Folder");
   EXPECT_TRUE(record->isDirectory());
 }
 
 TEST_F(DRItemTest, APackageIsNoDirectoryAndSumsItsContents) {
-  auto& package = platform.drive.add(Drive + "/p.bundle", FileType::Directory);
+  auto& package = platform.disk.add(DrivePath + "/p.bundle", FileType::Directory);
   package.values[ResourceKey::IsPackage] = Value(true);
-  EXPECT_EQ(make(Drive + "/p.bundle")->fileSize(), std::nullopt);
-  platform.drive.add(Drive + "/p.bundle/one").values[ResourceKey::FileSize] = Value(std::uint64_t{30});
-  platform.drive.add(Drive + "/p.bundle/in/.two").values[ResourceKey::FileSize] = Value(std::uint64_t{12});
-  const auto record = make(Drive + "/p.bundle");
+  EXPECT_EQ(make(DrivePath + "/p.bundle")->fileSize(), std::nullopt);
+  platform.disk.add(DrivePath + "/p.bundle/one").values[ResourceKey::FileSize] = Value(std::uint64_t{30});
+  platform.disk.add(DrivePath + "/p.bundle/in/.two").values[ResourceKey::FileSize] = Value(std::uint64_t{12});
+  const auto record = make(DrivePath + "/p.bundle");
   EXPECT_TRUE(record->isPackage());
   EXPECT_FALSE(record->isDirectory());
   EXPECT_EQ(record->fileSize(), 42u);
   EXPECT_EQ(record->friendlyFileSize(), "42 bytes");
   package.values[ResourceKey::FileSize] = Value(std::uint64_t{7});
-  EXPECT_EQ(make(Drive + "/p.bundle")->fileSize(), 7u);
+  EXPECT_EQ(make(DrivePath + "/p.bundle")->fileSize(), 7u);
 }
 
 TEST_F(DRItemTest, SizeOfAPackageGoesOnPastErrors) {
-  platform.drive.add(Drive + "/x");
-  const auto record = make(Drive + "/x");
+  platform.disk.add(DrivePath + "/x");
+  const auto record = make(DrivePath + "/x");
   EXPECT_EQ(record->sizeOfPackage(std::nullopt), 0u);
   EXPECT_TRUE(platform.log.has("ERROR", "sizeOfPackage: null URL"));
   EXPECT_EQ(record->sizeOfPackage(URL("/gone")), 0u);
@@ -114,135 +113,137 @@ TEST_F(DRItemTest, SizeOfAPackageGoesOnPastErrors) {
 }
 
 TEST_F(DRItemTest, ALinkIsResolvedAndAnAliasOfAnyLetterCaseToo) {
-  platform.drive.add(Drive + "/link", FileType::SymbolicLink).linkTarget = Drive + "/target";
-  const auto link = make(Drive + "/link");
+  platform.disk.add(DrivePath + "/target");
+  platform.disk.add(DrivePath + "/link", FileType::SymbolicLink).linkTarget = DrivePath + "/target";
+  const auto link = make(DrivePath + "/link");
   EXPECT_TRUE(link->isSymlink());
-  EXPECT_EQ(link->resolvedURL(), URL(Drive + "/target"));
+  EXPECT_EQ(link->resolvedURL(), URL(DrivePath + "/target"));
 
-  auto& alias = platform.drive.add(Drive + "/alias");
+  auto& alias = platform.disk.add(DrivePath + "/alias");
   alias.values[ResourceKey::LocalizedTypeDescription] = Value("aLIAS");
-  alias.aliasTarget = URL(Drive + "/target");
-  EXPECT_EQ(make(Drive + "/alias")->resolvedURL(), URL(Drive + "/target"));
+  alias.aliasTarget = URL(DrivePath + "/target");
+  EXPECT_EQ(make(DrivePath + "/alias")->resolvedURL(), URL(DrivePath + "/target"));
   alias.aliasTarget.reset();
-  const auto broken = make(Drive + "/alias");
+  const auto broken = make(DrivePath + "/alias");
   EXPECT_TRUE(broken->isSymlink());
   EXPECT_EQ(broken->resolvedURL(), std::nullopt);
 }
 
 TEST_F(DRItemTest, APromisedAliasIsTriedWithAWarning) {
-  auto& alias = platform.drive.add(Drive + "/alias");
-  alias.promised = true;
+  auto& alias = platform.disk.add(DrivePath + "/alias");
+  alias.isPromise = true;
   alias.values[ResourceKey::LocalizedTypeDescription] = Value("Alias");
-  make(Drive + "/alias");
+  make(DrivePath + "/alias");
   EXPECT_TRUE(platform.log.has(
-      "WARNING", "Rover Alias is promised -- unable to determine target without downloading: file://" + Drive + "/alias"));
+      "WARNING",
+      "Rover Alias is promised -- unable to determine target without downloading: file://" + DrivePath + "/alias"));
 }
 
 TEST_F(DRItemTest, ALinkToTheRootLeavesNothing) {
-  platform.drive.add(Drive + "/link", FileType::SymbolicLink).linkTarget = "/";
-  const auto link = make(Drive + "/link");
+  platform.disk.add(DrivePath + "/link", FileType::SymbolicLink).linkTarget = "/";
+  const auto link = make(DrivePath + "/link");
   EXPECT_TRUE(link->isSymlink());
   EXPECT_EQ(link->resolvedURL(), std::nullopt);
 }
 
 TEST_F(DRItemTest, ContainersHaveTheirNameAndStayAsTheyAre) {
-  const auto container = platform.drive.addContainer("org~example~Notes", "Notes");
+  const auto container = platform.cloud.addContainer("org~example~Notes", "Notes");
   const auto record = make(container->folder->path());
   EXPECT_TRUE(record->isContainer());
   EXPECT_FALSE(record->renameable());
   EXPECT_EQ(record->localizedName(), "Notes");
-  platform.drive.containerLookupError = Error{FileErrorDomain, 1, {}, {}, {}};
+  platform.cloud.containerError = Error{FileErrorDomain, 1, {}, {}, {}};
   EXPECT_EQ(make(container->folder->path())->localizedName(), "Documents");
 }
 
 TEST_F(DRItemTest, OnlyAParticipantMayNotRename) {
-  auto& item = platform.drive.add(Drive + "/shared");
+  auto& item = platform.disk.add(DrivePath + "/shared");
   item.values[ResourceKey::IsShared] = Value(true);
   item.values[ResourceKey::SharedItemRole] = Value(SharedItemRoleOwner);
-  EXPECT_TRUE(make(Drive + "/shared")->renameable());
+  EXPECT_TRUE(make(DrivePath + "/shared")->renameable());
   item.values[ResourceKey::SharedItemRole] = Value(SharedItemRoleParticipant);
-  EXPECT_FALSE(make(Drive + "/shared")->renameable());
+  EXPECT_FALSE(make(DrivePath + "/shared")->renameable());
   item.values[ResourceKey::IsShared] = Value(false);
-  EXPECT_TRUE(make(Drive + "/shared")->renameable());
+  EXPECT_TRUE(make(DrivePath + "/shared")->renameable());
 }
 
 TEST_F(DRItemTest, APromiseIsToldByIdentity) {
-  platform.drive.add(Drive + "/p").promised = true;
-  const auto record = make(Drive + "/p");
-  EXPECT_EQ(record->promiseURL(), URL(Drive + "/p.physical"));
+  platform.disk.add(DrivePath + "/p").isPromise = true;
+  const auto record = make(DrivePath + "/p");
+  EXPECT_EQ(record->promiseURL(), URL(DrivePath + "/.p.vlopromise"));
   EXPECT_TRUE(record->isPromise());
   record->setPromiseURL(URL(record->resolvedURL()->path()));
   EXPECT_TRUE(record->isPromise()) << "an equal URL is another object";
 }
 
 TEST_F(DRItemTest, ValuesThatCannotBeReadAsPromisedAreReadPlainly) {
-  platform.drive.add(Drive + "/a");
-  platform.drive.promisedReadError = Error{FileErrorDomain, 99, {}, {}, {}};
-  EXPECT_EQ(make(Drive + "/a")->localizedName(), "a");
-  EXPECT_EQ(platform.log.count("WARNING", "promisedItemResourceValuesForKeys failed on file://" + Drive + "/a"), 1u);
+  platform.disk.add(DrivePath + "/a");
+  platform.values.promisedReadError = Error{FileErrorDomain, 99, {}, {}, {}};
+  EXPECT_EQ(make(DrivePath + "/a")->localizedName(), "a");
+  EXPECT_EQ(platform.log.count("WARNING", "promisedItemResourceValuesForKeys failed on file://" + DrivePath + "/a"), 1u);
 }
 
 TEST_F(DRItemTest, TheAttributesAreTheLastResort) {
-  auto& item = platform.drive.add(Drive + "/a");
+  auto& item = platform.disk.add(DrivePath + "/a");
   item.attributes.size = Value(std::uint64_t{5});
-  platform.drive.promisedReadError = platform.drive.plainReadError = Error{FileErrorDomain, 99, {}, {}, {}};
-  const auto record = make(Drive + "/a");
+  platform.values.promisedReadError = platform.values.plainReadError = Error{FileErrorDomain, 99, {}, {}, {}};
+  const auto record = make(DrivePath + "/a");
   EXPECT_EQ(record->localizedName(), "a");
   EXPECT_EQ(record->typeIdentifier(), std::nullopt);
   EXPECT_EQ(record->fileSize(), 5u);
   EXPECT_FALSE(record->hasHiddenExtension());
   item.attributes.type = FileType::Other;
-  EXPECT_EQ(make(Drive + "/a"), nullptr);
+  EXPECT_EQ(make(DrivePath + "/a"), nullptr);
   item.attributes.type = FileType::Directory;
-  EXPECT_TRUE(make(Drive + "/a")->isDirectory());
+  EXPECT_TRUE(make(DrivePath + "/a")->isDirectory());
   item.attributes.type = FileType::SymbolicLink;
   item.linkTarget = "beside";
-  const auto link = make(Drive + "/a");
+  const auto link = make(DrivePath + "/a");
   EXPECT_EQ(link->typeIdentifier(), "public.symlink");
   EXPECT_EQ(link->symlinkTarget(), "beside");
 }
 
 TEST_F(DRItemTest, ACoordinationThatNeverRunsLeavesABareRecord) {
-  platform.drive.add(Drive + "/a");
-  platform.drive.coordinationError = Error{FileErrorDomain, 1, {}, {}, {}};
-  const auto record = make(Drive + "/a");
+  platform.disk.add(DrivePath + "/a");
+  platform.coordination.coordinatorError = Error{FileErrorDomain, 1, {}, {}, {}};
+  const auto record = make(DrivePath + "/a");
   ASSERT_TRUE(record);
   EXPECT_EQ(record->localizedName(), std::nullopt);
-  EXPECT_EQ(record->resolvedURL(), URL(Drive + "/a"));
+  EXPECT_EQ(record->resolvedURL(), URL(DrivePath + "/a"));
 }
 
 TEST_F(DRItemTest, TheSecurityScopeIsClosedOnlyWhenTheReadWorked) {
-  platform.drive.secured = true;
-  platform.drive.add(Drive + "/a");
-  make(Drive + "/a");
-  EXPECT_EQ(platform.drive.openScopes, 0);
-  make(Drive + "/gone");
-  EXPECT_EQ(platform.drive.openScopes, 1);
+  platform.values.securityScoped = true;
+  platform.disk.add(DrivePath + "/a");
+  make(DrivePath + "/a");
+  EXPECT_EQ(platform.values.openScopes, 0);
+  make(DrivePath + "/gone");
+  EXPECT_EQ(platform.values.openScopes, 1);
 }
 
 TEST_F(DRItemTest, SettingAnEqualURLDoesNotRefill) {
-  platform.drive.add(Drive + "/a");
-  platform.drive.add(Drive + "/b");
-  const auto record = make(Drive + "/a");
-  platform.drive.calls.clear();
-  record->setUrl(URL(Drive + "/a"));
-  EXPECT_TRUE(platform.drive.calls.empty());
-  record->setUrl(URL(Drive + "/b"));
+  platform.disk.add(DrivePath + "/a");
+  platform.disk.add(DrivePath + "/b");
+  const auto record = make(DrivePath + "/a");
+  platform.record.calls.clear();
+  record->setUrl(URL(DrivePath + "/a"));
+  EXPECT_TRUE(platform.record.calls.empty());
+  record->setUrl(URL(DrivePath + "/b"));
   EXPECT_EQ(record->localizedName(), "b");
 }
 
 TEST_F(DRItemTest, TheThumbnailIsLookedForOnceAFill) {
   const ImageRef image = std::make_shared<TestImage>();
-  platform.drive.add(Drive + "/a").values[ResourceKey::ThumbnailDictionary] =
+  platform.disk.add(DrivePath + "/a").values[ResourceKey::ThumbnailDictionary] =
       Value(Dictionary{{Thumbnail1024SizeKey, Value(image)}});
-  platform.drive.add(Drive + "/b");
-  const auto record = make(Drive + "/a");
+  platform.disk.add(DrivePath + "/b");
+  const auto record = make(DrivePath + "/a");
   EXPECT_FALSE(record->thumbnailFetched());
   EXPECT_EQ(record->thumbnail(), image);
-  platform.drive.calls.clear();
+  platform.record.calls.clear();
   EXPECT_EQ(record->thumbnail(), image);
-  EXPECT_TRUE(platform.drive.calls.empty());
-  record->setUrl(URL(Drive + "/b"));
+  EXPECT_TRUE(platform.record.calls.empty());
+  record->setUrl(URL(DrivePath + "/b"));
   EXPECT_EQ(record->thumbnail(), nullptr);
   record->updateThumbnailImage(Value("no dictionary"));
   EXPECT_FALSE(record->canGenerateThumbnail());
@@ -252,12 +253,12 @@ TEST_F(DRItemTest, TheThumbnailIsLookedForOnceAFill) {
 }
 
 TEST_F(DRItemTest, TheDescriptionRunsItsFlagsTogether) {
-  auto& folder = platform.drive.add(Drive + "/f", FileType::Directory);
-  const auto record = make(Drive + "/f");
-  const std::string start = "Name=f, Size=(null), URL=file://" + Drive + "/f, ResURL=<same>, PromiseURL=<same>, ";
+  auto& folder = platform.disk.add(DrivePath + "/f", FileType::Directory);
+  const auto record = make(DrivePath + "/f");
+  const std::string start = "Name=f, Size=(null), URL=file://" + DrivePath + "/f, ResURL=<same>, PromiseURL=<same>, ";
   EXPECT_EQ(record->description(), start + "Directory, Local,");
   folder.values[ResourceKey::IsPackage] = Value(true);
-  const auto package = make(Drive + "/f");
+  const auto package = make(DrivePath + "/f");
   package->setIsPromise(true);
   EXPECT_EQ(package->description(), start + "Package, Promise, ");
 }

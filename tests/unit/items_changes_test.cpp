@@ -112,6 +112,7 @@ TEST_F(FileChangesTest, aMoveTellsTheCoordinatorBeforeAndAfter) {
   world.addFile(A);
   const URL newA("/drive/mirror/com~marrow~Kestrel/a2");
   const URL newB("/drive/mirror/com~marrow~Kestrel/b2");
+  world.addFile(newA);
   world.redirected.insert_or_assign(A.path(), newA);
   world.redirected.insert_or_assign(B.path(), newB);
   EXPECT_FALSE(FileUtils::moveTo(A, B));
@@ -158,10 +159,13 @@ TEST_F(FileChangesTest, filesDoNotMoveOntoFoldersNorFoldersOntoFiles) {
 TEST_F(FileChangesTest, aFileOntoAFileAndAFolderOntoAFolderAreLeftToTheFileManager) {
   world.addFile(A);
   world.addFile(B);
-  EXPECT_FALSE(FileUtils::moveTo(A, B));
+  EXPECT_EQ(FileUtils::moveTo(A, B)->code, FileErrorCode::WriteFileExists);
+  EXPECT_TRUE(world.called("move " + A.path() + " " + B.path()));
+  world.calls.clear();
   world.addFolder(A);
   world.addFolder(B);
-  EXPECT_FALSE(FileUtils::moveTo(A, B));
+  EXPECT_EQ(FileUtils::moveTo(A, B)->code, FileErrorCode::WriteFileExists);
+  EXPECT_TRUE(world.called("move " + A.path() + " " + B.path()));
 }
 
 TEST_F(FileChangesTest, theDocumentsDirectoryIsTheFirstWithItsTildeExpanded) {
@@ -211,7 +215,7 @@ TEST_F(FileChangesTest, attributesAreLoggedWithTheirAge) {
                 "DEBUG Date Modified: " + Value(*attributes.modificationDate).description() + " (-30.000000 seconds ago)",
                 "DEBUG Size: 12 bytes"}));
   FileUtils::logFileAttributes("/nowhere");
-  EXPECT_TRUE(logged("ERROR", "Cannot get attributes of /nowhere: " + fileError(FileErrorCode::NoSuchFile).description()));
+  EXPECT_TRUE(logged("ERROR", "Cannot get attributes of /nowhere: " + world.files.attributesOfItemAtPath("/nowhere").error->description()));
 }
 
 TEST_F(FileChangesTest, theDumpDoesNothing) {

@@ -39,7 +39,7 @@ class LaunchUtilsTest : public ItemsTest {
 TEST_F(LaunchUtilsTest, onlyOwnersThatOpenInPlaceAreCandidates) {
   world.ranked = DocumentRecord::Ranked{{"Alternate", {app("alternate")}},
                                         {"Owner", {app("first"), app("copier", false), app("second")}}};
-  const auto record = world.documentRecord(InDrive, false);
+  const auto record = world.launch.documentRecord(InDrive, false);
   const auto candidates = LaunchUtils::availableAppsForDoc(*record);
   EXPECT_EQ(candidates, (std::vector{app("first"), app("second")}));
   EXPECT_EQ(messages(), (Lines{"DEBUG UTI public.text: Found non-Owner 'Alternate' app alternate",
@@ -50,7 +50,7 @@ TEST_F(LaunchUtilsTest, onlyOwnersThatOpenInPlaceAreCandidates) {
 
 TEST_F(LaunchUtilsTest, anErrorGivesNoCandidates) {
   world.ranked = fileError(FileErrorCode::ReadUnknown);
-  EXPECT_TRUE(LaunchUtils::availableAppsForDoc(*world.documentRecord(InDrive, false)).empty());
+  EXPECT_TRUE(LaunchUtils::availableAppsForDoc(*world.launch.documentRecord(InDrive, false)).empty());
 }
 
 TEST_F(LaunchUtilsTest, theDefaultContainer) {
@@ -117,7 +117,7 @@ TEST_F(LaunchUtilsTest, theBrowserNeverOpensInItself) {
 }
 
 TEST_F(LaunchUtilsTest, inALibraryItsOwnerOpensWhatItOwns) {
-  world.library->owners_ = {"main"};
+  world.library->owners = {"main"};
   install(app("main"));
   own({app("other"), app("main")});
   EXPECT_EQ(chosen(InLibrary), "main");
@@ -127,14 +127,14 @@ TEST_F(LaunchUtilsTest, inALibraryItsOwnerOpensWhatItOwns) {
 TEST_F(LaunchUtilsTest, inALibraryPicturesOpenInTheOwnerToo) {
   const URL picture = LibraryDocuments.appendingPathComponent("a.png");
   world.addFile(picture);
-  world.library->owners_ = {"main"};
+  world.library->owners = {"main"};
   install(app("main"));
   own({app("main")});
   EXPECT_EQ(chosen(picture), "main");
 }
 
 TEST_F(LaunchUtilsTest, anOwnerThatDoesNotOwnTheTypeGivesWayToTheFirstCandidate) {
-  world.library->owners_ = {"main"};
+  world.library->owners = {"main"};
   install(app("main"));
   own({app("other"), app("third")});
   EXPECT_EQ(chosen(InLibrary), "other");
@@ -144,7 +144,7 @@ TEST_F(LaunchUtilsTest, anOwnerThatDoesNotOwnTheTypeGivesWayToTheFirstCandidate)
 }
 
 TEST_F(LaunchUtilsTest, withoutCandidatesTheNextOwnerIsTried) {
-  world.library->owners_ = {"main", "second"};
+  world.library->owners = {"main", "second"};
   install(app("main"));
   install(app("second"));
   EXPECT_FALSE(chosen(InLibrary));
@@ -153,7 +153,7 @@ TEST_F(LaunchUtilsTest, withoutCandidatesTheNextOwnerIsTried) {
 }
 
 TEST_F(LaunchUtilsTest, anOwnerThatIsNotInstalledOrCopiesGivesWayToTheNext) {
-  world.library->owners_ = {"gone", "removed", "copier", "second"};
+  world.library->owners = {"gone", "removed", "copier", "second"};
   ApplicationRecord removed = app("removed", false);
   removed.isInstalled = false;
   install(removed);
@@ -170,7 +170,7 @@ TEST_F(LaunchUtilsTest, aLibraryWithoutOwnersOrOutsideTheTableHasNoDefault) {
   own({app("other")});
   EXPECT_FALSE(chosen(InLibrary));
   EXPECT_FALSE(chosen(URL("/outside/a.txt")));
-  world.library->owners_ = {"other"};
+  world.library->owners = {"other"};
   install(app("other"));
   world.containers = {world.drive};
   EXPECT_FALSE(chosen(InLibrary));

@@ -78,7 +78,7 @@ TEST_F(LocationsTest, aFailedLookupIsTriedByIdentifierAndStillReported) {
 TEST_F(LocationsTest, outsideAllContainersNothingIsWritten) {
   const auto error = split(URL("/outside/a"));
   ASSERT_TRUE(error);
-  EXPECT_EQ(error->code, FileErrorCode::NoSuchFile);
+  EXPECT_EQ(error->domain, CloudDocumentsErrorDomain);
   EXPECT_FALSE(container);
   EXPECT_EQ(names, Names{"untouched"});
   EXPECT_EQ(messages(), Names{"WARNING Split URL: " + error->description()});
@@ -87,7 +87,7 @@ TEST_F(LocationsTest, outsideAllContainersNothingIsWritten) {
 TEST_F(LocationsTest, pathsThatCannotBeSplitAreAFormattingError) {
   for (const std::optional<URL>& folder :
        {std::optional<URL>(), std::optional(URL("/outside")), std::optional(Deep.appendingPathComponent("below"))}) {
-    world.library->folder_ = folder;
+    world.library->folder = folder;
     const auto error = split(Deep);
     ASSERT_TRUE(error);
     EXPECT_EQ(error->domain, FileErrorDomain);

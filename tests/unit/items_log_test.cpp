@@ -19,7 +19,7 @@ TEST_F(LogTest, levelsGoToTheTypesOfThePlatformsLog) {
   VLO_INFO("i");
   VLO_DEBUG("d");
   EXPECT_EQ(messages(), (std::vector<std::string>{"ERROR e", "WARNING w", "INFO i", "DEBUG d"}));
-  EXPECT_EQ(world.recordedLog.types, (std::vector{LogType::Error, LogType::Default, LogType::Default, LogType::Debug}));
+  EXPECT_EQ(world.recordedLog.types(), (std::vector{LogType::Error, LogType::Default, LogType::Default, LogType::Debug}));
 }
 
 TEST_F(LogTest, debugLinesThatNobodyReadsAreNotMade) {

@@ -16,8 +16,8 @@ class NamesTest : public ItemsTest {
     return FileUtils::isValidExtensionForContainer(LibraryDocuments.appendingPathComponent(name));
   }
   void declare(std::vector<Value> contentTypes) {
-    world.library->types_.emplace();
-    for (Value& value : contentTypes) world.library->types_->push_back({std::move(value)});
+    world.library->types.emplace();
+    for (Value& value : contentTypes) world.library->types->push_back({std::move(value)});
   }
 };
 
@@ -77,13 +77,13 @@ TEST_F(NamesTest, theDriveAndALibraryThatDeclaresNothingTakeEverything) {
   EXPECT_TRUE(isValidInLibrary("a.txt"));
   declare({});
   EXPECT_TRUE(isValidInLibrary("a.txt"));
-  world.drive->types_.emplace({DeclaredDocumentType{Array{"public.image"}}});
+  world.drive->types.emplace({DeclaredDocumentType{Array{"public.image"}}});
   EXPECT_TRUE(FileUtils::isValidExtensionForContainer(Drive.appendingPathComponent("a.txt")));
 }
 
 TEST_F(NamesTest, noContainerOrNoDocumentsFolderTakesNothing) {
   EXPECT_FALSE(FileUtils::isValidExtensionForContainer(URL("/outside/a.txt")));
-  world.library->folder_ = std::nullopt;
+  world.library->folder = std::nullopt;
   EXPECT_FALSE(isValidInLibrary("a.txt"));
   EXPECT_TRUE(messages().empty());
 }

@@ -20,7 +20,9 @@ struct TestImage : Image {
 class ItemsReviewRecordTest : public ItemsTest {
  protected:
   std::shared_ptr<DRItem> filled(ResourceMap values = {}) {
-    world.addFile(Item, std::move(values));
+    const bool isFolder = values.contains(K::IsDirectory) || values.contains(K::IsPackage);
+    MemoryItem& item = isFolder ? world.addFolder(Item) : world.addFile(Item);
+    item.values = std::move(values);
     return DRItem::initWithURL(Item);
   }
   /// A record whose link target is known, as only the plain attributes tell it.
@@ -126,7 +128,7 @@ TEST_F(ItemsReviewRecordTest, whatHasNoSizeAddsNothingToASum) {
   world.addFile(Item.appendingPathComponent("c"));
   world.promisedAnswers.insert_or_assign(Item.appendingPathComponent("c").path(), fileError(FileErrorCode::ReadUnknown));
   world.addFolder(Item.appendingPathComponent("d"));
-  EXPECT_EQ(filled()->sizeOfPackage(Item), 3u);
+  EXPECT_EQ(filled({{K::IsDirectory, true}})->sizeOfPackage(Item), 3u);
 }
 
 TEST_F(ItemsReviewRecordTest, onlyAPackageIsSummedUp) {

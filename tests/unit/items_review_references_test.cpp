@@ -40,8 +40,10 @@ class ItemsReviewReferencesTest : public ItemsTest {
 // References.
 
 TEST_F(ItemsReviewReferencesTest, theFirstContainerThatTakesItemsAnswersForAll) {
-  const auto first = std::make_shared<TestContainer>("org~example~First", "First", std::nullopt);
-  const auto last = std::make_shared<TestContainer>("org~example~Last", "Last", std::nullopt);
+  const auto first =
+      std::make_shared<TestContainer>("org~example~First", "First", URL("/drive/mirror/org~example~First/Documents", true));
+  const auto last =
+      std::make_shared<TestContainer>("org~example~Last", "The last", URL("/drive/mirror/org~example~Last/Documents", true));
   world.containers = {first, world.drive, world.library, last};
   world.movableTo = {LibraryIdentifier, "org~example~Last"};
   EXPECT_TRUE(vlo_canCrossZoneMoveURLs({Document}));
@@ -113,7 +115,7 @@ TEST_F(ItemsReviewReferencesTest, aDocumentCountsAsOpenedOnceItWasHandedOver) {
 TEST_F(ItemsReviewReferencesTest, inALibraryTheBrowserMayBeAnOwner) {
   own({app("com.marrow.VaeloDrive")});
   world.applications.insert_or_assign("com.marrow.VaeloDrive", app("com.marrow.VaeloDrive"));
-  world.library->owners_ = {"com.marrow.VaeloDrive"};
+  world.library->owners = {"com.marrow.VaeloDrive"};
   EXPECT_TRUE(open(InLibrary));
   EXPECT_FALSE(open(Document));
 }
@@ -123,7 +125,7 @@ TEST_F(ItemsReviewReferencesTest, inALibraryTheDocumentOfABookmarkIsJudged) {
   world.bookmarks.insert_or_assign(InLibrary.path(), letter);
   own({app("main")});
   world.applications.insert_or_assign("main", app("main"));
-  world.library->owners_ = {"main"};
+  world.library->owners = {"main"};
   EXPECT_TRUE(open(InLibrary));
   EXPECT_TRUE(world.called("record " + letter.path()) && world.called("open " + letter.path() + " with main"));
   EXPECT_EQ(LaunchUtils::defaultAppForDocumentRequireOpenIn(InLibrary, false)->bundleIdentifier, "main");
@@ -138,7 +140,7 @@ TEST_F(ItemsReviewReferencesTest, withoutItsContainerNobodyIsAskedForADocument) 
 
 TEST_F(ItemsReviewReferencesTest, anOwnerThatIsUnknownIsNotInstalledEvenWhereOthersOwnTheType) {
   own({app("other")});
-  world.library->owners_ = {"gone"};
+  world.library->owners = {"gone"};
   EXPECT_FALSE(open(InLibrary)) << "the first candidate stands in for an installed owner only";
   EXPECT_EQ(messages().back(), "DEBUG Container Sketchbook: Default app (gone) not installed");
 }
@@ -146,7 +148,7 @@ TEST_F(ItemsReviewReferencesTest, anOwnerThatIsUnknownIsNotInstalledEvenWhereOth
 TEST_F(ItemsReviewReferencesTest, theFirstOwnerThatAnswersEndsTheSearch) {
   own({app("second"), app("first")});
   for (const char* owner : {"first", "second"}) world.applications.insert_or_assign(owner, app(owner));
-  world.library->owners_ = {"first", "second"};
+  world.library->owners = {"first", "second"};
   EXPECT_EQ(LaunchUtils::defaultAppForDocumentRequireOpenIn(InLibrary, true)->bundleIdentifier, "first");
   EXPECT_FALSE(logged("DEBUG", "Container Sketchbook: Default app (second) supports open in place"));
 }

@@ -84,7 +84,7 @@ TEST_F(URLAdditionsTest, theDocumentIdentifierIsThePromisedItemsElseTheFiles) {
   world.addFile(Found, {{K::DocumentIdentifier, std::int64_t{-5}}});
   EXPECT_EQ(vlo_DocumentID(Found), -5);
   EXPECT_EQ(world.recordedLog.lines(), Lines{"URL"});
-  EXPECT_EQ(world.recordedLog.types, std::vector{LogType::Default});
+  EXPECT_EQ(world.recordedLog.types(), std::vector{LogType::Default});
   EXPECT_FALSE(world.called("plain " + Found.path()));
   for (const Result<ResourceMap>& answer :
        {Result<ResourceMap>(ResourceMap{}), Result<ResourceMap>(fileError(FileErrorCode::ReadUnknown))}) {

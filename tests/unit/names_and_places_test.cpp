@@ -8,14 +8,11 @@
 namespace vaelo {
 namespace {
 
-using ::testing::_;
-using ::testing::Return;
-
-const std::string Drive = "/drive/mirror/com~marrow~Kestrel";
+const std::string DrivePath = Drive.path();
 
 class NamesAndPlacesTest : public ::testing::Test {
  protected:
-  NamesAndPlacesTest() { library = platform.drive.addContainer("org~example~Sketch", "Sketchbook"); }
+  NamesAndPlacesTest() { library = platform.cloud.addContainer("org~example~Sketch", "Sketchbook"); }
   URL inLibrary(const std::string& path) const { return URL("/drive/mirror/org~example~Sketch/Documents/" + path); }
   MemoryPlatform platform;
   std::shared_ptr<MemoryContainer> library;
@@ -35,7 +32,7 @@ TEST_F(NamesAndPlacesTest, MediaAreToldByExtension) {
       platform.log.has("DEBUG", "isAudioVideoImageFile: Extension png is public.png which conforms to UTI public.image"));
   platform.log.clear();
   EXPECT_FALSE(FileUtils::isAudioVideoImageFile(URL("/a.txt")));
-  EXPECT_TRUE(platform.log.has("DEBUG", "isAudioVideoImageFile: Extension txt is type.txt which is not."));
+  EXPECT_TRUE(platform.log.has("DEBUG", "isAudioVideoImageFile: Extension txt is public.plain-text which is not."));
   platform.log.clear();
   EXPECT_FALSE(FileUtils::isAudioVideoImageFile(URL("/plain")));
   EXPECT_TRUE(platform.log.lines().empty());
@@ -43,9 +40,10 @@ TEST_F(NamesAndPlacesTest, MediaAreToldByExtension) {
 
 TEST_F(NamesAndPlacesTest, AContainerTakesTheTypesThatItDeclares) {
   EXPECT_TRUE(FileUtils::isValidExtensionForContainer(inLibrary("plain")));
+  platform.types.makesTypes = false;
   EXPECT_TRUE(FileUtils::isValidExtensionForContainer(inLibrary("a.untyped")));
   EXPECT_FALSE(FileUtils::isValidExtensionForContainer(URL("/outside/a.png")));
-  EXPECT_TRUE(FileUtils::isValidExtensionForContainer(URL(Drive + "/a.png")));
+  EXPECT_TRUE(FileUtils::isValidExtensionForContainer(URL(DrivePath + "/a.png")));
   EXPECT_TRUE(FileUtils::isValidExtensionForContainer(inLibrary("a.txt")));
 
   library->types = {{Value(Array{Value("public.audio"), Value("public.image")})}};
@@ -70,7 +68,7 @@ TEST_F(NamesAndPlacesTest, AContainerTakesTheTypesThatItDeclares) {
 }
 
 TEST_F(NamesAndPlacesTest, AURLSplitsIntoContainerAndNames) {
-  platform.drive.add(inLibrary("Animals/Birds/Owl.png").path()).values[ResourceKey::LocalizedName] = Value("The Owl");
+  platform.disk.add(inLibrary("Animals/Birds/Owl.png").path()).values[ResourceKey::LocalizedName] = Value("The Owl");
   CloudContainerRef container;
   std::vector<std::string> names;
   EXPECT_FALSE(FileUtils::containerAndRelativePathforURLContainerRelativePathComponents(inLibrary("Animals/Birds/Owl.png"),
@@ -98,7 +96,7 @@ TEST_F(NamesAndPlacesTest, TheTopFolderItselfHasNoNamesAndAboveItIsAnError) {
 }
 
 TEST_F(NamesAndPlacesTest, ALookupErrorIsReturnedEvenWhenTheTableKnowsTheContainer) {
-  platform.drive.containerLookupError = Error{FileErrorDomain, 99, {}, {}, {}};
+  platform.cloud.containerError = Error{FileErrorDomain, 99, {}, {}, {}};
   CloudContainerRef container;
   EXPECT_EQ(
       FileUtils::containerAndRelativePathforURLContainerRelativePathComponents(inLibrary("a"), &container, nullptr)->code,
@@ -113,100 +111,99 @@ TEST_F(NamesAndPlacesTest, ALookupErrorIsReturnedEvenWhenTheTableKnowsTheContain
 }
 
 TEST_F(NamesAndPlacesTest, TheLocationLineNamesWhatIsAboveTheItem) {
-  platform.drive.add(Drive + "/top.txt");
-  EXPECT_EQ(FileUtils::displayableLocationForURL(URL(Drive + "/top.txt")), "\u2068Vaelo Drive\u2069");
-  platform.drive.add(inLibrary("Animals/Birds/Owl.png").path());
+  platform.disk.add(DrivePath + "/top.txt");
+  EXPECT_EQ(FileUtils::displayableLocationForURL(URL(DrivePath + "/top.txt")), "\u2068Vaelo Drive\u2069");
+  platform.disk.add(inLibrary("Animals/Birds/Owl.png").path());
   EXPECT_EQ(FileUtils::displayableLocationForURL(inLibrary("Animals/Birds/Owl.png")),
             "\u2068Vaelo Drive\u2069 ▸ \u2068Sketchbook\u2069 ▸ \u2068Animals\u2069 ▸ \u2068Birds\u2069");
-  ON_CALL(platform.application, isRightToLeft).WillByDefault(Return(true));
+  platform.application.rightToLeft = true;
   EXPECT_EQ(FileUtils::displayableLocationForURL(inLibrary("Animals/Birds")),
             "\u200F\u2068Vaelo Drive\u2069 ◂ \u2068Sketchbook\u2069 ◂ \u2068Animals\u2069");
   EXPECT_EQ(FileUtils::displayableLocationForURL(URL("/outside")), std::nullopt);
 }
 
 TEST_F(NamesAndPlacesTest, BookmarksResolveOrAreNothingAndAliasesStay) {
-  const URL bookmark(Drive + "/a.vaelobookmark");
-  platform.drive.add(bookmark.path()).bookmarkTarget = URL("/outside/doc.promise");
-  platform.drive.promises.insert("/outside/doc.promise");
-  EXPECT_EQ(vlo_URLByResolvingBookmark(bookmark), URL("/outside/doc.promise.logical"));
-  platform.drive.items.erase(bookmark.path());
+  const URL bookmark(DrivePath + "/a.vaelobookmark");
+  platform.disk.addPromise("/outside/doc");
+  platform.disk.add(bookmark.path()).bookmarkTarget = URL("/outside/.doc.vlopromise");
+  EXPECT_EQ(vlo_URLByResolvingBookmark(bookmark), URL("/outside/doc"));
+  platform.disk.items.erase("/outside/doc");
   EXPECT_EQ(vlo_URLByResolvingBookmark(bookmark), std::nullopt);
   EXPECT_EQ(vlo_URLByResolvingAlias(bookmark), bookmark);
-  platform.drive.promises.insert(Drive + "/p");
-  EXPECT_EQ(vlo_URLByResolvingBookmark(URL(Drive + "/p")), URL(Drive + "/p"));
-  EXPECT_EQ(vlo_URLByResolvingPromise(URL(Drive + "/p")), URL(Drive + "/p.logical"));
+  platform.disk.addPromise(DrivePath + "/p");
+  EXPECT_EQ(vlo_URLByResolvingBookmark(URL(DrivePath + "/.p.vlopromise")), URL(DrivePath + "/.p.vlopromise"));
+  EXPECT_EQ(vlo_URLByResolvingPromise(URL(DrivePath + "/.p.vlopromise")), URL(DrivePath + "/p"));
 }
 
 TEST_F(NamesAndPlacesTest, OnlyTheDrivesOwnDesktopAndDocumentsAreSpecial) {
-  EXPECT_TRUE(vlo_isDesktopOrDocumentsFolder(URL(Drive + "/Documents")));
-  EXPECT_TRUE(vlo_isDesktopOrDocumentsFolder(URL(Drive + "/Desktop", true)));
-  EXPECT_FALSE(vlo_isDesktopOrDocumentsFolder(URL(Drive + "/Documents/Work")));
-  EXPECT_FALSE(vlo_isDesktopOrDocumentsFolder(URL(Drive + "/documents")));
+  EXPECT_TRUE(vlo_isDesktopOrDocumentsFolder(URL(DrivePath + "/Documents")));
+  EXPECT_TRUE(vlo_isDesktopOrDocumentsFolder(URL(DrivePath + "/Desktop", true)));
+  EXPECT_FALSE(vlo_isDesktopOrDocumentsFolder(URL(DrivePath + "/Documents/Work")));
+  EXPECT_FALSE(vlo_isDesktopOrDocumentsFolder(URL(DrivePath + "/documents")));
   EXPECT_FALSE(vlo_isDesktopOrDocumentsFolder(*library->folder));
 }
 
 TEST_F(NamesAndPlacesTest, AMoveAcrossContainersIsJudgedByTheFirstItem) {
   EXPECT_FALSE(vlo_canCrossZoneMoveURLs({}));
-  EXPECT_FALSE(vlo_canCrossZoneMoveURLs({URL(Drive + "/a")}));
-  platform.drive.movable = {{"com~marrow~Kestrel", "org~example~Sketch"}};
-  EXPECT_TRUE(vlo_canCrossZoneMoveURLs({URL(Drive + "/a"), inLibrary("b")}));
-  EXPECT_FALSE(vlo_canCrossZoneMoveURLs({inLibrary("b"), URL(Drive + "/a")}));
+  EXPECT_FALSE(vlo_canCrossZoneMoveURLs({URL(DrivePath + "/a")}));
+  platform.cloud.movable = {{"com~marrow~Kestrel", "org~example~Sketch"}};
+  EXPECT_TRUE(vlo_canCrossZoneMoveURLs({URL(DrivePath + "/a"), inLibrary("b")}));
+  EXPECT_FALSE(vlo_canCrossZoneMoveURLs({inLibrary("b"), URL(DrivePath + "/a")}));
 }
 
 TEST_F(NamesAndPlacesTest, DocumentIdentifiersComeFromThePromiseElseFromTheDisk) {
-  platform.drive.add(Drive + "/a").values[ResourceKey::DocumentIdentifier] = Value(std::int64_t{-5});
-  EXPECT_EQ(vlo_DocumentID(URL(Drive + "/a")), -5);
-  platform.drive.promisedReadError = Error{FileErrorDomain, 1, {}, {}, {}};
-  EXPECT_EQ(vlo_DocumentID(URL(Drive + "/a")), -5);
-  EXPECT_EQ(vlo_DocumentID(URL(Drive + "/gone")), 0);
+  platform.disk.add(DrivePath + "/a").values[ResourceKey::DocumentIdentifier] = Value(std::int64_t{-5});
+  EXPECT_EQ(vlo_DocumentID(URL(DrivePath + "/a")), -5);
+  platform.values.promisedReadError = Error{FileErrorDomain, 1, {}, {}, {}};
+  EXPECT_EQ(vlo_DocumentID(URL(DrivePath + "/a")), -5);
+  EXPECT_EQ(vlo_DocumentID(URL(DrivePath + "/gone")), 0);
 }
 
 class DocumentIdentifierTest : public NamesAndPlacesTest {
  protected:
-  DocumentIdentifierTest() {
-    ON_CALL(platform.documentStore, deviceOf).WillByDefault(Return(std::optional<DocumentStore::Device>(3)));
-    ON_CALL(platform.documentStore, resolveDocumentID)
-        .WillByDefault(Return(SystemResult<DocumentStore::FileID>{std::optional<DocumentStore::FileID>(77), {}}));
-    ON_CALL(platform.documentStore, openByID).WillByDefault(Return(SystemResult<int>{0, {}}));
-    ON_CALL(platform.documentStore, attributesOfOpenFile)
-        .WillByDefault(Return(SystemResult<DocumentStore::OpenFileAttributes>{{{42, "/drive/mirror/found.txt"}}, {}}));
-  }
+  DocumentIdentifierTest() { platform.disk.add("/drive/mirror/found.txt").documentID = 42; }
+  static SystemResult<DocumentStore::FileID> noFile() { return {std::nullopt, {2, "none"}}; }
 };
 
 TEST_F(DocumentIdentifierTest, LeadsToTheDocumentAndClosesIt) {
-  // The device is asked for once a process, so another test may have given it.
-  EXPECT_CALL(platform.documentStore, resolveDocumentID(_, 42));
-  EXPECT_CALL(platform.documentStore, openByID(_, 77));
-  EXPECT_CALL(platform.documentStore, close(0));
+  platform.documents.resolvedFile = {DocumentStore::FileID{77}, {}};
+  platform.documents.openedHandle = SystemResult<int>{0, {}};
+  platform.documents.openAttributes = {DocumentStore::OpenFileAttributes{42, "/drive/mirror/found.txt"}, {}};
   EXPECT_EQ(vlo_URLFromDocumentID("42"), URL("/drive/mirror/found.txt"));
+  // The device is asked for once a process, so another test may have given it.
+  for (const char* call : {"resolve 42", "openByID 77", "close 0"}) EXPECT_TRUE(platform.record.has(call)) << call;
+}
+
+TEST_F(DocumentIdentifierTest, FindsTheDocumentWhereverItIs) {
+  platform.files.moveItemAtURL(URL("/drive/mirror/found.txt"), Drive.appendingPathComponent("moved.txt"));
+  EXPECT_EQ(vlo_URLFromDocumentID("42"), Drive.appendingPathComponent("moved.txt"));
 }
 
 TEST_F(DocumentIdentifierTest, EachFailedStepIsLogged) {
   EXPECT_EQ(vlo_URLFromDocumentID(std::nullopt), std::nullopt);
   EXPECT_TRUE(platform.log.has("ERROR", "vlo_URLFromDocumentID: missing document ID"));
 
-  EXPECT_CALL(platform.documentStore, close(_)).Times(2);
-  EXPECT_EQ(vlo_URLFromDocumentID("43"), std::nullopt);
-  EXPECT_TRUE(platform.log.has("ERROR", "document IDs didn't match (42 v/s 43)"));
+  platform.documents.openAttributes = {DocumentStore::OpenFileAttributes{43, "/drive/mirror/found.txt"}, {}};
+  EXPECT_EQ(vlo_URLFromDocumentID("42"), std::nullopt);
+  EXPECT_TRUE(platform.log.has("ERROR", "document IDs didn't match (43 v/s 42)"));
 
-  ON_CALL(platform.documentStore, attributesOfOpenFile)
-      .WillByDefault(Return(SystemResult<DocumentStore::OpenFileAttributes>{std::nullopt, {61, "no data"}}));
+  platform.documents.openAttributes = {std::nullopt, {61, "no data"}};
   EXPECT_EQ(vlo_URLFromDocumentID("42"), std::nullopt);
   EXPECT_TRUE(platform.log.has("ERROR", "fgetattrlist failed, error:61(no data)"));
+  EXPECT_EQ(std::count(platform.record.calls.begin(), platform.record.calls.end(), "close 3"), 2);
 
-  ON_CALL(platform.documentStore, openByID).WillByDefault(Return(SystemResult<int>{std::nullopt, {13, "denied"}}));
+  platform.documents.openedHandle = {std::nullopt, {13, "denied"}};
   EXPECT_EQ(vlo_URLFromDocumentID("42"), std::nullopt);
   EXPECT_TRUE(platform.log.has("ERROR", "openbyid_np failed, errno:13(denied)"));
 
-  ON_CALL(platform.documentStore, resolveDocumentID)
-      .WillByDefault(Return(SystemResult<DocumentStore::FileID>{std::nullopt, {2, "none"}}));
+  platform.documents.resolvedFile = noFile();
   EXPECT_EQ(vlo_URLFromDocumentID("42"), std::nullopt);
   EXPECT_TRUE(platform.log.has("ERROR", "TBLibraryResolveDocumentId2 failed, errno:2(none)"));
 }
 
 TEST_F(DocumentIdentifierTest, TextWithoutLeadingDigitsIsZero) {
-  EXPECT_CALL(platform.documentStore, resolveDocumentID(_, 0));
   vlo_URLFromDocumentID("x42");
+  EXPECT_TRUE(platform.record.has("resolve 0"));
 }
 
 }  // namespace

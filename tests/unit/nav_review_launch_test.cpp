@@ -63,7 +63,7 @@ TEST_F(NavReviewLaunchTest, ALinkToABookmarkShowsItsDocument) {
 
 TEST_F(NavReviewLaunchTest, ALinkToABookmarkOfNothingIsRefusedByTheWarp) {
   const URL bookmark = addFile("Plans/away.vaelobookmark");
-  cloud.bookmarks.emplace(bookmark.path(), URL("/"));
+  cloud.bookmarks.emplace(bookmark.path(), Error{FileErrorDomain, FileErrorCode::NoSuchFile, {}, "gone", {}});
   launch();
   presentSomething();
   EXPECT_FALSE(delegate->applicationOpenURLOptions("vaelodriveapp:" + bookmark.path(), {}));
@@ -78,7 +78,8 @@ TEST_F(NavReviewLaunchTest, EveryOtherRouteNeedsTheNavControllerToo) {
   delegate->rootWindow()->setRootViewController(root);
   recentDocument({{RecentDocumentURLKey, archiveURL(document)}});
   EXPECT_TRUE(continueActivity(SearchResultActivityType, {{SearchResultIdentifierKey, "42"}}));
-  EXPECT_TRUE(continueActivity(Settings::batonVaeloActivityType(), {{UserActivityDocumentURLKey, document.path()}}));
+  EXPECT_TRUE(
+      continueActivity(Settings::batonVaeloActivityType(), {{UserActivityDocumentURLKey, bookmarkableString(document)}}));
   runAllQueues();
   EXPECT_TRUE(logged("INFO", "Shortcut recent document: " + document.absoluteString()));
   EXPECT_TRUE(logged("INFO", "Baton document URL: " + document.absoluteString()));
@@ -117,10 +118,8 @@ TEST_F(NavReviewLaunchTest, ASearchResultWithoutAnIdentifierIsAnError) {
 }
 
 TEST_F(NavReviewLaunchTest, ASearchResultThatIsNotDownloadedIsShownByItsLogicalURL) {
-  const URL promise = addFile("Plans/.c.txt.vlopromise");
-  const URL logical = addFile("Plans/c.txt");
-  giveDocumentID(promise, 43);
-  cloud.promises.emplace(promise.path(), logical);
+  const URL logical = addPromise("Plans/c.txt");
+  giveDocumentID(logical, 43);
   launch();
   EXPECT_TRUE(continueActivity(SearchResultActivityType, {{SearchResultIdentifierKey, "43"}}));
   runMainQueue();
@@ -130,7 +129,8 @@ TEST_F(NavReviewLaunchTest, ASearchResultThatIsNotDownloadedIsShownByItsLogicalU
 
 TEST_F(NavReviewLaunchTest, ABatonDocumentIsShownOnTheMainQueueNotWhereItIsDecoded) {
   launch();
-  EXPECT_TRUE(continueActivity(Settings::batonVaeloActivityType(), {{UserActivityDocumentURLKey, document.path()}}));
+  EXPECT_TRUE(
+      continueActivity(Settings::batonVaeloActivityType(), {{UserActivityDocumentURLKey, bookmarkableString(document)}}));
   EXPECT_TRUE(logged("INFO", "Baton document URL: " + document.absoluteString()));
   EXPECT_EQ(previewed(), std::nullopt);
   runMainQueue();
@@ -138,7 +138,7 @@ TEST_F(NavReviewLaunchTest, ABatonDocumentIsShownOnTheMainQueueNotWhereItIsDecod
 }
 
 TEST_F(NavReviewLaunchTest, DecodingABatonBookmarkDoesNotKeepTheDelegate) {
-  Platform::install(&original);  // its provider answers later
+  memory.provider.answersAtOnce = false;
   const std::string bookmark = bookmarkableString(document);
   for (const std::string& text : {bookmark, std::string("?")}) {
     launch();

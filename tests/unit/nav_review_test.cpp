@@ -341,9 +341,8 @@ TEST_F(NavReviewTest, TheFormerMoreActionIsAnErrorThatNeverCompletes) {
 // Warps.
 
 TEST_F(NavReviewTest, AWarpToAPromiseGoesToTheItemItStandsFor) {
-  const URL promise = addFile("Plans/.c.txt.vlopromise");
-  const URL logical = addFile("Plans/c.txt");
-  cloud.promises.emplace(promise.path(), logical);
+  const URL logical = addPromise("Plans/c.txt");
+  const URL promise = cloud.physicalURL(logical);
   loadNav();
   EXPECT_TRUE(nav->warpToNewURLPreviewMode(promise, 0));
   EXPECT_EQ(previewed(), logical);

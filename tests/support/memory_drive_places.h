@@ -1,0 +1,13 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include "platform/url.h"
+
+namespace vaelo {
+
+/// Where the drive in memory is.
+inline const URL Mirror("/drive/mirror", true);
+inline const URL Drive("/drive/mirror/com~marrow~Kestrel", true);
+inline constexpr const char* DriveIdentifier = "com~marrow~Kestrel";
+
+}  // namespace vaelo

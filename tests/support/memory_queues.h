@@ -1,0 +1,34 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <memory>
+
+#include "tests/support/memory_dispatch_queue.h"
+#include "tests/support/memory_operation_queue.h"
+#include "tests/support/memory_timer.h"
+
+namespace vaelo {
+
+/// Time and threads without threads: everything runs when the test advances the clock.
+class MemoryQueues : public Queues {
+ public:
+  explicit MemoryQueues(std::shared_ptr<MemoryClock> clock) : clock_(std::move(clock)), main_(clock_, "main") {}
+  DispatchQueue& main() override { return main_; }
+  std::shared_ptr<DispatchQueue> makeSerialQueue(const std::string& label) override {
+    return std::make_shared<MemoryDispatchQueue>(clock_, label);
+  }
+  std::shared_ptr<OperationQueue> makeOperationQueue(const std::string& name, QualityOfService quality) override {
+    return std::make_shared<MemoryOperationQueue>(clock_, name, quality);
+  }
+  std::unique_ptr<TimerSource> makeTimer(std::shared_ptr<DispatchQueue> queue, std::chrono::nanoseconds interval,
+                                         std::chrono::nanoseconds, Block handler) override {
+    return std::make_unique<MemoryTimer>(queue ? std::move(queue) : makeSerialQueue("timer"), interval, std::move(handler));
+  }
+  Date now() override { return clock_->date(); }
+
+ private:
+  std::shared_ptr<MemoryClock> clock_;
+  MemoryDispatchQueue main_;
+};
+
+}  // namespace vaelo
