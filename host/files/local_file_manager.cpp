@@ -31,9 +31,9 @@ bool isSameItem(const std::string& a, const std::string& b) {
 
 bool LocalFileManager::fileExistsAtPath(const std::string& path, bool* isDirectory) {
   struct stat info {};
-  if (stat(path.c_str(), &info) != 0) return false;
-  if (isDirectory) *isDirectory = S_ISDIR(info.st_mode);
-  return true;
+  const bool exists = stat(path.c_str(), &info) == 0;
+  if (isDirectory) *isDirectory = exists && S_ISDIR(info.st_mode);
+  return exists;
 }
 
 Result<FileAttributes> LocalFileManager::attributesOfItemAtPath(const std::string& path) {

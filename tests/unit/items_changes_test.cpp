@@ -215,7 +215,8 @@ TEST_F(FileChangesTest, attributesAreLoggedWithTheirAge) {
                 "DEBUG Date Modified: " + Value(*attributes.modificationDate).description() + " (-30.000000 seconds ago)",
                 "DEBUG Size: 12 bytes"}));
   FileUtils::logFileAttributes("/nowhere");
-  EXPECT_TRUE(logged("ERROR", "Cannot get attributes of /nowhere: " + world.files.attributesOfItemAtPath("/nowhere").error->description()));
+  EXPECT_TRUE(logged(
+      "ERROR", "Cannot get attributes of /nowhere: " + world.files.attributesOfItemAtPath("/nowhere").error->description()));
 }
 
 TEST_F(FileChangesTest, theDumpDoesNothing) {
