@@ -192,7 +192,7 @@ class HostContractPlatform : public ContractPlatform {
   LocalFileProvider provider_{cloud_.layout(), cloud_.index(), queues_};
   LocalResourceValues values_{cloud_.layout(), cloud_.index(), types_};
   LocalFileCoordination coordination_{data_ + "/coordination.lock"};
-  DriveUserActivities activities_{cloud_.layout()};
+  DriveUserActivities activities_{cloud_.layout(), log_, queues_};
   std::unique_ptr<IniPreferences> preferences_ = std::make_unique<IniPreferences>(preferencesFile(), log_);
 };
 

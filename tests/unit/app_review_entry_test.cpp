@@ -179,16 +179,17 @@ TEST_F(AppReviewEntryTest, aSearchResultThatIsUnknownLeavesWhatIsPresented) {
 TEST_F(AppReviewEntryTest, aContinuedDocumentIsPreviewedWhateverWasShown) {
   launch();
   showDetails();
-  continueActivity(Settings::batonVaeloActivityType(), {{UserActivityDocumentURLKey, document.path()}});
+  const std::string bookmark = bookmarkableString(document);
+  continueActivity(Settings::batonVaeloActivityType(), {{UserActivityDocumentURLKey, bookmark}});
   EXPECT_THAT(userActions(), ElementsAre("Baton: Open Document"));
-  EXPECT_LT(lineOf("================= Baton: Open Document"), lineOf("Baton document bookmark: " + document.path()));
+  EXPECT_LT(lineOf("================= Baton: Open Document"), lineOf("Baton document bookmark: " + bookmark));
   runMainQueue();
   EXPECT_EQ(previewed(), document);
   EXPECT_EQ(nav->itemManager()->mode(), 0);
 }
 
 TEST_F(AppReviewEntryTest, aContinuedDocumentWithoutABookmarkIsAnError) {
-  Platform::install(&original);
+  memory.provider.answersAtOnce = false;
   launch();
   presentSomething();
   EXPECT_TRUE(continueActivity(Settings::batonVaeloActivityType()));

@@ -145,8 +145,9 @@ TEST_F(AppReviewStackTest, theApplicationOfALinksDocumentOpensIt) {
   EXPECT_EQ(openingPresenter(), topList());
 }
 
-TEST_F(AppReviewStackTest, aLinkToALinkStandsForTheSecondLink) {
-  const URL second = addLink("onward", document);
+TEST_F(AppReviewStackTest, aLinkToAnAliasStandsForTheAlias) {
+  const URL second = addFile("onward.desktop");
+  memory.disk.items.at(second.path()).aliasTarget = document;
   const URL first = addLink("shortcut", second);
   loadNav();
   choose(first);
