@@ -120,7 +120,17 @@ class LocalFileCoordinator : public FileCoordinator {
   FilePresenter* presenter_;
 };
 
-LocalFileCoordination::LocalFileCoordination(std::string lockFile) : lockFile_(std::move(lockFile)) {}
+LocalFileCoordination::LocalFileCoordination(std::string lockFile)
+    : lockFile_(std::move(lockFile)), presenters_([this](const std::string& path) { return isBeingWritten(URL(path)); }) {}
+
+bool LocalFileCoordination::isBeingWritten(const URL& item) {
+  const std::lock_guard lock(mutex_);
+  return std::any_of(accesses_.begin(), accesses_.end(), [&](const Access* access) {
+    return access->writes && access->underWay && std::any_of(access->urls.begin(), access->urls.end(), [&](const URL& url) {
+             return url.isInside(item) || item.isInside(url);
+           });
+  });
+}
 
 std::unique_ptr<FileCoordinator> LocalFileCoordination::makeCoordinator(FilePresenter* presenter) {
   return std::make_unique<LocalFileCoordinator>(*this, presenter);

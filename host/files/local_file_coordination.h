@@ -34,14 +34,15 @@ class LocalFileCoordination : public FileCoordination {
   struct Access;
   class Turn;
 
+  bool isBeingWritten(const URL& item);
   bool waitsForItself(const Access& access) const;
   std::vector<const Access*> obstaclesOf(const Access& access) const;
 
   const std::string lockFile_;
-  PresenterList presenters_;  // has its own lock
-  std::mutex mutex_;          // guards all below
+  std::mutex mutex_;  // guards the two below
   std::condition_variable changed_;
   std::vector<const Access*> accesses_;  // waiting and under way, in the order in which they came
+  PresenterList presenters_;             // has its own lock; last, since it looks at the disk from a thread of its own
 };
 
 }  // namespace vaelo

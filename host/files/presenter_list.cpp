@@ -12,7 +12,8 @@ struct PresenterList::Registration {
   std::condition_variable answered;
   FilePresenter* presenter = nullptr;  // null once removed
   std::shared_ptr<OperationQueue> queue;
-  int questions = 0;  // being asked, on any thread, where it is; the removal waits for those
+  ItemWatcher::ItemRef item;  // null while it presents nothing
+  int questions = 0;          // being asked, on any thread, where it is; the removal waits for those
 };
 
 namespace {
@@ -30,8 +31,56 @@ void PresenterList::add(FilePresenter& presenter) {
   auto registration = std::make_shared<Registration>();
   registration->presenter = &presenter;
   registration->queue = presenter.presentedItemOperationQueue();
-  const std::lock_guard lock(mutex_);
-  registrations_.push_back(std::move(registration));
+  {
+    const std::lock_guard lock(mutex_);
+    registrations_.push_back(registration);
+  }
+  if (const std::optional<URL> url = presenter.presentedItemURL()) watchDisk(registration, presenter, *url);
+}
+
+void PresenterList::watchDisk(const std::shared_ptr<Registration>& registration, const FilePresenter& presenter,
+                              const URL& url) {
+  Left left;
+  {
+    const std::lock_guard lock(mutex_);
+    left = std::exchange(left_, {});
+  }
+  const bool comesBack = left.item && left.presenter == &presenter && left.path == url.path();
+  if (left.item && !comesBack) watcher_.unwatch(left.item);
+  const ItemWatcher::ItemRef item = comesBack ? left.item : watcher_.watch(url.path(), hearing(registration));
+  bool stays = false;
+  {
+    const std::lock_guard lock(registration->mutex);
+    stays = registration->presenter != nullptr;
+    if (stays) registration->item = item;
+  }
+  if (!stays) return watcher_.unwatch(item);
+  if (comesBack) watcher_.resume(item, hearing(registration));
+}
+
+ItemWatcher::Heard PresenterList::hearing(const std::shared_ptr<Registration>& registration) {
+  return [weak = std::weak_ptr(registration)](const ItemNews& news) {
+    if (const auto alive = weak.lock()) tellNews(alive, news);
+  };
+}
+
+void PresenterList::tellNews(const std::shared_ptr<Registration>& registration, const ItemNews& news) {
+  const FilePresenter::Completion nobodyWaits = [](const std::optional<Error>&) {};
+  if (news.deleted) {
+    return tell(registration, [nobodyWaits](FilePresenter& presenter) {
+      presenter.accommodatePresentedItemDeletionWithCompletionHandler(nobodyWaits);
+    });
+  }
+  if (news.movedTo) {
+    tell(registration,
+         [place = URL(*news.movedTo)](FilePresenter& presenter) { presenter.presentedItemDidMoveToURL(place); });
+  }
+  if (news.changed) tell(registration, [](FilePresenter& presenter) { presenter.presentedItemDidChange(); });
+  for (const std::string& path : news.deletedInside) {
+    tell(registration, [nobodyWaits, place = URL(path)](FilePresenter& presenter) {
+      presenter.accommodatePresentedSubitemDeletionAtURL(place, nobodyWaits);
+    });
+  }
 }
 
 void PresenterList::remove(FilePresenter& presenter) {
@@ -48,13 +97,29 @@ void PresenterList::remove(FilePresenter& presenter) {
   }
   // The queue goes after the lock: it may be the last reference.
   std::shared_ptr<OperationQueue> queue;
-  std::unique_lock lock(found->mutex);
-  found->presenter = nullptr;
-  queue.swap(found->queue);
-  found->answered.wait(lock, [&] { return found->questions == 0; });
+  ItemWatcher::ItemRef item;
+  {
+    std::unique_lock lock(found->mutex);
+    found->presenter = nullptr;
+    queue.swap(found->queue);
+    item.swap(found->item);
+    found->answered.wait(lock, [&] { return found->questions == 0; });
+  }
+  if (item) keepForReturn(presenter, item);
 }
 
-std::vector<PresenterList::Shown> PresenterList::shown(const FilePresenter* but) {
+void PresenterList::keepForReturn(const FilePresenter& presenter, const ItemWatcher::ItemRef& item) {
+  watcher_.hold(item);
+  const std::string path = watcher_.pathOf(item);
+  Left before;
+  {
+    const std::lock_guard lock(mutex_);
+    before = std::exchange(left_, {&presenter, item, path});
+  }
+  if (before.item) watcher_.unwatch(before.item);
+}
+
+std::vector<PresenterList::Shown> PresenterList::shown() {
   std::vector<std::shared_ptr<Registration>> all;
   {
     const std::lock_guard lock(mutex_);
@@ -65,17 +130,19 @@ std::vector<PresenterList::Shown> PresenterList::shown(const FilePresenter* but)
     FilePresenter* presenter = nullptr;
     {
       const std::lock_guard lock(registration->mutex);
-      if (!registration->presenter || registration->presenter == but) continue;
+      if (!registration->presenter) continue;
       presenter = registration->presenter;
       ++registration->questions;
     }
     const std::optional<URL> url = presenter->presentedItemURL();
+    ItemWatcher::ItemRef item;
     {
       const std::lock_guard lock(registration->mutex);
+      item = registration->item;
       --registration->questions;
     }
     registration->answered.notify_all();
-    if (url) result.push_back({registration, *url});
+    if (url) result.push_back({registration, presenter, std::move(item), *url});
   }
   return result;
 }
@@ -98,16 +165,19 @@ void PresenterList::tell(const std::shared_ptr<Registration>& registration, std:
 }
 
 void PresenterList::itemChanged(const URL& url, const FilePresenter* but) {
-  for (const Shown& each : shown(but)) {
-    if (url.isInside(each.url))
-      tell(each.registration, [](FilePresenter& presenter) { presenter.presentedItemDidChange(); });
+  for (const Shown& each : shown()) {
+    if (!url.isInside(each.url)) continue;
+    if (each.item) watcher_.takeAsKnown(each.item);
+    if (each.presenter != but) tell(each.registration, [](FilePresenter& presenter) { presenter.presentedItemDidChange(); });
   }
 }
 
 void PresenterList::itemMoved(const URL& from, const URL& to, const FilePresenter* but) {
-  for (const Shown& each : shown(but)) {
+  for (const Shown& each : shown()) {
     if (!each.url.isInside(from)) continue;
     const URL place(to.path() + each.url.path().substr(from.path().size()), each.url.hasDirectoryPath());
+    if (each.item) watcher_.followTo(each.item, place.path());
+    if (each.presenter == but) continue;
     tell(each.registration, [place](FilePresenter& presenter) { presenter.presentedItemDidMoveToURL(place); });
   }
 }
@@ -128,9 +198,11 @@ void PresenterList::itemWillBeDeleted(const URL& url, const FilePresenter* but) 
       answers->changed.notify_all();
     });
   };
-  for (const Shown& each : shown(but)) {
+  for (const Shown& each : shown()) {
     const bool holdsIt = url.isInside(each.url) && !(url == each.url);
     if (!holdsIt && !each.url.isInside(url)) continue;
+    if (each.item && !holdsIt) watcher_.takeDeletionAsTold(each.item);
+    if (each.presenter == but) continue;
     auto pending = std::make_shared<std::shared_ptr<void>>(completion());
     tell(each.registration, [pending, holdsIt, url](FilePresenter& presenter) {
       const FilePresenter::Completion done = [pending](const std::optional<Error>&) { pending->reset(); };
