@@ -26,7 +26,7 @@ std::optional<URL> url(const std::string& text) {
 
 }  // namespace
 
-void RestorationStore::save(const Dictionary& values) {
+std::optional<Error> RestorationStore::save(const Dictionary& values) {
   const KeyFile file(g_key_file_new());
   for (const auto& [key, value] : values) {
     const std::string name = percentEncoded(key);
@@ -36,7 +36,7 @@ void RestorationStore::save(const Dictionary& values) {
       g_key_file_set_int64(file.get(), Integers, name.c_str(), value.signedValue());
     }
   }
-  saveKeyFile(path_, file.get());
+  return saveKeyFile(path_, file.get());
 }
 
 Dictionary RestorationStore::load() const {

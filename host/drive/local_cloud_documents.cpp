@@ -17,13 +17,10 @@ namespace vaelo {
 
 namespace {
 
-// Before anything looks at the data folder.
-DriveLayout preparedLayout(const std::string& dataFolder, LogSink& log) {
-  DriveLayout layout(dataFolder);
-  if (const auto error = makeLocalAccountIfAbsent(layout)) {
-    log.write(LogType::Error, "drive: can't make the local account: " + error->description());
-  }
-  return layout;
+std::optional<Error> setUp(const DriveLayout& layout, LogSink& log) {
+  std::optional<Error> error = makeLocalAccountIfAbsent(layout);
+  if (error) log.write(LogType::Error, "drive: can't make the local account: " + error->description());
+  return error;
 }
 
 bool isRegularFile(const std::string& path) {
@@ -62,7 +59,8 @@ Error cloudError(int code, const std::string& path, const std::string& reason) {
 
 LocalCloudDocuments::LocalCloudDocuments(const std::string& dataFolder, LogSink& log, Queues& queues,
                                          NotificationCenter& notifications)
-    : layout_(preparedLayout(dataFolder, log)),
+    : layout_(dataFolder),
+      setUpFailure_(setUp(layout_, log)),
       account_(layout_, log, queues, notifications),
       containers_(layout_, log),
       index_(layout_, log,

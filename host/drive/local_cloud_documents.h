@@ -37,6 +37,8 @@ class LocalCloudDocuments : public CloudDocuments {
   LocalCloudDocuments(const std::string& dataFolder, LogSink& log, Queues& queues, NotificationCenter& notifications);
 
   const DriveLayout& layout() const { return layout_; }
+  /// Why the first start could not make the account, if so.
+  const std::optional<Error>& setUpFailure() const { return setUpFailure_; }
   DocumentIndex& index() { return index_; }
 
   std::optional<UbiquityIdentityToken> ubiquityIdentityToken() override;
@@ -68,6 +70,7 @@ class LocalCloudDocuments : public CloudDocuments {
   Result<std::int64_t> freeBytes() const;
 
   DriveLayout layout_;
+  std::optional<Error> setUpFailure_;
   Account account_;
   ContainerCatalog containers_;
   DocumentIndex index_;

@@ -1,15 +1,18 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <optional>
+
 #include "host/gtk/host_screen.h"
+#include "platform/result.h"
 #include "platform/ui/view_controller.h"
 
 namespace vaelo {
 
-/// Says that no account is signed in. Main thread.
+/// Says that no account is signed in, or why none could be made. Main thread.
 class DriveUnavailableController : public ViewController, public HostScreen {
  public:
-  DriveUnavailableController();
+  explicit DriveUnavailableController(const std::optional<Error>& setUpFailure);
   ~DriveUnavailableController() override;
   std::string className() const override { return "DriveUnavailableController"; }
   GtkWidget* contentWidget() override { return page_; }

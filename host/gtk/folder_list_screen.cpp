@@ -3,6 +3,8 @@
 
 #include <adwaita.h>
 
+#include "platform/platform.h"
+
 namespace vaelo {
 
 namespace {
@@ -62,6 +64,7 @@ void FolderListScreen::build() {
   events.activated = [this](const std::string& name) { activated(*view_, name, urlOf(name)); };
   events.itemsChanged = [this] { reportItems(); };
   events.folderRemoved = [this] { folderWasRemoved(); };
+  events.refreshWanted = [this] { refresh(); };
   view_->setEvents(std::move(events));
   fill();
 }
@@ -177,9 +180,12 @@ void FolderListScreen::beginSearch() {
     gtk_stack_set_visible_child(GTK_STACK(stack_), view_->widget());
     return;
   }
-  folderSearch_.start(searchedFolders(), search_->query(), [this](std::vector<FolderEntry> entries, bool finished) {
-    if (entries.empty() && !finished) return;
-    found_.insert(found_.end(), entries.begin(), entries.end());
+  folderSearch_.start(searchedFolders(), search_->query(), [this](const FolderSearch::Report& report) {
+    for (const auto& [folder, reason] : report.unreadable) {
+      Platform::current().log.write(LogType::Default, "search: can't read " + folder + ": " + reason);
+    }
+    if (report.entries.empty() && !report.finished) return;
+    found_.insert(found_.end(), report.entries.begin(), report.entries.end());
     results_->setEntries(found_);
     gtk_stack_set_visible_child(GTK_STACK(stack_), results_->widget());
   });

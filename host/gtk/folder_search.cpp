@@ -3,6 +3,7 @@
 
 #include <chrono>
 #include <thread>
+#include <utility>
 
 #include "host/gtk/list/folder_reader.h"
 #include "host/support/glib_ptr.h"
@@ -21,8 +22,7 @@ std::string folded(const std::string& name) {
 }
 
 struct Batch {
-  std::vector<FolderEntry> entries;
-  bool finished;
+  FolderSearch::Report report;
   std::shared_ptr<std::atomic<bool>> stopped;
   std::shared_ptr<FolderSearch::Found> found;
 };
@@ -37,7 +37,10 @@ class Searching {
     for (std::size_t at = 0; at < folders.size() && !*stopped_ && count_ < MostResults; ++at) {
       const std::string folder = folders[at];
       const FolderReading reading = readFolder(folder);
-      if (!reading.snapshot) continue;
+      if (!reading.snapshot) {
+        waiting_.unreadable.emplace_back(folder, g_strerror(reading.errorNumber));
+        continue;
+      }
       for (std::size_t i = 0; i < reading.snapshot->size() && count_ < MostResults; ++i) {
         const std::string name(reading.snapshot->name(i));
         const EntryKind kind = reading.snapshot->kind(i);
@@ -54,22 +57,22 @@ class Searching {
  private:
   void add(FolderEntry entry) {
     ++count_;
-    waiting_.push_back(std::move(entry));
+    waiting_.entries.push_back(std::move(entry));
     tellIfDue();
   }
   void tellIfDue() {
     constexpr std::chrono::milliseconds interval(100);
-    if (!waiting_.empty() && std::chrono::steady_clock::now() - told_ >= interval) tell(false);
+    if (!waiting_.entries.empty() && std::chrono::steady_clock::now() - told_ >= interval) tell(false);
   }
   void tell(bool finished) {
     told_ = std::chrono::steady_clock::now();
-    auto* batch = new Batch{std::move(waiting_), finished, stopped_, found_};
-    waiting_.clear();
+    waiting_.finished = finished;
+    auto* batch = new Batch{std::exchange(waiting_, {}), stopped_, found_};
     g_main_context_invoke_full(
         nullptr, G_PRIORITY_DEFAULT,
         [](gpointer held) -> gboolean {
           auto* shown = static_cast<Batch*>(held);
-          if (!*shown->stopped) (*shown->found)(std::move(shown->entries), shown->finished);
+          if (!*shown->stopped) (*shown->found)(std::move(shown->report));
           return G_SOURCE_REMOVE;
         },
         batch, [](gpointer held) { delete static_cast<Batch*>(held); });
@@ -78,7 +81,7 @@ class Searching {
   std::string query_;
   std::shared_ptr<std::atomic<bool>> stopped_;
   std::shared_ptr<FolderSearch::Found> found_;
-  std::vector<FolderEntry> waiting_;
+  FolderSearch::Report waiting_;
   std::chrono::steady_clock::time_point told_;
   std::size_t count_ = 0;
 };

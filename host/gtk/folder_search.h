@@ -15,8 +15,14 @@ namespace vaelo {
 /// followed. Main thread.
 class FolderSearch {
  public:
-  /// Called with what was found since the last call, and whether the search is over.
-  using Found = std::function<void(std::vector<FolderEntry>, bool finished)>;
+  /// What was found since the last report.
+  struct Report {
+    std::vector<FolderEntry> entries;
+    /// Folders that were passed over, each with the system's reason.
+    std::vector<std::pair<std::string, std::string>> unreadable;
+    bool finished = false;
+  };
+  using Found = std::function<void(Report)>;
   FolderSearch() = default;
   ~FolderSearch() { stop(); }
   FolderSearch(const FolderSearch&) = delete;

@@ -131,7 +131,9 @@ int GtkApplicationLoop::commandLine(GApplicationCommandLine* line) {
   int status = 0;
   for (int i = 1; i < count; ++i) {
     if (openLink(arguments[i])) continue;
-    g_application_command_line_printerr(line, "vaelo-drive: “%s” leads to nothing in the drive.\n", arguments[i]);
+    // It goes to the other process as text, which an argument need not be.
+    const std::string shown = takeString(g_utf8_make_valid(arguments[i], -1));
+    g_application_command_line_printerr(line, "vaelo-drive: “%s” leads to nothing in the drive.\n", shown.c_str());
     status = 1;
   }
   if (first && count == 1) restore();
@@ -172,7 +174,9 @@ void GtkApplicationLoop::saveState() {
   if (!root || !delegate_->applicationShouldSaveApplicationState()) return;
   DictionaryRestorationCoder coder;
   root->encodeRestorableStateWithCoder(coder);
-  restoration_.save(coder.values());
+  if (const auto error = restoration_.save(coder.values())) {
+    Platform::current().log.write(LogType::Error, "State can't be saved: " + error->description());
+  }
 }
 
 void GtkApplicationLoop::showAbout() {

@@ -44,7 +44,9 @@ std::optional<std::vector<DocumentListControllerRef>> GtkScreens::hierarchyTo(co
   return lists;
 }
 
-ViewControllerRef GtkScreens::makeDriveUnavailable() { return std::make_shared<DriveUnavailableController>(); }
+ViewControllerRef GtkScreens::makeDriveUnavailable() {
+  return std::make_shared<DriveUnavailableController>(drive_.setUpFailure());
+}
 
 bool GtkScreens::canPreviewItem(const URL&) {
   // What the preview can't draw it shows as icon and facts, so there is nothing that it can't show.

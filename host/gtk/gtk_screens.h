@@ -3,8 +3,8 @@
 
 #include <gtk/gtk.h>
 
+#include "host/drive/local_cloud_documents.h"
 #include "host/gtk/pango_graphics.h"
-#include "platform/cloud_documents.h"
 #include "platform/ui/screen_factory.h"
 
 namespace vaelo {
@@ -14,7 +14,7 @@ class GtkWindowHost;
 /// Makes the screens of the GTK platform. Main thread.
 class GtkScreens : public ScreenFactory, private Device {
  public:
-  explicit GtkScreens(CloudDocuments& drive) : drive_(drive) {}
+  explicit GtkScreens(LocalCloudDocuments& drive) : drive_(drive) {}
   /// The application that new windows belong to.
   void setApplication(GtkApplication* application) { application_ = application; }
   /// The last window made; null before.
@@ -38,7 +38,7 @@ class GtkScreens : public ScreenFactory, private Device {
   Rect statusBarFrame() override { return {}; }
   InterfaceOrientation statusBarOrientation() override;
 
-  CloudDocuments& drive_;
+  LocalCloudDocuments& drive_;
   PangoGraphics graphics_;
   GtkApplication* application_ = nullptr;
   std::weak_ptr<GtkWindowHost> window_;

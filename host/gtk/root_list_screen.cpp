@@ -1,18 +1,24 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/root_list_screen.h"
 
+#include <utility>
+
 #include "host/gtk/list/folder_reader.h"
 #include "host/support/glib_ptr.h"
 
 namespace vaelo {
 
 void RootListScreen::fill() {
+  follow();
+  read();
+}
+
+void RootListScreen::follow() {
   const std::string folder = presentedURL()->path();
   ownFolder_.start(
       folder, [this](const FolderChanges&) { read(); }, [this] { folderWasRemoved(); });
   mirror_.start(
       URL(folder).deletingLastPathComponent().path(), [this](const FolderChanges&) { read(); }, [] {});
-  read();
 }
 
 void RootListScreen::read() {
@@ -20,8 +26,14 @@ void RootListScreen::read() {
   worker_.run([this, folder]() -> std::function<void()> {
     FolderReading reading = readFolder(folder);
     return [this, folder, reading = std::move(reading)] {
+      if (!reading.snapshot) {
+        unreadable_ = true;
+        return folderView().setUnreadable(reading.errorNumber);
+      }
+      // What couldn't be read couldn't be followed either.
+      if (std::exchange(unreadable_, false)) return fill();
       std::vector<FolderEntry> entries;
-      const std::size_t count = reading.snapshot ? reading.snapshot->size() : 0;
+      const std::size_t count = reading.snapshot->size();
       std::size_t i = 0;
       const auto add = [&] {
         const std::string name(reading.snapshot->name(i));

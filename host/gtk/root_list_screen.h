@@ -21,11 +21,13 @@ class RootListScreen : public FolderListScreen {
   std::vector<std::string> searchedFolders() const override;
 
  private:
+  void follow();
   void read();
   std::vector<FolderEntry> libraries() const;
 
   FolderMonitor ownFolder_;
   FolderMonitor mirror_;
+  bool unreadable_ = false;
   Worker worker_;
 };
 

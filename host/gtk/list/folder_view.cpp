@@ -15,6 +15,21 @@ namespace {
 constexpr guint SpinnerMilliseconds = 250;
 constexpr gint64 PullPause = G_USEC_PER_SEC;
 
+const char* reasonOf(int errorNumber) {
+  switch (errorNumber) {
+    case EACCES:
+    case EPERM:
+      return _("You don’t have the permission to see what is in it.");
+    case ENOENT:
+    case ENOTDIR:
+      return _("It is no longer there.");
+    case ELOOP:
+      return _("The links to it lead in a circle.");
+    default:
+      return g_strerror(errorNumber);
+  }
+}
+
 RowContext& contextOf(gpointer data) { return *static_cast<RowContext*>(data); }
 
 GtkListItemFactory* makeFactory(RowContext& context) {
@@ -170,6 +185,12 @@ void FolderView::setEmptyText(const std::string& title, const std::string& descr
   adw_status_page_set_description(emptyPage_, description.c_str());
 }
 
+void FolderView::setUnreadable(int errorNumber) {
+  setEntries({});
+  errorNumber_ = errorNumber;
+  showPage();
+}
+
 void FolderView::setEntries(std::vector<FolderEntry> entries) {
   ++generation_;
   monitor_.stop();
@@ -190,21 +211,27 @@ void FolderView::setFolder(const std::string& path) {
   updating_ = false;
   pending_ = {};
   model_.setSnapshot(std::make_shared<FolderSnapshot>());
-  monitor_.start(
-      path, [this](FolderChanges changes) { folderChanged(std::move(changes)); },
-      [this] {
-        if (events_.folderRemoved) events_.folderRemoved();
-      });
+  follow();
   read();
   showPage();
 }
 
+void FolderView::follow() {
+  monitor_.start(
+      folder_, [this](FolderChanges changes) { folderChanged(std::move(changes)); },
+      [this] {
+        if (events_.folderRemoved) events_.folderRemoved();
+      });
+}
+
 void FolderView::refresh() {
+  allDetailsAreOld();
   if (folder_.empty()) {
-    allDetailsAreOld();
+    if (events_.refreshWanted) events_.refreshWanted();
     return;
   }
-  allDetailsAreOld();
+  // What can't be read can't be followed either.
+  if (errorNumber_) follow();
   folderChanged({{}, true});
 }
 
@@ -275,7 +302,7 @@ void FolderView::showPage() {
   if (spinnerTimer_) g_source_remove(std::exchange(spinnerTimer_, 0));
   gtk_spinner_stop(GTK_SPINNER(spinner_));
   if (errorNumber_) {
-    adw_status_page_set_description(errorPage_, g_strerror(errorNumber_));
+    adw_status_page_set_description(errorPage_, reasonOf(errorNumber_));
     gtk_stack_set_visible_child(pages_, GTK_WIDGET(errorPage_));
   } else if (loaded_ && !model_.itemCount()) {
     gtk_stack_set_visible_child(pages_, GTK_WIDGET(emptyPage_));

@@ -32,6 +32,8 @@ struct FolderViewEvents {
   std::function<void()> folderRemoved;
   /// The folder could not be read; the view shows that as well.
   std::function<void(int errorNumber)> readFailed;
+  /// The user wants supplied entries to be looked up again.
+  std::function<void()> refreshWanted;
   /// A secondary click, a long press or the menu key on a row, at a place in `view`'s coordinates.
   std::function<void(const std::string& name, GtkWidget* view, const GdkRectangle& at)> contextRequested;
 };
@@ -59,6 +61,8 @@ class FolderView {
   void setFolder(const std::string& path);
   /// Shows these entries in this order, until another call.
   void setEntries(std::vector<FolderEntry> entries);
+  /// Instead of entries: that the folder they come from can't be read, with the system's error number.
+  void setUnreadable(int errorNumber);
   /// What the page says when there is nothing to list; the default is of an empty folder.
   void setEmptyText(const std::string& title, const std::string& description);
   /// Reads the folder and the rows' details again. Rows keep their place and selection.
@@ -94,6 +98,7 @@ class FolderView {
   void connectKeys();
   void connectContextGestures();
   void showPage();
+  void follow();
   void read();
   void folderRead(std::shared_ptr<const FolderSnapshot> next, const std::vector<Splice>& splices, int errorNumber);
   void folderChanged(FolderChanges changes);
