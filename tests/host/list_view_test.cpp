@@ -24,6 +24,7 @@ class FolderViewTest : public testing::Test {
                       .selectionChanged = [this] { ++selectionChanges_; },
                       .folderRemoved = [this] { removed_ = true; },
                       .readFailed = [this](int error) { error_ = error; },
+                      .refreshWanted = nullptr,
                       .contextRequested = nullptr});
     window_ = gtk_window_new();
     gtk_window_set_default_size(GTK_WINDOW(window_), 400, 500);

@@ -294,6 +294,14 @@ void folderRowSetItem(GtkWidget* widget, GObject* item) {
   gtk_widget_queue_draw(widget);
 }
 
+void folderRowsPart(RowContext& context) {
+  for (GtkWidget* widget : context.rows) {
+    folderRowSetItem(widget, nullptr);
+    rowOf(widget)->context = nullptr;
+  }
+  context.rows.clear();
+}
+
 GObject* folderRowItem(GtkWidget* widget) { return rowOf(widget)->item; }
 
 void folderRowItemChanged(GtkWidget* widget) {

@@ -11,7 +11,7 @@
 
 namespace vaelo {
 
-/// What all rows of a list share. Outlives them.
+/// What all rows of a list share. Outlives them, or parts from them (folderRowsPart).
 struct RowContext {
   GtkWidget* list = nullptr;  ///< the scrolled list; rows well outside of what it shows don't draw
   bool grid = false;
@@ -36,6 +36,8 @@ GObject* folderRowItem(GtkWidget* row);
 void folderRowItemChanged(GtkWidget* row);
 /// The list scrolled or grew: rows that didn't draw while far away look again.
 void folderRowsScrolled(RowContext& context);
+/// The context goes. A row that GTK still holds on to, as while it handles a press, shows nothing any more.
+void folderRowsPart(RowContext& context);
 /// The row at or above `widget`, or null.
 GtkWidget* folderRowAt(GtkWidget* widget);
 

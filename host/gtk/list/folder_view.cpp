@@ -80,8 +80,9 @@ FolderView::~FolderView() {
   if (spinnerTimer_) g_source_remove(spinnerTimer_);
   g_signal_handlers_disconnect_by_data(pages_, this);
   g_signal_handlers_disconnect_by_data(adjustment(), this);
-  // The rows hold on to the context; they go first.
+  g_signal_handlers_disconnect_by_data(list_, this);
   gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scroller_), nullptr);
+  folderRowsPart(context_);
   g_object_unref(pages_);
 }
 
