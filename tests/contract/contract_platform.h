@@ -11,8 +11,10 @@
 #include "platform/document_store.h"
 #include "platform/file_coordinator.h"
 #include "platform/file_manager.h"
+#include "platform/file_progress.h"
 #include "platform/file_provider.h"
 #include "platform/formatting.h"
+#include "platform/launch_services.h"
 #include "platform/notifications.h"
 #include "platform/preferences.h"
 #include "platform/type_identifiers.h"
@@ -57,6 +59,8 @@ class ContractPlatform {
   virtual TypeIdentifiers& types() = 0;
   virtual CharacterClasses& characters() = 0;
   virtual UserActivities& activities() = 0;
+  virtual FileProgress& progress() = 0;
+  virtual LaunchServices& launch() = 0;
 
   virtual std::string mirror() const = 0;
   virtual std::string outside() const = 0;  ///< a folder that is not in the drive
@@ -76,6 +80,8 @@ class ContractPlatform {
   /// Another program's rename, which no service hears of.
   virtual void renameBehind(const std::string& from, const std::string& to) = 0;
   virtual void setAccount(std::optional<std::string> token) = 0;
+  /// Another program has so many bytes of an item that is not downloaded; the item is there with the last of them.
+  virtual void transfer(const std::string& path, std::int64_t completed, std::int64_t total) = 0;
   /// Preferences as after a new start.
   virtual Preferences& preferencesAfterRestart() = 0;
 

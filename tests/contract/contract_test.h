@@ -3,6 +3,10 @@
 
 #include <gtest/gtest.h>
 
+#include <functional>
+#include <memory>
+#include <mutex>
+#include <optional>
 #include <string>
 
 #include "tests/contract/contract_platform.h"
@@ -19,6 +23,27 @@ class ContractTest : public ::testing::TestWithParam<const char*> {
     return URL(platform->outside() + "/" + name, isFolder);
   }
   bool isThere(const URL& url) { return platform->values().promisedItemIsReachable(url); }
+
+  /// What an operation answers on whatever thread; nothing when it never does.
+  template <typename T>
+  std::optional<T> answerOf(const std::function<void(std::function<void(T)>)>& ask) {
+    struct Answer {
+      std::mutex mutex;
+      std::optional<T> value;  // guarded by mutex
+    };
+    const auto answer = std::make_shared<Answer>();
+    ask([answer](T value) {
+      const std::lock_guard lock(answer->mutex);
+      EXPECT_FALSE(answer->value) << "answered twice";
+      answer->value = std::move(value);
+    });
+    platform->until([&] {
+      const std::lock_guard lock(answer->mutex);
+      return answer->value.has_value();
+    });
+    const std::lock_guard lock(answer->mutex);
+    return answer->value;
+  }
 
   std::unique_ptr<ContractPlatform> platform;
 };

@@ -8,8 +8,10 @@
 #include <fstream>
 #include <stdexcept>
 
+#include "host/desktop/gio_launch_services.h"
 #include "host/drive/alias_file.h"
 #include "host/drive/bookmark_file.h"
+#include "host/drive/drive_file_progress.h"
 #include "host/drive/drive_user_activities.h"
 #include "host/drive/local_cloud_documents.h"
 #include "host/drive/local_document_store.h"
@@ -86,6 +88,8 @@ class HostContractPlatform : public ContractPlatform {
   TypeIdentifiers& types() override { return types_; }
   CharacterClasses& characters() override { return characters_; }
   UserActivities& activities() override { return activities_; }
+  FileProgress& progress() override { return progress_; }
+  LaunchServices& launch() override { return launch_; }
 
   std::string mirror() const override { return data_ + "/mirror"; }
   std::string outside() const override { return root_.path() + "/outside"; }
@@ -156,6 +160,13 @@ class HostContractPlatform : public ContractPlatform {
                                              "\nSignedIn=" + (token ? "true" : "false") + "\n");
     fs::rename(root_.path() + "/account.new", data_ + "/account.ini");
   }
+  void transfer(const std::string& path, std::int64_t completed, std::int64_t total) override {
+    const std::string partial = DriveFileProgress::partialPathFor(path);
+    write(partial, std::string(static_cast<std::size_t>(completed), 'x'));
+    if (completed < total) return;
+    fs::rename(partial, path);
+    fs::remove(promisePathFor(path));
+  }
   bool until(const std::function<bool()>& done) override {
     bool late = false;
     const guint deadline = g_timeout_add_seconds(
@@ -193,6 +204,8 @@ class HostContractPlatform : public ContractPlatform {
   LocalResourceValues values_{cloud_.layout(), cloud_.index(), types_};
   LocalFileCoordination coordination_{data_ + "/coordination.lock"};
   DriveUserActivities activities_{cloud_.layout(), log_, queues_};
+  DriveFileProgress progress_;
+  GioLaunchServices launch_;
   std::unique_ptr<IniPreferences> preferences_ = std::make_unique<IniPreferences>(preferencesFile(), log_);
 };
 

@@ -24,6 +24,8 @@ class MemoryContractPlatform : public ContractPlatform {
   TypeIdentifiers& types() override { return memory_.types; }
   CharacterClasses& characters() override { return memory_.characters; }
   UserActivities& activities() override { return memory_.userActivities; }
+  FileProgress& progress() override { return memory_.fileProgress; }
+  LaunchServices& launch() override { return memory_.launch; }
 
   std::string mirror() const override { return Mirror.path(); }
   std::string outside() const override { return "/outside"; }
@@ -65,6 +67,14 @@ class MemoryContractPlatform : public ContractPlatform {
   }
   void setAccount(std::optional<std::string> token) override {
     memory_.cloud.setAccount(token ? std::optional(UbiquityIdentityToken{*token}) : std::nullopt);
+  }
+  void transfer(const std::string& path, std::int64_t completed, std::int64_t total) override {
+    memory_.queues.main().async([this, path, completed, total] {
+      memory_.fileProgress.transfer(URL(path), completed, total);
+      if (completed < total) return;
+      memory_.disk.items[path].isPromise = false;
+      memory_.fileProgress.finish(URL(path));
+    });
   }
   bool until(const std::function<bool()>& done) override {
     while (!done()) {

@@ -5,7 +5,7 @@
 
 namespace vaelo {
 
-/// Character classes of ASCII; of the rest it knows what is UTF-8.
+/// Character classes of ASCII and a little more; of the rest it knows what is UTF-8.
 class MemoryCharacters : public CharacterClasses {
  public:
   /// Bytes that a test wants to be illegal too.

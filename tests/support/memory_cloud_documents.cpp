@@ -10,6 +10,7 @@ namespace vaelo {
 namespace {
 
 constexpr int NotInDrive = 7;
+constexpr int NoAccount = 8;
 
 }  // namespace
 
@@ -106,12 +107,16 @@ URL MemoryCloudDocuments::realPathURL(const URL& url) {
 bool MemoryCloudDocuments::isExternalDocumentReference(const URL& url) {
   if (bookmarks.contains(url.path())) return true;
   const MemoryItem* item = disk_.physicalItem(url.path());
-  return url.lastPathComponent().ends_with(".vaelobookmark") && item && item->type() == FileType::Regular;
+  return !url.pathExtension().empty() && url.lastPathComponent().ends_with(".vaelobookmark") && item &&
+         item->type() == FileType::Regular;
 }
 
 Result<URL> MemoryCloudDocuments::resolveExternalDocumentReference(const URL& url) {
   if (const auto chosen = bookmarks.find(url.path()); chosen != bookmarks.end()) return chosen->second;
   const MemoryItem* item = disk_.physicalItem(url.path());
+  if (!url.lastPathComponent().ends_with(".vaelobookmark")) {
+    return memoryError(FileErrorCode::ReadUnknown, url.path(), "It is no bookmark");
+  }
   if (!item) return noSuchItem(url.path(), FileErrorCode::ReadNoSuchFile);
   if (!item->bookmarkTarget) return memoryError(FileErrorCode::ReadUnknown, url.path(), "It is no bookmark");
   const std::string target = item->bookmarkTarget->path();
@@ -125,7 +130,7 @@ bool MemoryCloudDocuments::isPromise(const URL& url) {
 
 URL MemoryCloudDocuments::logicalURLOfPromise(const URL& url) {
   if (const auto chosen = logicalOfPromise.find(url.path()); chosen != logicalOfPromise.end()) return chosen->second;
-  const std::string logical = MemoryDisk::logicalPath(url.path());
+  const std::string logical = disk_.logicalPath(url.path());
   return logical == url.path() ? url : URL(logical);
 }
 
@@ -145,6 +150,7 @@ Result<std::vector<std::string>> MemoryCloudDocuments::tagNames(const URL& url) 
 
 bool MemoryCloudDocuments::canMoveWithoutDownloading(const CloudContainer& from, const CloudContainer& to) {
   record_.calls.push_back("canMove " + from.identifier() + " " + to.identifier());
+  if (movesAreFree) return from.identifier() != to.identifier();
   return movableTo.contains(to.identifier()) || movable.contains({from.identifier(), to.identifier()});
 }
 
@@ -155,7 +161,10 @@ std::optional<Error> MemoryCloudDocuments::evict(const URL& url) {
 
 void MemoryCloudDocuments::fetchQuota(std::function<void(Result<std::int64_t>)> done) {
   ++quotaFetches;
-  done(quota);
+  if (account) return done(quota);
+  Error error = memoryError(NoAccount, "", "Nobody is signed in");
+  error.domain = CloudDocumentsErrorDomain;
+  done(error);
 }
 
 }  // namespace vaelo

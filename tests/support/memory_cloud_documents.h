@@ -10,6 +10,7 @@
 #include "tests/support/memory_container.h"
 #include "tests/support/memory_disk.h"
 #include "tests/support/memory_drive_places.h"
+#include "tests/support/memory_error.h"
 
 namespace vaelo {
 
@@ -26,7 +27,8 @@ class MemoryCloudDocuments : public CloudDocuments {
   std::optional<UbiquityIdentityToken> account = UbiquityIdentityToken{"somebody"};
   std::shared_ptr<MemoryContainer> drive;
   std::vector<CloudContainerRef> containers;  ///< the drive's own first
-  /// Which containers' items may move without a download. By identifier of the target, or of both.
+  /// False: items move without a download only to containers in `movableTo` and between those in `movable`, by identifier.
+  bool movesAreFree = true;
   std::set<std::string> movableTo;
   std::set<std::pair<std::string, std::string>> movable;
   Result<std::int64_t> quota{std::int64_t{4096}};
@@ -35,7 +37,8 @@ class MemoryCloudDocuments : public CloudDocuments {
   // What a test wants to go wrong, or otherwise than the disk says; by path.
   std::optional<Error> containerError;
   bool containerErrorComesWithValue = false;
-  std::optional<Error> evictError;
+  /// There is no other copy of what is in the drive.
+  std::optional<Error> evictError = memoryError(FileErrorCode::FeatureUnsupported, "", "It is not kept elsewhere");
   std::map<std::string, Result<URL>> bookmarks;
   std::map<std::string, URL> logicalOfPromise;
   std::map<std::string, URL> physicalOfLogical;

@@ -24,7 +24,10 @@ struct MemoryContainer : CloudContainer {
 
   std::string identifier() const override { return id; }
   std::string localizedName() const override { return name; }
-  std::optional<URL> documentsFolderURL() const override { return folder; }
+  std::optional<URL> documentsFolderURL() const override {
+    const bool isGone = folder && disk && !disk->hasFolder(folder->path());
+    return isGone ? std::nullopt : folder;
+  }
   std::optional<std::vector<DeclaredDocumentType>> documentTypes() const override { return types; }
   std::optional<std::string> supportedFolderLevels() const override { return levels; }
   std::vector<std::string> ownerBundleIdentifiers() const override { return owners; }

@@ -10,6 +10,8 @@ namespace {
 
 constexpr int LinkLimit = 40;
 constexpr std::string_view PromiseSuffix = ".vlopromise";
+constexpr std::string_view LongPromiseSuffix = ".vlopromise-long";
+constexpr std::size_t NameLimit = 255;
 
 std::vector<std::string> components(const std::string& path) {
   std::vector<std::string> names = URL(path).pathComponents();
@@ -116,16 +118,26 @@ bool MemoryDisk::hasFolder(const std::string& path) {
 }
 
 bool MemoryDisk::isPromiseName(const std::string& name) {
-  return name.size() > PromiseSuffix.size() + 1 && name.front() == '.' && name.ends_with(PromiseSuffix);
+  const bool isShort = name.size() > PromiseSuffix.size() + 1 && name.ends_with(PromiseSuffix);
+  return name.front() == '.' &&
+         (isShort || (name.size() > LongPromiseSuffix.size() + 1 && name.ends_with(LongPromiseSuffix)));
 }
 
 std::string MemoryDisk::promisePath(const std::string& path) {
-  return parentOf(path) + "/." + nameOf(path) + std::string(PromiseSuffix);
+  const std::string name = nameOf(path);
+  if (name.size() + PromiseSuffix.size() + 1 <= NameLimit) return parentOf(path) + "/." + name + std::string(PromiseSuffix);
+  return parentOf(path) + "/." + std::to_string(std::hash<std::string>()(name)) + std::string(LongPromiseSuffix);
 }
 
-std::string MemoryDisk::logicalPath(const std::string& path) {
+std::string MemoryDisk::logicalPath(const std::string& path) const {
   const std::string name = nameOf(path);
   if (!isPromiseName(name)) return path;
+  if (name.ends_with(LongPromiseSuffix)) {
+    const auto found = std::find_if(items.begin(), items.end(), [where = place(path)](const auto& entry) {
+      return entry.second.isPromise && promisePath(entry.first) == where;
+    });
+    return found == items.end() ? path : found->first;
+  }
   return parentOf(path) + "/" + name.substr(1, name.size() - 1 - PromiseSuffix.size());
 }
 

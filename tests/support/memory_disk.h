@@ -39,9 +39,10 @@ class MemoryDisk {
   bool hasFolder(const std::string& path);
 
   static bool isPromiseName(const std::string& name);
+  /// Names that would be too long are made from a hash; only what is on the disk tells what they stand for.
   static std::string promisePath(const std::string& logicalPath);
   /// The path itself when it is no promise's.
-  static std::string logicalPath(const std::string& path);
+  std::string logicalPath(const std::string& path) const;
 
   /// The item's identifier, made when it has none.
   std::int64_t documentIDOf(MemoryItem& item);

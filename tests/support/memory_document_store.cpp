@@ -15,6 +15,7 @@ SystemResult<DocumentStore::FileID> MemoryDocumentStore::resolveDocumentID(Devic
   devices.insert(on);
   record_.calls.push_back("resolve " + std::to_string(documentID));
   if (resolvedFile) return *resolvedFile;
+  if (on != device) return {std::nullopt, {ESTALE, "Stale file handle"}};
   if (!disk_.pathOfDocument(static_cast<std::int64_t>(documentID))) return {std::nullopt, {ENOENT, "No such file"}};
   return {documentID, {}};
 }
@@ -23,6 +24,7 @@ SystemResult<int> MemoryDocumentStore::openByID(Device on, FileID file) {
   devices.insert(on);
   record_.calls.push_back("openByID " + std::to_string(file));
   if (openedHandle) return *openedHandle;
+  if (on != device) return {std::nullopt, {ENOENT, "No such file"}};
   if (!disk_.pathOfDocument(static_cast<std::int64_t>(file))) return {std::nullopt, {ENOENT, "No such file"}};
   int handle = 3;
   while (open_.contains(handle)) ++handle;
@@ -37,8 +39,7 @@ SystemResult<DocumentStore::OpenFileAttributes> MemoryDocumentStore::attributesO
   if (found == open_.end()) return {std::nullopt, {EBADF, "Bad file descriptor"}};
   const std::optional<std::string> path = disk_.pathOfDocument(found->second);
   if (!path) return {std::nullopt, {ENOENT, "No such file"}};
-  const bool isPromise = disk_.items[*path].isPromise;
-  return {OpenFileAttributes{found->second, isPromise ? MemoryDisk::promisePath(*path) : *path}, {}};
+  return {OpenFileAttributes{found->second, *path}, {}};
 }
 
 void MemoryDocumentStore::close(int handle) {

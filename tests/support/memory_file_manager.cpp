@@ -58,7 +58,7 @@ std::optional<Error> MemoryFileManager::createDirectoryAtURL(const URL& url) {
 std::optional<Error> MemoryFileManager::removeItemAtURL(const URL& url) {
   record_.calls.push_back("remove " + url.path());
   if (removeError) return removeError;
-  const std::string path = disk_.logicalItem(url.path()) ? url.path() : MemoryDisk::logicalPath(url.path());
+  const std::string path = disk_.logicalItem(url.path()) ? url.path() : disk_.logicalPath(url.path());
   if (!isThere(path)) return noSuchItem(url.path());
   if (disk_.isLocked(path)) return memoryError(FileErrorCode::WriteNoPermission, url.path());
   disk_.remove(disk_.place(path));
@@ -68,7 +68,7 @@ std::optional<Error> MemoryFileManager::removeItemAtURL(const URL& url) {
 std::optional<Error> MemoryFileManager::moveItemAtURL(const URL& source, const URL& destination) {
   record_.calls.push_back("move " + source.path() + " " + destination.path());
   if (moveError) return moveError;
-  const std::string path = disk_.logicalItem(source.path()) ? source.path() : MemoryDisk::logicalPath(source.path());
+  const std::string path = disk_.logicalItem(source.path()) ? source.path() : disk_.logicalPath(source.path());
   if (!isThere(path)) return moveFailure(noSuchItem(source.path()), destination);
   const std::string from = disk_.place(path);
   const std::string to = disk_.place(destination.path());

@@ -7,6 +7,7 @@
 #include <memory>
 #include <string>
 #include <utility>
+#include <vector>
 
 #include "platform/file_progress.h"
 
@@ -34,7 +35,7 @@ class MemoryProgress : public Progress {
   }
   void tell(const std::string& keyPath) {
     for (const auto& [_, weak] : std::map(observers_)) {
-      if (const auto observer = weak.lock()) observer->changed(keyPath);
+      if (const auto observer = weak.lock(); observer && observer->keyPath == keyPath) observer->changed(keyPath);
     }
   }
   std::size_t observerCount() const {
@@ -68,6 +69,25 @@ class MemoryFileProgress : public FileProgress {
     for (auto at = first; at != last; ++at) count += at->second.expired() ? 0 : 1;
     return count;
   }
+  /// As when another program has so many bytes of a document: published with the first of them.
+  void transfer(const URL& url, std::int64_t completed, std::int64_t total) {
+    Transfer& transfer = transfers_[url.path()];
+    const bool isNew = !transfer.progress;
+    if (isNew) transfer.progress = std::make_shared<MemoryProgress>();
+    transfer.progress->setUnits(completed, total);
+    if (isNew) publishToAll(url, transfer);
+  }
+  /// The document is there.
+  void finish(const URL& url) {
+    const auto found = transfers_.find(url.path());
+    if (found == transfers_.end()) return;
+    const Transfer transfer = std::move(found->second);
+    transfers_.erase(found);
+    transfer.progress->setUnits(transfer.progress->totalUnits(), transfer.progress->totalUnits());
+    for (const auto& [weak, withdrawn] : transfer.withdrawals) {
+      if (!weak.expired() && withdrawn) withdrawn();
+    }
+  }
   /// What the first subscriber returned for the progress's withdrawal; empty without a subscriber.
   Withdrawn publish(const URL& url, std::shared_ptr<Progress> progress) {
     const auto [first, last] = subscriptions_.equal_range(url.path());
@@ -78,7 +98,20 @@ class MemoryFileProgress : public FileProgress {
   }
 
  private:
+  struct Transfer {
+    std::shared_ptr<MemoryProgress> progress;
+    std::vector<std::pair<std::weak_ptr<Published>, Withdrawn>> withdrawals;
+  };
+  void publishToAll(const URL& url, Transfer& transfer) {
+    const std::multimap<std::string, std::weak_ptr<Published>> all = subscriptions_;
+    const auto [first, last] = all.equal_range(url.path());
+    for (auto at = first; at != last; ++at) {
+      if (const auto told = at->second.lock()) transfer.withdrawals.emplace_back(at->second, (*told)(transfer.progress));
+    }
+  }
+
   std::multimap<std::string, std::weak_ptr<Published>> subscriptions_;
+  std::map<std::string, Transfer> transfers_;
 };
 
 }  // namespace vaelo

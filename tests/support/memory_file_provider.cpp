@@ -25,7 +25,7 @@ Result<std::string> MemoryFileProvider::encoded(const URL& url) {
   MemoryItem* item = disk_.logicalItem(url.path());
   if (!item) item = disk_.physicalItem(url.path());
   if (!item) return noSuchItem(url.path());
-  return std::string(Prefix) + std::to_string(disk_.documentIDOf(*item)) + ":" + *relative;
+  return std::string(Prefix) + std::to_string(disk_.documentIDOf(*item)) + ":" + percentEncoded(*relative);
 }
 
 Result<URL> MemoryFileProvider::decoded(const std::string& text) {
@@ -35,7 +35,9 @@ Result<URL> MemoryFileProvider::decoded(const std::string& text) {
   const auto [after, failure] = std::from_chars(text.data() + Prefix.size(), end, documentID);
   if (failure != std::errc() || after == end || *after != ':') return memoryError(FileErrorCode::Formatting, text);
   if (const std::optional<std::string> path = disk_.pathOfDocument(documentID)) return URL(*path);
-  const URL place = Mirror.appendingPathComponent(std::string(after + 1, end));
+  const std::optional<std::string> relative = percentDecoded(std::string_view(after + 1, end));
+  if (!relative || relative->empty()) return memoryError(FileErrorCode::Formatting, text);
+  const URL place = Mirror.appendingPathComponent(*relative);
   if (cloud_.URLIsInDriveMirror(place) && disk_.logicalItem(place.path())) return place;
   return noSuchItem(place.path());
 }

@@ -38,7 +38,8 @@ std::string MemoryFormatting::byteCount(std::uint64_t bytes, ByteCountStyle styl
   const double scale = std::pow(10, Units[at].fractionDigits);
   const std::string text = plain(std::round(number * scale) / scale);
   if (!withUnit) return text;
-  return text + " " + (bytes == 1 ? "byte" : Units[at].name);
+  const bool isGrouped = number >= 1000;
+  return (isGrouped ? text.substr(0, 1) + "," + text.substr(1) : text) + " " + (bytes == 1 ? "byte" : Units[at].name);
 }
 
 std::string MemoryFormatting::localizedDate(Date date, DateStyle dateStyle, DateStyle timeStyle) {

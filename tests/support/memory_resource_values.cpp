@@ -1,11 +1,28 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "tests/support/memory_resource_values.h"
 
+#include <algorithm>
+
+#include "tests/support/memory_characters.h"
 #include "tests/support/memory_drive_places.h"
 #include "tests/support/memory_error.h"
 #include "tests/support/memory_packages.h"
 
 namespace vaelo {
+
+namespace {
+
+/// A person reads text, whatever bytes a name has.
+std::string readableText(const std::string& name) {
+  MemoryCharacters characters;
+  if (!characters.containsIllegalCharacter(name)) return name;
+  std::string text = name;
+  std::replace_if(
+      text.begin(), text.end(), [](unsigned char c) { return c >= 0x80; }, '?');
+  return text;
+}
+
+}  // namespace
 
 std::string MemoryResourceValues::typeOf(const MemoryItem& item, const URL& url) {
   if (item.type() == FileType::SymbolicLink) return "public.symlink";
@@ -19,8 +36,9 @@ Value MemoryResourceValues::valueOf(MemoryItem& item, const URL& url, ResourceKe
   const bool isFolder = item.isFolder();
   switch (key) {
     case ResourceKey::Name:
-    case ResourceKey::LocalizedName:
       return url.lastPathComponent();
+    case ResourceKey::LocalizedName:
+      return readableText(url.lastPathComponent());
     case ResourceKey::TypeIdentifier:
       return typeOf(item, url);
     case ResourceKey::LocalizedTypeDescription: {
@@ -30,7 +48,7 @@ Value MemoryResourceValues::valueOf(MemoryItem& item, const URL& url, ResourceKe
     }
     case ResourceKey::FileSize:
     case ResourceKey::TotalFileSize:
-      return isFolder ? Value() : item.attributes.size;
+      return isFolder && !asPromise ? Value() : item.attributes.size;
     case ResourceKey::CreationDate:
       return item.attributes.creationDate ? Value(*item.attributes.creationDate) : Value();
     case ResourceKey::ContentModificationDate:
@@ -40,7 +58,7 @@ Value MemoryResourceValues::valueOf(MemoryItem& item, const URL& url, ResourceKe
     case ResourceKey::IsPackage:
       return isFolder && isMemoryPackage(url);
     case ResourceKey::IsRegularFile:
-      return item.type() == FileType::Regular;
+      return !isFolder && item.type() != FileType::SymbolicLink;
     case ResourceKey::HasHiddenExtension:
       return item.attributes.extensionHidden;
     case ResourceKey::ParentDirectoryURL:
@@ -78,7 +96,7 @@ Result<ResourceMap> MemoryResourceValues::promisedItemResourceValues(const URL& 
   if (const auto answer = promisedAnswers.find(url.path()); answer != promisedAnswers.end()) return answer->second;
   if (promisedReadError) return *promisedReadError;
   MemoryItem* item = disk_.logicalItem(url.path());
-  const std::string logical = item ? url.path() : MemoryDisk::logicalPath(url.path());
+  const std::string logical = item ? url.path() : disk_.logicalPath(url.path());
   if (!item) item = disk_.physicalItem(url.path());
   if (!item) return noSuchItem(url.path());
   if (disk_.isLocked(url.deletingLastPathComponent().path())) {

@@ -12,9 +12,17 @@ namespace vaelo {
 /// Types as small tables, which a test may change.
 class MemoryTypes : public TypeIdentifiers {
  public:
-  std::map<std::string, std::string> typeOfExtension{{"pdf", "com.adobe.pdf"},       {"png", "public.png"},
-                                                     {"jpg", "public.jpeg"},         {"txt", "public.plain-text"},
-                                                     {"mov", "org.quicktime.movie"}, {"mp3", "public.mp3"}};
+  std::map<std::string, std::string> typeOfExtension{{"pdf", "com.adobe.pdf"},
+                                                     {"png", "public.png"},
+                                                     {"jpg", "public.jpeg"},
+                                                     {"txt", "public.plain-text"},
+                                                     {"mov", "org.quicktime.movie"},
+                                                     {"mp3", "public.mp3"},
+                                                     {"bundle", "com.marrow.package"},
+                                                     {"vlopackage", "com.marrow.package"},
+                                                     {"sketchbundle", "com.marrow.package"},
+                                                     {"rtfd", "com.marrow.rtfd"},
+                                                     {"textbundle", "org.textbundle.package"}};
   /// All kinds that a type is of.
   std::map<std::string, std::set<std::string>> conformances{
       {"com.adobe.pdf", {"public.content", "public.data", "public.item"}},
@@ -24,6 +32,11 @@ class MemoryTypes : public TypeIdentifiers {
       {"org.quicktime.movie",
        {"public.movie", "public.audiovisual-content", "public.content", "public.data", "public.item"}},
       {"public.mp3", {"public.audio", "public.audiovisual-content", "public.content", "public.data", "public.item"}},
+      {"com.marrow.alias", {"public.data", "public.item"}},
+      {"com.marrow.package", {"public.directory", "public.content", "public.item"}},
+      {"com.marrow.rtfd", {"com.marrow.package", "public.directory", "public.content", "public.item"}},
+      {"org.textbundle.package", {"com.marrow.package", "public.directory", "public.content", "public.item"}},
+      {"public.symlink", {"public.item"}},
       {"public.folder", {"public.directory", "public.item"}}};
   std::map<std::string, std::string> descriptions{{"public.folder", "Folder"}};
   /// False: extensions that are not in the table have no type.

@@ -132,6 +132,7 @@ TEST_F(FileOperationsTest, TheDocumentsDirectoryIsTheFirstWithItsTildeExpanded) 
 }
 
 TEST_F(FileOperationsTest, EvictionThatFailsIsLogged) {
+  platform.cloud.evictError.reset();
   EXPECT_TRUE(FileUtils::evictDocument(Drive));
   platform.cloud.evictError = refused;
   EXPECT_FALSE(FileUtils::evictDocument(Drive));

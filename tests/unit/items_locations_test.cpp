@@ -88,6 +88,7 @@ TEST_F(LocationsTest, pathsThatCannotBeSplitAreAFormattingError) {
   for (const std::optional<URL>& folder :
        {std::optional<URL>(), std::optional(URL("/outside")), std::optional(Deep.appendingPathComponent("below"))}) {
     world.library->folder = folder;
+    if (folder) world.addFolder(*folder);
     const auto error = split(Deep);
     ASSERT_TRUE(error);
     EXPECT_EQ(error->domain, FileErrorDomain);

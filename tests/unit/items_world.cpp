@@ -9,6 +9,8 @@ ItemsWorld::ItemsWorld() {
   conformances.clear();
   descriptions.clear();
   types.makesTypes = false;
+  cloud.movesAreFree = false;
+  evictError.reset();
   characters.alsoIllegal = "\\";
   resolvedFile.value = 7;
   openedHandle.value = 7;

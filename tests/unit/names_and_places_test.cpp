@@ -144,6 +144,7 @@ TEST_F(NamesAndPlacesTest, OnlyTheDrivesOwnDesktopAndDocumentsAreSpecial) {
 }
 
 TEST_F(NamesAndPlacesTest, AMoveAcrossContainersIsJudgedByTheFirstItem) {
+  platform.cloud.movesAreFree = false;
   EXPECT_FALSE(vlo_canCrossZoneMoveURLs({}));
   EXPECT_FALSE(vlo_canCrossZoneMoveURLs({URL(DrivePath + "/a")}));
   platform.cloud.movable = {{"com~marrow~Kestrel", "org~example~Sketch"}};
