@@ -54,11 +54,12 @@ void applicationChosen(GtkDialog* dialog, int response, gpointer) {
 
 }  // namespace
 
-FactsPage::FactsPage()
+FactsPage::FactsPage(std::function<void()> arrived)
     : page_(GTK_WIDGET(g_object_ref_sink(adw_status_page_new()))),
       box_(gtk_box_new(GTK_ORIENTATION_VERTICAL, 24)),
       bar_(gtk_progress_bar_new()),
-      open_(gtk_button_new_with_label("Open With Another Application")) {
+      open_(gtk_button_new_with_label("Open With Another Application")),
+      arrived_(std::move(arrived)) {
   gtk_progress_bar_set_show_text(GTK_PROGRESS_BAR(bar_), TRUE);
   gtk_widget_set_visible(bar_, FALSE);
   gtk_box_append(GTK_BOX(box_), bar_);
@@ -70,6 +71,7 @@ FactsPage::FactsPage()
 }
 
 FactsPage::~FactsPage() {
+  stopFollowing();
   g_signal_handlers_disconnect_by_data(open_, this);
   g_object_unref(page_);
 }
@@ -77,15 +79,28 @@ FactsPage::~FactsPage() {
 bool FactsPage::isDownloaded(const URL& item) { return isHere(valuesOf(item)); }
 
 void FactsPage::showNothing() {
-  subscription_.reset();
+  stopFollowing();
   gtk_widget_set_visible(box_, FALSE);
   adw_status_page_set_title(ADW_STATUS_PAGE(page_), "Nothing to show");
   adw_status_page_set_description(ADW_STATUS_PAGE(page_), nullptr);
 }
 
 void FactsPage::show(const URL& item, const std::string& message) {
-  path_ = item.path();
+  stopFollowing();
+  showValues(item, valuesOf(item), message);
+}
+
+void FactsPage::showNotDownloaded(const URL& item) {
+  stopFollowing();
+  // Before it is looked at, so that it can't arrive unnoticed.
+  followDownload(item);
   const ResourceMap values = valuesOf(item);
+  showValues(item, values, "");
+  if (isHere(values)) downloadEnded();
+}
+
+void FactsPage::showValues(const URL& item, const ResourceMap& values, const std::string& message) {
+  path_ = item.path();
   std::string facts = textOf(values, ResourceKey::LocalizedTypeDescription);
   const auto size = values.find(ResourceKey::FileSize);
   if (size != values.end()) {
@@ -100,10 +115,32 @@ void FactsPage::show(const URL& item, const std::string& message) {
   adw_status_page_set_title(page, markupOf(name.empty() ? item.lastPathComponent() : name).c_str());
   adw_status_page_set_description(page, markupOf(facts).c_str());
   gtk_widget_set_visible(box_, TRUE);
-  gtk_widget_set_sensitive(open_, here);
+  // What is not here, or not here any more, can't be opened anywhere.
+  gtk_widget_set_visible(open_, here && values.contains(ResourceKey::LocalizedName));
   showIcon(item);
-  here ? subscription_.reset() : followDownload(item);
-  if (here) gtk_widget_set_visible(bar_, FALSE);
+}
+
+void FactsPage::stopFollowing() {
+  g_clear_handle_id(&arrival_, g_source_remove);
+  observation_.reset();
+  subscription_.reset();
+  gtk_widget_set_visible(bar_, FALSE);
+}
+
+// Told from within the subscription, which ends when the document is shown; so that waits for the next turn.
+void FactsPage::downloadEnded() {
+  observation_.reset();
+  gtk_widget_set_visible(bar_, FALSE);
+  if (arrival_ || !isDownloaded(URL(path_))) return;
+  arrival_ = g_idle_add(
+      +[](gpointer data) -> gboolean {
+        auto* self = static_cast<FactsPage*>(data);
+        self->arrival_ = 0;
+        const auto arrived = self->arrived_;
+        arrived();
+        return G_SOURCE_REMOVE;
+      },
+      this);
 }
 
 void FactsPage::showIcon(const URL& item) {
@@ -123,20 +160,25 @@ void FactsPage::followDownload(const URL& item) {
           if (const auto alive = weak.lock()) progressChanged(alive);
         });
     progressChanged(progress);
-    return FileProgress::Withdrawn([this] {
-      observation_.reset();
-      gtk_widget_set_visible(bar_, FALSE);
-    });
+    return FileProgress::Withdrawn([this] { downloadEnded(); });
   });
 }
 
 void FactsPage::progressChanged(const std::shared_ptr<Progress>& progress) {
   gtk_widget_set_visible(bar_, TRUE);
   const std::int64_t total = progress->totalUnits();
-  const double fraction = total > 0 ? static_cast<double>(progress->completedUnits()) / static_cast<double>(total) : 0;
-  gtk_progress_bar_set_fraction(GTK_PROGRESS_BAR(bar_), fraction);
-  gtk_progress_bar_set_text(GTK_PROGRESS_BAR(bar_),
-                            ("Downloading… " + std::to_string(std::lround(fraction * 100)) + "%").c_str());
+  std::string text = "Downloading… ";
+  if (total > 0) {
+    const double fraction = static_cast<double>(progress->completedUnits()) / static_cast<double>(total);
+    gtk_progress_bar_set_fraction(GTK_PROGRESS_BAR(bar_), fraction);
+    text += std::to_string(std::lround(fraction * 100)) + "%";
+  } else {
+    gtk_progress_bar_pulse(GTK_PROGRESS_BAR(bar_));
+    text += Platform::current().formatting.byteCount(static_cast<std::uint64_t>(progress->completedUnits()),
+                                                     ByteCountStyle::File);
+  }
+  gtk_progress_bar_set_text(GTK_PROGRESS_BAR(bar_), text.c_str());
+  gtk_accessible_update_property(GTK_ACCESSIBLE(bar_), GTK_ACCESSIBLE_PROPERTY_LABEL, text.c_str(), -1);
 }
 
 void FactsPage::openElsewhere() {

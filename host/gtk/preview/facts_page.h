@@ -3,10 +3,12 @@
 
 #include <adwaita.h>
 
+#include <functional>
 #include <memory>
 #include <string>
 
 #include "platform/file_progress.h"
+#include "platform/resource_values.h"
 #include "platform/url.h"
 
 namespace vaelo {
@@ -15,7 +17,8 @@ namespace vaelo {
 /// has come, and a button that opens the document elsewhere. Main thread.
 class FactsPage {
  public:
-  FactsPage();
+  /// `arrived` is called when the document that showNotDownloaded() shows has become one that is on this device.
+  explicit FactsPage(std::function<void()> arrived);
   ~FactsPage();
   FactsPage(const FactsPage&) = delete;
   FactsPage& operator=(const FactsPage&) = delete;
@@ -23,11 +26,16 @@ class FactsPage {
 
   /// `message` is a sentence, or empty.
   void show(const URL& item, const std::string& message);
+  /// The same of a document that is not on this device, with the progress of its download while there is one.
+  void showNotDownloaded(const URL& item);
   void showNothing();
   /// Fails when the document is not on this device.
   static bool isDownloaded(const URL& item);
 
  private:
+  void showValues(const URL& item, const ResourceMap& values, const std::string& message);
+  void stopFollowing();
+  void downloadEnded();
   void showIcon(const URL& item);
   void followDownload(const URL& item);
   void progressChanged(const std::shared_ptr<Progress>& progress);
@@ -38,6 +46,8 @@ class FactsPage {
   GtkWidget* bar_;
   GtkWidget* open_;
   std::string path_;
+  std::function<void()> arrived_;
+  guint arrival_ = 0;
   std::shared_ptr<void> subscription_;
   std::shared_ptr<void> observation_;
 };

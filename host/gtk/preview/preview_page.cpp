@@ -1,6 +1,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/preview/preview_page.h"
 
+#include <sys/stat.h>
+
+#include "host/drive/packages.h"
 #include "host/gtk/bar_item_widget.h"
 
 namespace vaelo {
@@ -9,6 +12,9 @@ namespace {
 
 constexpr guint LoadingNoticeAfter = 200;  // milliseconds; what is quicker needs no notice
 
+constexpr const char* NoLongerThere = "This document is no longer there.";
+constexpr const char* FolderNow = "There is a folder in this document’s place now.";
+
 constexpr const char* QueriedAttributes = G_FILE_ATTRIBUTE_STANDARD_TYPE "," G_FILE_ATTRIBUTE_STANDARD_CONTENT_TYPE;
 
 }  // namespace
@@ -16,6 +22,7 @@ constexpr const char* QueriedAttributes = G_FILE_ATTRIBUTE_STANDARD_TYPE "," G_F
 PreviewPage::PreviewPage(std::shared_ptr<PreviewController> controller, std::function<void()> headerChanged)
     : controller_(std::move(controller)),
       headerChanged_(std::move(headerChanged)),
+      facts_([this] { load(); }),
       stack_(GTK_WIDGET(g_object_ref_sink(gtk_stack_new()))),
       loading_(adw_status_page_new()),
       spinner_(gtk_spinner_new()) {
@@ -65,9 +72,14 @@ void PreviewPage::changed(PreviewChange change) {
 
 // The same kind of document is read anew in its place, so that the user keeps the place too.
 void PreviewPage::refresh() {
-  const std::optional<URL> shown = item();
-  const bool same = view_ && shown && gtk_stack_get_visible_child(GTK_STACK(stack_)) == view_->widget();
-  same ? view_->refresh() : load();
+  const bool isShown = view_ && item() && gtk_stack_get_visible_child(GTK_STACK(stack_)) == view_->widget();
+  isShown ? readInfo(&PreviewPage::infoReadAgain) : load();
+}
+
+void PreviewPage::infoReadAgain(GFileInfo* info) {
+  reading_.reset();
+  const char* type = info ? g_file_info_get_content_type(info) : nullptr;
+  type&& viewedType_ == type ? view_->refresh() : load();
 }
 
 void PreviewPage::dropView() {
@@ -93,28 +105,51 @@ void PreviewPage::load() {
     gtk_stack_set_visible_child(GTK_STACK(stack_), facts_.widget());
     return;
   }
-  if (!FactsPage::isDownloaded(*shown)) return showFacts("");
+  if (!FactsPage::isDownloaded(*shown)) {
+    facts_.showNotDownloaded(*shown);
+    gtk_stack_set_visible_child(GTK_STACK(stack_), facts_.widget());
+    return headerChanged_();
+  }
   showLoadingSoon();
+  readInfo(&PreviewPage::infoRead);
+}
+
+void PreviewPage::readInfo(InfoRead done) {
+  struct Asked {
+    PreviewPage* page;
+    InfoRead done;
+  };
   reading_.reset(g_cancellable_new());
-  const GRef<GFile> file(g_file_new_for_path(shown->path().c_str()));
+  const GRef<GFile> file(g_file_new_for_path(item()->path().c_str()));
   g_file_query_info_async(
       file.get(), QueriedAttributes, G_FILE_QUERY_INFO_NONE, G_PRIORITY_DEFAULT, reading_.get(),
-      +[](GObject* source, GAsyncResult* result, gpointer self) {
+      +[](GObject* source, GAsyncResult* result, gpointer data) {
+        const std::unique_ptr<Asked> asked(static_cast<Asked*>(data));
         GError* error = nullptr;
         const GRef<GFileInfo> info(g_file_query_info_finish(G_FILE(source), result, &error));
         const GErrorPtr owned(error);
         // A cancelled one belongs to a page that may be gone.
-        if (!g_error_matches(error, G_IO_ERROR, G_IO_ERROR_CANCELLED)) static_cast<PreviewPage*>(self)->infoRead(info.get());
+        if (!g_error_matches(error, G_IO_ERROR, G_IO_ERROR_CANCELLED)) (asked->page->*asked->done)(info.get());
       },
-      this);
+      new Asked{this, done});
 }
 
 void PreviewPage::infoRead(GFileInfo* info) {
   reading_.reset();
-  if (!info) return showFacts("This document is no longer there.");
+  if (!info) return showFacts(NoLongerThere);
   const char* type = g_file_info_get_content_type(info);
   const bool isFile = g_file_info_get_file_type(info) == G_FILE_TYPE_REGULAR;
-  isFile&& type&& hasDocumentView(type) ? makeView(type) : showFacts("");
+  if (isFile && type && hasDocumentView(type)) return makeView(type);
+  const bool isFolder = g_file_info_get_file_type(info) == G_FILE_TYPE_DIRECTORY;
+  showFacts(isFolder && !isPackageName(item()->lastPathComponent()) ? FolderNow : "");
+}
+
+// What became of the document says more than that it could not be read.
+void PreviewPage::showFailure(const std::string& message) {
+  struct stat status = {};
+  const std::optional<URL> shown = item();
+  if (!shown || ::stat(shown->path().c_str(), &status) != 0) return showFacts(NoLongerThere);
+  showFacts(S_ISDIR(status.st_mode) ? FolderNow : message);
 }
 
 void PreviewPage::makeView(const std::string& contentType) {
@@ -122,7 +157,7 @@ void PreviewPage::makeView(const std::string& contentType) {
   if (!shown) return;
   DocumentViewEvents events;
   events.shown = [this] { showView(); };
-  events.failed = [this](const std::string& sentence) { showFacts(sentence); };
+  events.failed = [this](const std::string& sentence) { showFailure(sentence); };
   events.progress = [this](const std::string& sentence) {
     adw_status_page_set_description(ADW_STATUS_PAGE(loading_), sentence.c_str());
   };
@@ -132,6 +167,7 @@ void PreviewPage::makeView(const std::string& contentType) {
   };
   adw_status_page_set_description(ADW_STATUS_PAGE(loading_), nullptr);
   const PreviewedDocument document{shown->path(), shown->lastPathComponent(), contentType, controller_->canEditItem(*shown)};
+  viewedType_ = contentType;
   view_ = makeDocumentView(document, std::move(events));
   gtk_stack_add_child(GTK_STACK(stack_), view_->widget());
 }
@@ -140,6 +176,7 @@ void PreviewPage::showView() {
   stopLoading();
   if (!view_ || gtk_stack_get_visible_child(GTK_STACK(stack_)) == view_->widget()) return;
   gtk_stack_set_visible_child(GTK_STACK(stack_), view_->widget());
+  facts_.showNothing();  // of a document whose download it followed, nothing more is to be told
   headerChanged_();
 }
 

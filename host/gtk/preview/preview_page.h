@@ -38,7 +38,12 @@ class PreviewPage {
   void changed(PreviewChange change);
   void load();
   void dropView();
+  /// What the disk says of the shown document; null when it is not there.
+  using InfoRead = void (PreviewPage::*)(GFileInfo* info);
+  void readInfo(InfoRead done);
   void infoRead(GFileInfo* info);
+  void infoReadAgain(GFileInfo* info);
+  void showFailure(const std::string& message);
   void makeView(const std::string& contentType);
   void showView();
   void showFacts(const std::string& message);
