@@ -5,6 +5,7 @@
 
 #include <algorithm>
 
+#include "host/desktop/content_type.h"
 #include "host/support/glib_ptr.h"
 
 namespace vaelo {
@@ -35,8 +36,7 @@ class GioDocumentRecord : public DocumentRecord {
   URL url() const override { return url_; }
 
   Result<Ranked> applicationsAvailableForOpeningByHandlerRank() override {
-    // By name alone: the item may not be downloaded, and its content is then not to be asked for.
-    const std::string type = takeString(g_content_type_guess(url_.lastPathComponent().c_str(), nullptr, 0, nullptr));
+    const std::string type = contentTypeOf(url_.path());
     std::vector<ApplicationRecord> owners;
     if (const GRef<GAppInfo> own{g_app_info_get_default_for_type(type.c_str(), FALSE)})
       owners.push_back(recordOf(own.get()));

@@ -3,8 +3,6 @@
 
 #include <adwaita.h>
 
-#include <string>
-
 namespace vaelo {
 
 namespace {
@@ -42,6 +40,12 @@ GtkWindow* showAlertDialog(const std::shared_ptr<AlertController>& alert, GtkWin
   gtk_window_present(GTK_WINDOW(dialog));
   if (shown) shown();
   return GTK_WINDOW(dialog);
+}
+
+void showMessage(GtkWindow* over, const std::string& title, const std::string& text) {
+  GtkWidget* dialog = adw_message_dialog_new(over, title.c_str(), text.c_str());
+  adw_message_dialog_add_response(ADW_MESSAGE_DIALOG(dialog), "close", "OK");
+  gtk_window_present(GTK_WINDOW(dialog));
 }
 
 }  // namespace vaelo

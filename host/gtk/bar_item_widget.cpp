@@ -33,6 +33,8 @@ SystemLook lookOf(SystemItem item) {
   return {nullptr, nullptr};
 }
 
+constexpr const char* ItemKey = "vaelo-bar-item";
+
 /// Keeps a model's signal connected for as long as a widget lives.
 void keepWithWidget(GtkWidget* widget, std::shared_ptr<void> token) {
   g_object_set_data_full(G_OBJECT(widget), "vaelo-token", new std::shared_ptr<void>(std::move(token)),
@@ -83,6 +85,7 @@ GtkWidget* makeBarItemWidget(const BarButtonItemRef& item) {
   if (const auto label = std::dynamic_pointer_cast<Label>(item->customView())) return makeLabel(label);
 
   GtkWidget* button = gtk_button_new();
+  g_object_set_data(G_OBJECT(button), ItemKey, item.get());
   const SystemLook look = system ? lookOf(*system) : SystemLook{nullptr, nullptr};
   if (look.icon) {
     gtk_button_set_icon_name(GTK_BUTTON(button), look.icon);
@@ -104,6 +107,15 @@ GtkWidget* makeBarItemWidget(const BarButtonItemRef& item) {
       new std::weak_ptr<BarButtonItem>(item),
       [](gpointer held, GClosure*) { delete static_cast<std::weak_ptr<BarButtonItem>*>(held); }, GConnectFlags(0));
   return button;
+}
+
+GtkWidget* findBarItemWidget(GtkWidget* root, const BarButtonItem& item) {
+  if (!gtk_widget_get_mapped(root)) return nullptr;
+  if (g_object_get_data(G_OBJECT(root), ItemKey) == &item) return root;
+  for (GtkWidget* child = gtk_widget_get_first_child(root); child; child = gtk_widget_get_next_sibling(child)) {
+    if (GtkWidget* found = findBarItemWidget(child, item)) return found;
+  }
+  return nullptr;
 }
 
 }  // namespace vaelo

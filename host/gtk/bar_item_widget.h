@@ -11,4 +11,7 @@ namespace vaelo {
 /// text. The caller sinks the reference. Main thread.
 GtkWidget* makeBarItemWidget(const BarButtonItemRef& item);
 
+/// The widget of the item that is `root` or below it and shows; null for none. Main thread.
+GtkWidget* findBarItemWidget(GtkWidget* root, const BarButtonItem& item);
+
 }  // namespace vaelo

@@ -1,26 +1,74 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/gtk_document_interaction.h"
 
-#include <gio/gdesktopappinfo.h>
-
-#include "host/support/glib_ptr.h"
+#include "host/gtk/bar_item_widget.h"
+#include "host/gtk/gtk_window.h"
+#include "host/gtk/share_actions.h"
 
 namespace vaelo {
 
-// No menu is offered yet, which the callers are told.
-bool GtkDocumentInteraction::presentOptionsMenuFromRect(const Rect&, const ViewRef&, bool) { return false; }
-bool GtkDocumentInteraction::presentOptionsMenuFromBarButtonItem(const BarButtonItemRef&, bool) { return false; }
+namespace {
+
+/// The rectangle in the coordinates of the window's content, where the view is in a window.
+std::optional<graphene_rect_t> areaOf(const Rect& rect, const ViewRef& view) {
+  if (!view || !view->isInWindow()) return std::nullopt;
+  View* root = view.get();
+  while (root->superview()) root = root->superview();
+  const Rect there = view->convertRectTo(rect, *root);
+  if (there.width <= 0) return std::nullopt;  // no view was given, so the rectangle is nowhere
+  graphene_rect_t area;
+  graphene_rect_init(&area, static_cast<float>(there.x), static_cast<float>(there.y), static_cast<float>(there.width),
+                     static_cast<float>(there.height));
+  return area;
+}
+
+}  // namespace
+
+GtkDocumentInteraction::GtkDocumentInteraction(URL url, CloudDocuments& drive, std::weak_ptr<GtkWindowHost> window)
+    : url_(std::move(url)), name_(url_.lastPathComponent()), drive_(drive), window_(std::move(window)) {}
+
+GtkDocumentInteraction::~GtkDocumentInteraction() = default;
+
+std::shared_ptr<ShareActions> GtkDocumentInteraction::makeActions(const std::shared_ptr<GtkWindowHost>& window) const {
+  SharedItem item = describeSharedItem(url_, drive_);
+  if (name_ != url_.lastPathComponent()) item.name = name_;
+  return std::make_shared<ShareActions>(std::move(item), window);
+}
+
+bool GtkDocumentInteraction::present(const ShareAnchor& anchor) {
+  const auto window = window_.lock();
+  if (!window) return false;
+  const auto actions = makeActions(window);
+  std::vector<ShareRow> rows = actions->rows();
+  for (ShareRow& row : rows) {
+    row.chosen = [this, act = std::move(row.chosen)] {
+      if (sheet_) sheet_->close(act);
+    };
+  }
+  const bool narrow = window->traitCollection().horizontalSizeClass == SizeClass::Compact;
+  std::function<void()> closed;
+  if (narrow) closed = [this] { sheet_->close(); };
+  GtkWidget* content = makeShareSheet(actions->item(), actions->notice(), std::move(rows), std::move(closed));
+  sheet_ = std::make_unique<SharePresentation>(window, content, anchor, [this] {
+    sheet_.reset();
+    if (const auto delegate = delegate_.lock()) delegate->documentInteractionControllerDidDismissOptionsMenu(*this);
+  });
+  return true;
+}
+
+bool GtkDocumentInteraction::presentOptionsMenuFromRect(const Rect& rect, const ViewRef& view, bool) {
+  return present({nullptr, areaOf(rect, view)});
+}
+
+bool GtkDocumentInteraction::presentOptionsMenuFromBarButtonItem(const BarButtonItemRef& item, bool) {
+  const auto window = window_.lock();
+  if (!window || !item) return false;
+  return present({findBarItemWidget(GTK_WIDGET(window->widget()), *item), std::nullopt});
+}
 
 bool GtkDocumentInteraction::openInPlaceWith(const ApplicationRecord& application) {
-  const GRef<GDesktopAppInfo> app(g_desktop_app_info_new(application.itemID.c_str()));
-  if (!app) return false;
-  const GRef<GFile> file(g_file_new_for_path(url_.path().c_str()));
-  GList files{file.get(), nullptr, nullptr};
-  const GRef<GdkAppLaunchContext> context(gdk_display_get_app_launch_context(gdk_display_get_default()));
-  GError* error = nullptr;
-  const bool started = g_app_info_launch(G_APP_INFO(app.get()), &files, G_APP_LAUNCH_CONTEXT(context.get()), &error);
-  const GErrorPtr owned(error);
-  return started;
+  const auto window = window_.lock();
+  return window && makeActions(window)->openWithApplication(application);
 }
 
 }  // namespace vaelo

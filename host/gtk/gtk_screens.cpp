@@ -54,7 +54,7 @@ bool GtkScreens::canPreviewItem(const URL&) {
 }
 
 std::shared_ptr<DocumentInteractionController> GtkScreens::makeDocumentInteraction(const URL& url) {
-  return std::make_shared<GtkDocumentInteraction>(url);
+  return std::make_shared<GtkDocumentInteraction>(url, drive_, window_);
 }
 
 void GtkScreens::runPreOpenAlert(const URL&, const ViewControllerRef&, std::function<void()> open) { open(); }

@@ -13,12 +13,14 @@ GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds)
     : Window(bounds),
       window_(ADW_APPLICATION_WINDOW(adw_application_window_new(application))),
       toasts_(adw_toast_overlay_new()),
+      overlay_(gtk_overlay_new()),
       menu_(g_menu_new()) {
   gtk_window_set_title(widget(), "Vaelo Drive");
   gtk_window_set_icon_name(widget(), "com.marrow.VaeloDrive");
   gtk_window_set_default_size(widget(), static_cast<int>(bounds.width), static_cast<int>(bounds.height));
   gtk_widget_set_size_request(GTK_WIDGET(window_), 360, 294);
-  adw_toast_overlay_set_child(ADW_TOAST_OVERLAY(toasts_), stack_.widget());
+  gtk_overlay_set_child(GTK_OVERLAY(overlay_), stack_.widget());
+  adw_toast_overlay_set_child(ADW_TOAST_OVERLAY(toasts_), overlay_);
   adw_application_window_set_content(window_, toasts_);
   g_menu_append(menu_, "_Refresh", "win.refresh");
   g_menu_append(menu_, "_About Vaelo Drive", "app.about");

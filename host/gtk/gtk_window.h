@@ -23,6 +23,8 @@ class GtkWindowHost : public Window, private NavigationHost, private Presentatio
 
   void makeKeyAndVisible() override;
   GtkWindow* widget() const { return GTK_WINDOW(window_); }
+  /// Holds the pages as its child; what lies over them all is put on it.
+  GtkOverlay* overlay() const { return GTK_OVERLAY(overlay_); }
   /// A short message at the bottom of the window.
   void showToast(const std::string& text);
   /// Puts what `make` makes between header and content of each page, of those that are shown and those to come.
@@ -46,6 +48,7 @@ class GtkWindowHost : public Window, private NavigationHost, private Presentatio
 
   AdwApplicationWindow* window_;
   GtkWidget* toasts_;
+  GtkWidget* overlay_;
   GMenu* menu_;
   PageStack stack_;
   std::function<GtkWidget*()> makeBanner_;

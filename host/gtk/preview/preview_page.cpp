@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/preview/preview_page.h"
 
+#include "host/desktop/recent_documents.h"
 #include <sys/stat.h>
 
 #include "host/drive/packages.h"
@@ -22,6 +23,7 @@ constexpr const char* QueriedAttributes = G_FILE_ATTRIBUTE_STANDARD_TYPE "," G_F
 PreviewPage::PreviewPage(std::shared_ptr<PreviewController> controller, std::function<void()> headerChanged)
     : controller_(std::move(controller)),
       headerChanged_(std::move(headerChanged)),
+      share_([this] { return item(); }),
       facts_([this] { load(); }),
       stack_(GTK_WIDGET(g_object_ref_sink(gtk_stack_new()))),
       loading_(adw_status_page_new()),
@@ -51,6 +53,7 @@ std::optional<URL> PreviewPage::item() const {
 
 std::vector<GtkWidget*> PreviewPage::headerWidgets() const {
   std::vector<GtkWidget*> widgets;
+  if (item()) widgets.push_back(makeBarItemWidget(share_.item()));
   for (const BarButtonItemRef& item : controller_->additionalRightBarButtonItems())
     widgets.push_back(makeBarItemWidget(item));
   if (view_ && gtk_stack_get_visible_child(GTK_STACK(stack_)) == view_->widget()) {
@@ -79,7 +82,7 @@ void PreviewPage::refresh() {
 void PreviewPage::infoReadAgain(GFileInfo* info) {
   reading_.reset();
   const char* type = info ? g_file_info_get_content_type(info) : nullptr;
-  type&& viewedType_ == type ? view_->refresh() : load();
+  type && viewedType_ == type ? view_->refresh() : load();
 }
 
 void PreviewPage::dropView() {
@@ -105,6 +108,7 @@ void PreviewPage::load() {
     gtk_stack_set_visible_child(GTK_STACK(stack_), facts_.widget());
     return;
   }
+  noteRecentDocument(*shown);
   if (!FactsPage::isDownloaded(*shown)) {
     facts_.showNotDownloaded(*shown);
     gtk_stack_set_visible_child(GTK_STACK(stack_), facts_.widget());
@@ -166,7 +170,9 @@ void PreviewPage::makeView(const std::string& contentType) {
     return edited && controller_->shouldSaveEditedItem(*edited);
   };
   adw_status_page_set_description(ADW_STATUS_PAGE(loading_), nullptr);
-  const PreviewedDocument document{shown->path(), shown->lastPathComponent(), contentType, controller_->canEditItem(*shown)};
+  // A label of bytes that are no UTF-8 ends the process as soon as a screen reader asks for it.
+  const std::string name = takeString(g_filename_display_name(shown->lastPathComponent().c_str()));
+  const PreviewedDocument document{shown->path(), name, contentType, controller_->canEditItem(*shown)};
   viewedType_ = contentType;
   view_ = makeDocumentView(document, std::move(events));
   gtk_stack_add_child(GTK_STACK(stack_), view_->widget());

@@ -11,6 +11,7 @@
 
 #include "host/gtk/preview/document_view.h"
 #include "host/gtk/preview/facts_page.h"
+#include "host/gtk/share_button.h"
 #include "host/support/glib_ptr.h"
 #include "platform/ui/preview_controller.h"
 
@@ -53,6 +54,7 @@ class PreviewPage {
 
   std::shared_ptr<PreviewController> controller_;
   std::function<void()> headerChanged_;
+  ShareButton share_;
   FactsPage facts_;
   GtkWidget* stack_;
   GtkWidget* loading_;

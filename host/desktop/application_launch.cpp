@@ -1,0 +1,64 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/desktop/application_launch.h"
+
+#include <gio/gdesktopappinfo.h>
+
+#include <memory>
+
+#include "host/support/glib_ptr.h"
+
+namespace vaelo {
+
+namespace {
+
+bool isStartedOverTheBus(GAppInfo* app) {
+  return G_IS_DESKTOP_APP_INFO(app) && g_desktop_app_info_get_boolean(G_DESKTOP_APP_INFO(app), "DBusActivatable");
+}
+
+void launched(GObject* app, GAsyncResult* result, gpointer held) {
+  const std::unique_ptr<LaunchFailed> failed(static_cast<LaunchFailed*>(held));
+  GError* error = nullptr;
+  g_app_info_launch_uris_finish(G_APP_INFO(app), result, &error);
+  if (!error) return;
+  const GErrorPtr owned(error);
+  (*failed)(owned->message);
+}
+
+}  // namespace
+
+bool launchApplication(GAppInfo* app, const std::vector<std::string>& uris, GAppLaunchContext* context,
+                       LaunchFailed failed) {
+  GList* list = nullptr;
+  for (auto uri = uris.rbegin(); uri != uris.rend(); ++uri) {
+    list = g_list_prepend(list, const_cast<char*>(uri->c_str()));
+  }
+  const std::unique_ptr<GList, decltype(&g_list_free)> owned(list, g_list_free);
+  if (isStartedOverTheBus(app)) {
+    g_app_info_launch_uris_async(app, list, context, nullptr, launched, new LaunchFailed(std::move(failed)));
+    return true;
+  }
+  GError* error = nullptr;
+  if (g_app_info_launch_uris(app, list, context, &error)) return true;
+  const GErrorPtr reason(error);
+  failed(reason ? reason->message : "");
+  return false;
+}
+
+bool launchProgram(const std::vector<std::string>& arguments, const std::string& name, GAppLaunchContext* context,
+                   LaunchFailed failed) {
+  std::string command;
+  for (const std::string& argument : arguments) {
+    // A percent sign begins a field code in a command line of this kind.
+    for (const char c : takeString(g_shell_quote(argument.c_str()))) command += c == '%' ? "%%" : std::string(1, c);
+    command += ' ';
+  }
+  GError* error = nullptr;
+  const GRef<GAppInfo> app(
+      g_app_info_create_from_commandline(command.c_str(), name.c_str(), G_APP_INFO_CREATE_NONE, &error));
+  const GErrorPtr reason(error);
+  if (app) return launchApplication(app.get(), {}, context, std::move(failed));
+  failed(reason ? reason->message : "");
+  return false;
+}
+
+}  // namespace vaelo

@@ -1,0 +1,177 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/gtk/share_actions.h"
+
+#include <gio/gdesktopappinfo.h>
+
+#include <algorithm>
+
+#include "host/desktop/bluetooth_sender.h"
+#include "host/desktop/mail_composer.h"
+#include "host/desktop/recent_documents.h"
+#include "host/gtk/alert_dialog.h"
+#include "host/gtk/gtk_window.h"
+#include "host/gtk/share_clipboard.h"
+#include "host/gtk/share_save.h"
+
+namespace vaelo {
+
+namespace {
+
+constexpr std::size_t MostApplications = 3;  // the others are behind "another application"
+constexpr const char* OwnEntry = "com.marrow.VaeloDrive.desktop";
+
+std::string nameOf(GAppInfo* app) { return g_app_info_get_display_name(app); }
+
+}  // namespace
+
+ShareActions::ShareActions(SharedItem item, const std::shared_ptr<GtkWindowHost>& window)
+    : item_(std::move(item)), window_(window) {}
+
+std::string ShareActions::notice() const {
+  if (!item_.exists) return "This item is no longer there.";
+  if (!item_.downloaded) return "This item is not downloaded. Until it is, only its link can be shared.";
+  return "";
+}
+
+std::vector<ShareRow> ShareActions::rows() {
+  const auto self = shared_from_this();
+  const bool here = item_.downloaded;
+  std::vector<ShareRow> rows;
+  addApplicationRows(rows);
+  if (!item_.folder && MailComposer::isAvailable()) {
+    rows.push_back({"Send by E-Mail", "mail-send-symbolic", nullptr, here, [self] { self->sendByMail(); }});
+  }
+  if (!item_.folder && BluetoothSender::isAvailable()) {
+    rows.push_back({"Send by Bluetooth", "bluetooth-symbolic", nullptr, here, [self] { self->sendByBluetooth(); }});
+  }
+  rows.push_back({item_.folder ? "Copy" : "Copy File", "edit-copy-symbolic", nullptr, here, [self] { self->copyFile(); }});
+  if (item_.link) {
+    rows.push_back({"Copy Link", "insert-link-symbolic", nullptr, item_.exists,
+                    [self] { self->copyText(*self->item_.link, "Link copied"); }});
+  }
+  if (item_.shareLink) {
+    rows.push_back({"Copy Link for Others", "emblem-shared-symbolic", nullptr, item_.exists,
+                    [self] { self->copyText(*self->item_.shareLink, "Link for others copied"); }});
+  }
+  rows.push_back({"Save a Copy…", "document-save-as-symbolic", nullptr, here, [self] {
+                    const auto window = self->window_.lock();
+                    if (window && self->hasContent()) saveCopyOf(self->item_.url, self->item_.name, window);
+                  }});
+  return rows;
+}
+
+void ShareActions::addApplicationRows(std::vector<ShareRow>& rows) {
+  const auto self = shared_from_this();
+  GList* apps = g_app_info_get_recommended_for_type(item_.contentType.c_str());
+  if (GAppInfo* own = g_app_info_get_default_for_type(item_.contentType.c_str(), FALSE)) apps = g_list_prepend(apps, own);
+  std::vector<std::string> ids{OwnEntry};
+  for (GList* at = apps; at && ids.size() <= MostApplications; at = at->next) {
+    const std::shared_ptr<GAppInfo> app(G_APP_INFO(g_object_ref(at->data)), g_object_unref);
+    const char* id = g_app_info_get_id(app.get());
+    const bool takesFiles = g_app_info_supports_files(app.get()) || g_app_info_supports_uris(app.get());
+    if (!id || !takesFiles || std::find(ids.begin(), ids.end(), id) != ids.end()) continue;
+    ids.emplace_back(id);
+    rows.push_back({"Open in “" + nameOf(app.get()) + "”", "application-x-executable-symbolic",
+                    g_app_info_get_icon(app.get()), item_.downloaded, [self, app] { self->openWith(app.get()); }});
+  }
+  g_list_free_full(apps, g_object_unref);
+  rows.push_back({"Open With Another Application…", "view-app-grid-symbolic", nullptr, item_.downloaded,
+                  [self] { self->chooseApplication(); }});
+}
+
+bool ShareActions::hasContent() const {
+  // Looked at anew: the item may have gone while the sheet was open.
+  if (g_file_test(item_.url.path().c_str(), G_FILE_TEST_EXISTS)) return true;
+  toast(item_.exists && !item_.downloaded ? "“" + item_.name + "” is not downloaded yet."
+                                          : "“" + item_.name + "” is no longer there.");
+  return false;
+}
+
+GRef<GAppLaunchContext> ShareActions::contextFor(GAppInfo* app) const {
+  GdkAppLaunchContext* context = gdk_display_get_app_launch_context(gdk_display_get_default());
+  if (app) gdk_app_launch_context_set_icon(context, g_app_info_get_icon(app));
+  return GRef<GAppLaunchContext>(G_APP_LAUNCH_CONTEXT(context));
+}
+
+LaunchFailed ShareActions::tellFailure(const std::string& application) const {
+  return [weak = window_, application](const std::string& reason) {
+    const auto window = weak.lock();
+    if (window) showMessage(window->widget(), application + " Could Not Be Started", reason);
+  };
+}
+
+void ShareActions::toast(const std::string& text) const {
+  if (const auto window = window_.lock()) window->showToast(text);
+}
+
+bool ShareActions::openWith(GAppInfo* app) {
+  if (!hasContent()) return false;
+  const GRef<GFile> file(g_file_new_for_path(item_.url.path().c_str()));
+  const std::string name = nameOf(app);
+  if (!launchApplication(app, {takeString(g_file_get_uri(file.get()))}, contextFor(app).get(),
+                         tellFailure("“" + name + "”"))) {
+    return false;
+  }
+  noteRecentDocument(item_.url);
+  toast("Opening “" + item_.name + "” in " + name + "…");
+  return true;
+}
+
+bool ShareActions::openWithApplication(const ApplicationRecord& application) {
+  const GRef<GDesktopAppInfo> app(g_desktop_app_info_new(application.itemID.c_str()));
+  if (app) return openWith(G_APP_INFO(app.get()));
+  tellFailure("“" + application.localizedName + "”")("The application is no longer installed.");
+  return false;
+}
+
+void ShareActions::chooseApplication() {
+  const auto window = window_.lock();
+  if (!window || !hasContent()) return;
+  GtkWidget* chooser =
+      gtk_app_chooser_dialog_new_for_content_type(window->widget(), GTK_DIALOG_MODAL, item_.contentType.c_str());
+  gtk_app_chooser_dialog_set_heading(GTK_APP_CHOOSER_DIALOG(chooser),
+                                     ("Open “" + takeString(g_markup_escape_text(item_.name.c_str(), -1)) + "”").c_str());
+  GtkAppChooserWidget* list = GTK_APP_CHOOSER_WIDGET(gtk_app_chooser_dialog_get_widget(GTK_APP_CHOOSER_DIALOG(chooser)));
+  gtk_app_chooser_widget_set_show_all(list, TRUE);
+  gtk_app_chooser_widget_set_default_text(list, "No application can open this item.");
+  using Self = std::shared_ptr<ShareActions>;
+  g_signal_connect_data(
+      chooser, "response", G_CALLBACK(+[](GtkDialog* dialog, int response, gpointer held) {
+        const Self self = *static_cast<Self*>(held);
+        const GRef<GAppInfo> app(gtk_app_chooser_get_app_info(GTK_APP_CHOOSER(dialog)));
+        gtk_window_destroy(GTK_WINDOW(dialog));
+        if (response == GTK_RESPONSE_OK && app) self->openWith(app.get());
+      }),
+      new Self(shared_from_this()), [](gpointer held, GClosure*) { delete static_cast<Self*>(held); }, GConnectFlags(0));
+  gtk_window_present(GTK_WINDOW(chooser));
+}
+
+void ShareActions::sendByMail() {
+  if (!hasContent()) return;
+  if (MailComposer::compose(item_.url.path(), contextFor(nullptr).get(), tellFailure("The Mail Program"))) {
+    toast("Attaching “" + item_.name + "” to a message…");
+  }
+}
+
+void ShareActions::sendByBluetooth() {
+  if (!hasContent()) return;
+  if (BluetoothSender::send(item_.url.path(), contextFor(nullptr).get(), tellFailure("Bluetooth"))) {
+    toast("Sending “" + item_.name + "” by Bluetooth…");
+  }
+}
+
+void ShareActions::copyFile() {
+  const auto window = window_.lock();
+  if (!window || !hasContent()) return;
+  copyFileToClipboard(gtk_widget_get_clipboard(GTK_WIDGET(window->widget())), item_.url.path());
+  window->showToast("“" + item_.name + "” copied");
+}
+
+void ShareActions::copyText(const std::string& text, const std::string& said) {
+  const auto window = window_.lock();
+  if (!window) return;
+  gdk_clipboard_set_text(gtk_widget_get_clipboard(GTK_WIDGET(window->widget())), text.c_str());
+  window->showToast(said);
+}
+
+}  // namespace vaelo

@@ -1,0 +1,28 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <gtk/gtk.h>
+
+#include <functional>
+#include <string>
+#include <vector>
+
+#include "host/desktop/shared_item.h"
+
+namespace vaelo {
+
+/// A row of the share sheet.
+struct ShareRow {
+  std::string title;
+  std::string iconName;   ///< when there is no `icon`
+  GIcon* icon = nullptr;  ///< not owned; needed while the sheet is made
+  bool enabled = true;
+  std::function<void()> chosen;
+};
+
+/// Makes the sheet: what is shared, what is to be known of it, and a list of rows. A row's `chosen` runs on a tap or Enter.
+/// `closed` is what the close button does; without one there is no such button. The caller sinks the reference. Main thread.
+GtkWidget* makeShareSheet(const SharedItem& item, const std::string& notice, std::vector<ShareRow> rows,
+                          std::function<void()> closed);
+
+}  // namespace vaelo
