@@ -101,12 +101,12 @@ class Subscription : public std::enable_shared_from_this<Subscription> {
           const auto self = static_cast<Subscription*>(data)->shared_from_this();
           self->timer_ = 0;
           self->look();
+          self->lastLook_ = g_get_monotonic_time();
           return G_SOURCE_REMOVE;
         },
         this);
   }
   void look() {
-    lastLook_ = g_get_monotonic_time();
     const bool wasThere = std::exchange(arrived_, isThere());
     if (arrived_) {
       if (wasThere) return;

@@ -15,7 +15,8 @@ namespace {
 /// Writes down what it is told, and lets the test wait for it.
 class WaitingPresenter : public FilePresenter {
  public:
-  WaitingPresenter(std::string path, std::shared_ptr<OperationQueue> queue) : url_(path), queue_(std::move(queue)) {}
+  WaitingPresenter(std::string path, Queues& queues)
+      : url_(path), queue_(queues.makeOperationQueue("presenter", QualityOfService::Default)) {}
   std::optional<URL> presentedItemURL() override {
     const std::lock_guard lock(mutex_);
     return url_;
@@ -54,10 +55,8 @@ class WaitingPresenter : public FilePresenter {
 
  private:
   void hear(const std::string& what) {
-    {
-      const std::lock_guard lock(mutex_);
-      told_.push_back(what);
-    }
+    const std::lock_guard lock(mutex_);
+    told_.push_back(what);
     heard_.notify_all();
   }
   long count(const std::string& what) const { return std::count(told_.begin(), told_.end(), what); }
@@ -66,7 +65,7 @@ class WaitingPresenter : public FilePresenter {
   std::condition_variable heard_;
   URL url_;
   std::vector<std::string> told_;
-  std::shared_ptr<OperationQueue> queue_;
+  std::shared_ptr<OperationQueue> queue_;  // last, so that it ends before what its blocks use
 };
 
 using Told = std::vector<std::string>;
@@ -76,7 +75,7 @@ class PresenterWatchingTest : public drive_test::DriveTest {
   PresenterWatchingTest() { write(document, "before"); }
   ~PresenterWatchingTest() override { leave(); }
   void show(const std::string& path) {
-    presenter = std::make_unique<WaitingPresenter>(path, queue);
+    presenter = std::make_unique<WaitingPresenter>(path, queues);
     coordination.addFilePresenter(*presenter);
   }
   void leave() {
@@ -87,7 +86,7 @@ class PresenterWatchingTest : public drive_test::DriveTest {
   Told toldInTheEnd() {
     const std::string other = root + "/later.txt";
     write(other, "1");
-    WaitingPresenter later(other, queue);
+    WaitingPresenter later(other, queues);
     coordination.addFilePresenter(later);
     std::filesystem::remove(other);
     EXPECT_TRUE(later.hears("deletion"));
@@ -98,7 +97,6 @@ class PresenterWatchingTest : public drive_test::DriveTest {
   const std::string document = drive + "/Documents/Letter.txt";
   const std::string folder = drive + "/Documents";
   GLibQueues queues;
-  std::shared_ptr<OperationQueue> queue = queues.makeOperationQueue("presenter", QualityOfService::Default);
   LocalFileCoordination coordination{root + "/lock"};
   std::unique_ptr<WaitingPresenter> presenter;
 };
@@ -281,7 +279,7 @@ TEST_F(PresenterWatchingTest, WhatWasDeletedIsNotKeptOnTheDisk) {
   show(document);
   leave();
   std::filesystem::remove(document);
-  presenter = std::make_unique<WaitingPresenter>(document, queue);
+  presenter = std::make_unique<WaitingPresenter>(document, queues);
   toldInTheEnd();
   int held = 0;
   for (const auto& entry : std::filesystem::directory_iterator("/proc/self/fd")) {

@@ -140,12 +140,11 @@ void PreviewPage::readInfo(InfoRead done) {
 
 void PreviewPage::infoRead(GFileInfo* info) {
   reading_.reset();
-  if (!info) return showFacts(NoLongerThere);
+  if (!info) return showFailure(NoLongerThere);
   const char* type = g_file_info_get_content_type(info);
   const bool isFile = g_file_info_get_file_type(info) == G_FILE_TYPE_REGULAR;
   if (isFile && type && hasDocumentView(type)) return makeView(type);
-  const bool isFolder = g_file_info_get_file_type(info) == G_FILE_TYPE_DIRECTORY;
-  showFacts(isFolder && !isPackageName(item()->lastPathComponent()) ? FolderNow : "");
+  showFailure("");
 }
 
 // What became of the document says more than that it could not be read.
@@ -153,7 +152,7 @@ void PreviewPage::showFailure(const std::string& message) {
   struct stat status = {};
   const std::optional<URL> shown = item();
   if (!shown || ::stat(shown->path().c_str(), &status) != 0) return showFacts(NoLongerThere);
-  showFacts(S_ISDIR(status.st_mode) ? FolderNow : message);
+  showFacts(S_ISDIR(status.st_mode) && !isPackageName(shown->lastPathComponent()) ? FolderNow : message);
 }
 
 void PreviewPage::makeView(const std::string& contentType) {

@@ -1,0 +1,184 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+// What a preview's page says of a document that is not there, goes, comes, or becomes something else.
+#include <adwaita.h>
+
+#include "host/desktop/restoration_store.h"
+#include "host/drive/drive_file_progress.h"
+#include "host/drive/promise_file.h"
+#include "host/gtk/gtk_application_loop.h"
+#include "host/gtk/gtk_screens.h"
+#include "host/gtk/preview/preview_page.h"
+#include "host/host_platform.h"
+#include "tests/host/drive_test_support.h"
+#include "tests/host/list_test_folder.h"
+
+namespace vaelo {
+
+namespace {
+
+using list_test::waitUntil;
+
+class OneDocument : public PreviewControllerDataSource {
+ public:
+  explicit OneDocument(const std::string& path) : url_(path) {}
+  std::size_t numberOfPreviewItemsInPreviewController(PreviewController&) override { return 1; }
+  URL previewControllerPreviewItemAtIndex(PreviewController&, std::size_t) override { return url_; }
+
+ private:
+  URL url_;
+};
+
+/// Title and description of the first status page that is mapped in `widget`; empty when there is none.
+std::string wordsShownIn(GtkWidget* widget) {
+  if (!gtk_widget_get_mapped(widget)) return "";
+  if (ADW_IS_STATUS_PAGE(widget)) {
+    const char* text = adw_status_page_get_description(ADW_STATUS_PAGE(widget));
+    return std::string(adw_status_page_get_title(ADW_STATUS_PAGE(widget))) + "\n" + (text ? text : "");
+  }
+  for (GtkWidget* child = gtk_widget_get_first_child(widget); child; child = gtk_widget_get_next_sibling(child)) {
+    const std::string found = wordsShownIn(child);
+    if (!found.empty()) return found;
+  }
+  return "";
+}
+
+std::string progressShownIn(GtkWidget* widget) {
+  if (!gtk_widget_get_mapped(widget)) return "";
+  if (GTK_IS_PROGRESS_BAR(widget)) {
+    const char* text = gtk_progress_bar_get_text(GTK_PROGRESS_BAR(widget));
+    return text ? text : "";
+  }
+  for (GtkWidget* child = gtk_widget_get_first_child(widget); child; child = gtk_widget_get_next_sibling(child)) {
+    const std::string found = progressShownIn(child);
+    if (!found.empty()) return found;
+  }
+  return "";
+}
+
+class PresenterPageTest : public drive_test::DriveTest {
+ protected:
+  void SetUp() override {
+    if (!gtk_init_check()) GTEST_SKIP() << "no display";
+    adw_init();
+    platform = std::make_unique<HostPlatform>(HostFolders{data, root + "/preferences.ini", root + "/restoration.ini"});
+    screens = std::make_unique<GtkScreens>(platform->drive());
+    loop = std::make_unique<GtkApplicationLoop>(*screens, platform->notifications(), platform->userActivities(),
+                                                RestorationStore(root + "/restoration.ini"));
+    platform->install(*loop, *screens);
+    window = gtk_window_new();
+    gtk_window_set_default_size(GTK_WINDOW(window), 400, 500);
+    gtk_window_present(GTK_WINDOW(window));
+  }
+  void TearDown() override {
+    if (!window) return;
+    gtk_window_destroy(GTK_WINDOW(window));
+    page.reset();
+    controller.reset();
+  }
+  void show(const std::string& path) {
+    source = std::make_shared<OneDocument>(path);
+    controller = std::make_shared<PreviewController>();
+    controller->setDataSource(source);
+    page = std::make_unique<PreviewPage>(controller, [] {});
+    gtk_window_set_child(GTK_WINDOW(window), page->widget());
+  }
+  std::string said() const { return wordsShownIn(window); }
+  bool says(const std::string& part) {
+    return waitUntil([&] { return said().find(part) != std::string::npos; });
+  }
+  void promise(const std::string& name, std::uint64_t size) {
+    PromiseInfo info;
+    info.name = name;
+    info.size = size;
+    ASSERT_FALSE(writePromise(drive, info));
+  }
+
+  const std::string document = drive + "/Table.unknown";
+  const std::string noText = std::string("\0\1\2\3\xff\xfe\0\0\1", 9);
+  std::unique_ptr<HostPlatform> platform;
+  std::unique_ptr<GtkScreens> screens;
+  std::unique_ptr<GtkApplicationLoop> loop;
+  GtkWidget* window = nullptr;
+  std::shared_ptr<OneDocument> source;
+  std::shared_ptr<PreviewController> controller;
+  std::unique_ptr<PreviewPage> page;
+};
+
+TEST_F(PresenterPageTest, ADocumentThatIsDeletedWhileItLoads) {
+  write(document, noText);
+  show(document);
+  std::filesystem::remove(document);
+  EXPECT_TRUE(says("This document is no longer there.")) << said();
+}
+
+TEST_F(PresenterPageTest, ADocumentThatIsDeletedAndReadAnew) {
+  write(document, noText);
+  show(document);
+  ASSERT_TRUE(says("9 bytes")) << said();
+  std::filesystem::remove(document);
+  controller->refreshCurrentPreviewItem();
+  EXPECT_TRUE(says("This document is no longer there.")) << said();
+}
+
+TEST_F(PresenterPageTest, AFolderInADocumentsPlace) {
+  write(document, noText);
+  show(document);
+  std::filesystem::remove(document);
+  makeFolder(document);
+  EXPECT_TRUE(says("There is a folder in this document’s place now.")) << said();
+  std::filesystem::remove(document);
+  write(document, noText);
+  controller->refreshCurrentPreviewItem();
+  EXPECT_TRUE(says("9 bytes")) << said();
+  EXPECT_EQ(said().find("folder"), std::string::npos);
+}
+
+TEST_F(PresenterPageTest, APackageIsADocument) {
+  write(drive + "/Album.sketchbundle/page");
+  show(drive + "/Album.sketchbundle");
+  ASSERT_TRUE(says("Album.sketchbundle")) << said();
+  EXPECT_EQ(said().find("in this document’s place"), std::string::npos);
+}
+
+TEST_F(PresenterPageTest, ADocumentThatComes) {
+  promise("Table.unknown", 200);
+  show(document);
+  ASSERT_TRUE(says("Not downloaded")) << said();
+  EXPECT_EQ(progressShownIn(window), "");
+  const std::string partial = DriveFileProgress::partialPathFor(document);
+  write(partial, std::string(50, 'x'));
+  ASSERT_TRUE(waitUntil([&] { return progressShownIn(window) == "Downloading… 25%"; }));
+  std::filesystem::remove(partial);
+  ASSERT_TRUE(waitUntil([&] { return progressShownIn(window).empty(); }));
+  EXPECT_TRUE(says("Not downloaded"));
+  write(partial, std::string(200, '\0'));
+  ASSERT_TRUE(waitUntil([&] { return progressShownIn(window) == "Downloading… 100%"; }));
+  rename(partial, document);
+  std::filesystem::remove(promisePathFor(document));
+  EXPECT_TRUE(waitUntil([&] { return !said().empty() && said().find("Not downloaded") == std::string::npos; })) << said();
+}
+
+TEST_F(PresenterPageTest, ADownloadOfUnknownSizeTellsItsBytes) {
+  promise("Table.unknown", 0);
+  show(document);
+  write(DriveFileProgress::partialPathFor(document), std::string(50, 'x'));
+  EXPECT_TRUE(waitUntil([&] { return progressShownIn(window) == "Downloading… 50 bytes"; })) << progressShownIn(window);
+}
+
+TEST_F(PresenterPageTest, APageMayGoWhileItsDocumentComes) {
+  promise("Table.unknown", 10);
+  show(document);
+  write(DriveFileProgress::partialPathFor(document), "12345");
+  ASSERT_TRUE(waitUntil([&] { return !progressShownIn(window).empty(); }));
+  write(document, noText);
+  gtk_window_set_child(GTK_WINDOW(window), nullptr);
+  page.reset();
+  bool passed = false;
+  g_timeout_add(
+      150, [](gpointer flag) -> gboolean { return !(*static_cast<bool*>(flag) = true); }, &passed);
+  EXPECT_TRUE(waitUntil([&] { return passed; }));
+}
+
+}  // namespace
+
+}  // namespace vaelo
