@@ -145,8 +145,7 @@ void FileUtils::dumpURLResourceValues(const URL&) {}
 void FileUtils::logFileAttributes(const std::string& path) {
   const Result<FileAttributes> attributes = Platform::current().fileManager.attributesOfItemAtPath(path);
   if (!attributes.value) {
-    VLO_ERROR("Cannot get attributes of %@: %@", path,
-              attributes.error ? attributes.error->description() : std::string("(null)"));
+    VLO_ERROR("Cannot get attributes of %@: %@", path, attributes.error);
     return;
   }
   const Date now = Platform::current().queues.now();

@@ -11,12 +11,10 @@ namespace {
 
 Error formattingError() { return Error{FileErrorDomain, FileErrorCode::Formatting, {}, {}, {}}; }
 
-std::optional<std::vector<std::string>> componentsInMirror(const URL& url) {
+/// The number of components of the path from the mirror's root; nothing outside the mirror.
+std::optional<std::size_t> depthInMirror(const URL& url) {
   const std::optional<std::string> path = Platform::current().cloudDocuments.pathRelativeToMirror(url);
-  if (!path) return std::nullopt;
-  std::vector<std::string> components = URL("/" + *path).pathComponents();
-  components.erase(components.begin());
-  return components;
+  return path ? std::optional(URL("/" + *path).pathComponents().size()) : std::nullopt;
 }
 
 /// "\u2068name\u2069": a name of either direction keeps to itself within the line.
@@ -43,15 +41,15 @@ std::optional<Error> FileUtils::containerAndRelativePathforURLContainerRelativeP
   if (!components) return lookup.error;
 
   const std::optional<URL> documents = found->documentsFolderURL();
-  const auto top = documents ? componentsInMirror(*documents) : std::nullopt;
-  const auto own = componentsInMirror(url);
-  if (!top || !own || own->size() < top->size()) return formattingError();
-  if (own->size() == top->size()) return lookup.error;
+  const auto top = documents ? depthInMirror(*documents) : std::nullopt;
+  const auto own = depthInMirror(url);
+  if (!top || !own || *own < *top) return formattingError();
+  if (*own == *top) return lookup.error;
 
   std::optional<Error> walkError;
   std::vector<std::string> names;
   URL at = url;
-  for (std::size_t left = own->size() - top->size(); left > 0; --left, at = at.deletingLastPathComponent()) {
+  for (std::size_t left = *own - *top; left > 0; --left, at = at.deletingLastPathComponent()) {
     const Result<ResourceMap> values =
         Platform::current().resourceValues.promisedItemResourceValues(at, {ResourceKey::LocalizedName});
     const auto value = values.value ? values.value->find(ResourceKey::LocalizedName) : ResourceMap::const_iterator();

@@ -62,6 +62,7 @@ CloudContainerRef MemoryCloudDocuments::containerWithIdentifier(const std::strin
 }
 
 Result<CloudContainerRef> MemoryCloudDocuments::containerForURL(const URL& url) {
+  if (containerOfEverything) return containerOfEverything;
   Result<CloudContainerRef> result;
   if (containerError) result.error = containerError;
   if (containerError && !containerErrorComesWithValue) return result;

@@ -176,7 +176,23 @@ TEST_F(ItemsReviewRecordTest, withoutAResolvedURLThereIsNoPromiseURLEither) {
   EXPECT_FALSE(item->promiseURL());
 }
 
+TEST_F(ItemsReviewRecordTest, anAliasIsFollowedOnlyWithoutAnError) {
+  Result<URL> both(Target);
+  both.error = fileError(FileErrorCode::ReadUnknown);
+  world.aliasTargets.insert_or_assign(Item.path(), both);
+  EXPECT_FALSE(filled({{K::LocalizedTypeDescription, "Alias"}})->resolvedURL());
+  EXPECT_TRUE(logged("WARNING", "Error resolving Alias: " + both.error->description()));
+  EXPECT_FALSE(filled()->resolveRoverAlias(std::nullopt));
+}
+
 // Refills.
+
+TEST_F(ItemsReviewRecordTest, aRefillForgetsTheTargetOfALink) {
+  const auto item = linkFromAttributes("neighbour");
+  ASSERT_TRUE(item->symlinkTarget() && item->isSymlink());
+  item->clearValues();
+  EXPECT_FALSE(item->symlinkTarget() || item->isSymlink());
+}
 
 TEST_F(ItemsReviewRecordTest, withoutAURLThereIsNothingToFillFrom) {
   const auto item = filled({{K::Name, "item"}});

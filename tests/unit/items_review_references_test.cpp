@@ -64,6 +64,18 @@ TEST_F(ItemsReviewReferencesTest, theFolderTestAsksForTheContainerFirst) {
   EXPECT_TRUE(vlo_isDesktopOrDocumentsFolder(documents));
 }
 
+TEST_F(ItemsReviewReferencesTest, aFolderOfAnotherContainerIsNeitherDesktopNorDocuments) {
+  world.containerOfEverything = world.library;
+  EXPECT_FALSE(vlo_isDesktopOrDocumentsFolder(Drive.appendingPathComponent("Documents")));
+}
+
+TEST_F(ItemsReviewReferencesTest, theLargestNumbersAreReadToTheirLastDigit) {
+  for (const char* number : {"18446744073709551614", "17000000000000000000", "9223372036854775808"}) {
+    vlo_URLFromDocumentID(number);
+    EXPECT_TRUE(world.called(std::string("resolve ") + number));
+  }
+}
+
 TEST_F(ItemsReviewReferencesTest, anIdentifierIsReadAsASignedNumber) {
   world.addFile(Document, {{K::DocumentIdentifier, std::uint64_t{18446744073709551615u}}});
   EXPECT_EQ(vlo_DocumentID(Document), -1);
@@ -99,9 +111,9 @@ TEST_F(ItemsReviewReferencesTest, anEndOfTheProgramSaysWhy) {
   GTEST_FLAG_SET(death_test_style, "threadsafe");
   world.recordedLog.echoes = true;
   world.openedHandle = {-1, {}};
-  EXPECT_DEATH(vlo_URLFromDocumentID("42"), "\\(VLO\\)\\[ERROR\\] .* fd >= 0");
+  EXPECT_DEATH(vlo_URLFromDocumentID("42"), "\\(VLO\\)\\[ERROR\\] .* fd >= 0\n");
   world.device_ = std::nullopt;
-  EXPECT_DEATH(vlo_URLFromDocumentID("42"), "\\(VLO\\)\\[ERROR\\] .* could not get device ID");
+  EXPECT_DEATH(vlo_URLFromDocumentID("42"), "\\(VLO\\)\\[ERROR\\] .* could not get device ID\n");
 }
 
 // Who opens a document.
