@@ -31,7 +31,8 @@ std::optional<Error> createDirectory(const URL& url) {
 
 std::optional<Error> removeUnlessChanged(const URL& url, const Value& dateBefore) {
   const Value dateNow = FileUtils::getResourceValueForURL(ResourceKey::ContentModificationDate, url);
-  if (!dateBefore.isPresent() || !dateNow.isPresent() || !(dateBefore == dateNow)) {
+  // Two absent dates are no equal ones.
+  if (!dateBefore.isPresent() || !(dateBefore == dateNow)) {
     VLO_INFO("Date changed during delete (user chose Keep?) -- preserving document: '%@'", url);
     return baseError(FileErrorCode::UserCancelled);
   }
