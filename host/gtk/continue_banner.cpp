@@ -47,40 +47,48 @@ ContinueOffer::ContinueOffer(FileProvider& provider, Queues& queues, std::functi
     : provider_(provider), queues_(queues), nameOf_(std::move(nameOf)), carryOn_(std::move(carryOn)) {}
 
 void ContinueOffer::setActivity(const std::optional<OfferedActivity>& offered) {
-  offered_.reset();
-  const std::string document = offered ? documentIn(*offered->activity) : "";
-  if (document.empty() || keyOf(*offered) == answered_) return show(std::nullopt);
   offered_ = offered;
-  // The document's name is not taken from the other device: it is that of what would be opened here.
+  if (!offered || documentIn(*offered->activity).empty() || keyOf(*offered) == answered_) {
+    offered_.reset();
+    return show(std::nullopt, std::nullopt);
+  }
+  resolve();
+}
+
+void ContinueOffer::lookAgain() {
+  if (offered_ && !shown_) resolve();
+}
+
+// The document's name is not taken from the other device: it is that of what would be opened here.
+void ContinueOffer::resolve() {
   provider_.DocumentURLFromBookmarkableString(
-      document, [weak = weak_from_this(), &main = queues_.main(), offer = *offered](const Result<URL>& url) {
+      documentIn(*offered_->activity),
+      [weak = weak_from_this(), &main = queues_.main(), offer = *offered_](const Result<URL>& url) {
         main.async([weak, offer, url] {
           const auto self = weak.lock();
           if (!self || !self->offered_ || self->offered_->activity != offer.activity) return;
-          url.value ? self->resolved(offer, *url.value) : self->show(std::nullopt);
+          if (!url.value) return self->show(std::nullopt, std::nullopt);
+          self->show(offer, "Continue from " + offer.deviceName + ": " + self->nameOf_(*url.value));
         });
       });
 }
 
-void ContinueOffer::resolved(const OfferedActivity& offered, const URL& document) {
-  show("Continue from " + offered.deviceName + ": " + nameOf_(document));
-}
-
 void ContinueOffer::carryOn() {
-  if (!offered_ || !text_) return;
-  const std::shared_ptr<UserActivity> activity = offered_->activity;
+  if (!shown_) return;
+  const std::shared_ptr<UserActivity> activity = shown_->activity;
   dismiss();
   carryOn_(activity);
 }
 
 void ContinueOffer::dismiss() {
-  if (!offered_) return;
-  answered_ = keyOf(*offered_);
-  offered_.reset();
-  show(std::nullopt);
+  if (!shown_) return;
+  answered_ = keyOf(*shown_);
+  if (offered_ && keyOf(*offered_) == answered_) offered_.reset();
+  show(std::nullopt, std::nullopt);
 }
 
-void ContinueOffer::show(std::optional<std::string> text) {
+void ContinueOffer::show(const std::optional<OfferedActivity>& offered, std::optional<std::string> text) {
+  shown_ = offered;
   if (text == text_) return;
   text_ = std::move(text);
   for (const auto& weak : std::vector(observers_)) {

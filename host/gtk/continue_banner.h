@@ -28,20 +28,23 @@ class ContinueOffer : public std::enable_shared_from_this<ContinueOffer> {
   void setActivity(const std::optional<OfferedActivity>& offered);
   /// "Continue from NAME: DOCUMENT"; nothing when there is nothing to offer.
   const std::optional<std::string>& text() const { return text_; }
+  /// Asks again for a document that was not in this drive: the drive may carry it later than the activity.
+  void lookAgain();
   void carryOn();
   void dismiss();
   /// Calls `changed` when text() has changed, until the token goes.
   [[nodiscard]] std::shared_ptr<void> observe(std::function<void()> changed);
 
  private:
-  void resolved(const OfferedActivity& offered, const URL& document);
-  void show(std::optional<std::string> text);
+  void resolve();
+  void show(const std::optional<OfferedActivity>& offered, std::optional<std::string> text);
 
   FileProvider& provider_;
   Queues& queues_;
   const std::function<std::string(const URL&)> nameOf_;
   const Continue carryOn_;
   std::optional<OfferedActivity> offered_;
+  std::optional<OfferedActivity> shown_;  // what the text is about, while a later one is looked up
   std::optional<std::string> text_;
   std::string answered_;  // which offer the user has answered
   std::vector<std::weak_ptr<std::function<void()>>> observers_;

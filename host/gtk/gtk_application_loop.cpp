@@ -154,6 +154,7 @@ void GtkApplicationLoop::windowFocusChanged() {
   active_ = active;
   if (active) {
     notifications_.post({DidBecomeActiveNotification, {}});
+    continueOffer_->lookAgain();
   } else {
     delegate_->applicationWillResignActive();
     notifications_.post({WillResignActiveNotification, {}});

@@ -95,6 +95,19 @@ class Shown(unittest.TestCase):
         self.letter.rmdir()
         self.app.wait_title("Documents")
 
+    def test_a_document_that_is_deleted_while_it_loads(self):
+        self.app.key("Escape")
+        self.app.wait_title("Documents")
+        large = self.folder / "Large.txt"
+        large.write_text("All work and no play.\n" * 3_000_000)
+        self.app.wait("Large.txt", "list item")
+        self.app.click("Large.txt", "list item")
+        large.unlink()
+        self.app.wait_gone("Large.txt,")
+        self.app.wait_title("Documents")
+        self.assertTrue(self.app.running())
+        self.show("Letter.txt")
+
     def test_what_happened_behind_another_window_is_shown_on_return(self):
         self.app.desktop.start(["xmessage", "another window"], self.app.desktop.environment)
         self.app.wait_log("Resigning active for ")
