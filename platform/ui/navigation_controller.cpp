@@ -4,7 +4,17 @@
 #include <algorithm>
 #include <utility>
 
+#include "platform/platform.h"
+#include "platform/ui/document_list_controller.h"
+#include "platform/ui/screen_factory.h"
+
 namespace vaelo {
+
+namespace {
+
+constexpr const char* ListFolderKey = "ListFolder";
+
+}  // namespace
 
 NavigationController::~NavigationController() = default;
 
@@ -152,6 +162,27 @@ void NavigationController::viewWillDisappear(bool animated) {
 void NavigationController::viewDidDisappear(bool animated) {
   ViewController::viewDidDisappear(animated);
   if (const ViewControllerRef top = topViewController()) top->endAppearanceTransition();
+}
+
+void NavigationController::encodeRestorableStateWithCoder(RestorationCoder& coder) {
+  ViewController::encodeRestorableStateWithCoder(coder);
+  for (auto screen = stack_.rbegin(); screen != stack_.rend(); ++screen) {
+    const auto list = std::dynamic_pointer_cast<DocumentListController>(*screen);
+    if (!list || !list->presentedURL()) continue;
+    // Every start begins with the root list.
+    if (!list->showsAllContainers()) coder.encode(ListFolderKey, *list->presentedURL());
+    return;
+  }
+}
+
+void NavigationController::decodeRestorableStateWithCoder(const RestorationCoder& coder) {
+  ViewController::decodeRestorableStateWithCoder(coder);
+  const Value value = coder.decode(ListFolderKey);
+  const URL* folder = value.get<URL>();
+  bool isDirectory = false;
+  if (!folder || !Platform::current().fileManager.fileExistsAtPath(folder->path(), &isDirectory) || !isDirectory) return;
+  const auto lists = Platform::current().screens.hierarchyTo(*folder);
+  if (lists) setViewControllers({lists->begin(), lists->end()}, false);
 }
 
 std::vector<ViewControllerRef> NavigationController::visibleChildren() const {

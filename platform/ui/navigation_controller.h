@@ -66,6 +66,9 @@ class NavigationController : public ViewController {
   void viewDidAppear(bool animated) override;
   void viewWillDisappear(bool animated) override;
   void viewDidDisappear(bool animated) override;
+  /// The folder that the topmost list shows, and on the way back the lists down to it, if the folder is still there.
+  void encodeRestorableStateWithCoder(RestorationCoder& coder) override;
+  void decodeRestorableStateWithCoder(const RestorationCoder& coder) override;
 
  protected:
   std::vector<ViewControllerRef> visibleChildren() const override;

@@ -62,12 +62,12 @@ CloudContainerRef MemoryCloudDocuments::containerWithIdentifier(const std::strin
 }
 
 Result<CloudContainerRef> MemoryCloudDocuments::containerForURL(const URL& url) {
-  if (containerOfEverything) return containerOfEverything;
   Result<CloudContainerRef> result;
   if (containerError) result.error = containerError;
   if (containerError && !containerErrorComesWithValue) return result;
   const std::optional<std::string> identifier = containerIdentifierForURL(url);
-  const CloudContainerRef container = identifier ? containerWithIdentifier(*identifier) : nullptr;
+  CloudContainerRef container = identifier ? containerWithIdentifier(*identifier) : nullptr;
+  if (containerOfEverything) container = containerOfEverything;
   if (container) {
     result.value = container;
   } else {

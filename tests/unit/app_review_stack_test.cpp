@@ -237,7 +237,7 @@ TEST_F(AppReviewStackTest, onlyAPreviewThatHasADocumentIsKept) {
   EXPECT_TRUE(encoded().empty());
   previewing(document);
   nav->itemManager()->item()->setUrl(std::nullopt);
-  EXPECT_TRUE(encoded().empty());
+  EXPECT_FALSE(encoded().contains("url") || encoded().contains("PreviewMode"));
 }
 
 TEST_F(AppReviewStackTest, whatIsKeptIsTheURLAndTheMode) {

@@ -185,6 +185,23 @@ TEST_F(ItemsReviewFilesTest, aLookupThatGivesAContainerAndAnErrorNeedsTheTableOf
   EXPECT_EQ(messages(), Lines{"WARNING Split URL: " + world.containerError->description()});
 }
 
+TEST_F(ItemsReviewFilesTest, aContainerBesideAnErrorDoesNotServeByItself) {
+  world.containerOfEverything = world.library;
+  world.containers.clear();
+  world.containerError = fileError(FileErrorCode::ReadUnknown);
+  world.containerErrorComesWithValue = true;
+  EXPECT_EQ(split(LibraryDocuments.appendingPathComponent("a"))->code, FileErrorCode::ReadUnknown);
+  EXPECT_FALSE(container);
+  EXPECT_EQ(names, Lines{"untouched"});
+}
+
+TEST_F(ItemsReviewFilesTest, anItemOutsideTheMirrorCannotBeSplitWhateverItsContainer) {
+  world.containerOfEverything = world.library;
+  EXPECT_EQ(split(URL("/outside/a"))->code, FileErrorCode::Formatting);
+  EXPECT_EQ(container, world.library);
+  EXPECT_EQ(names, Lines{"untouched"});
+}
+
 TEST_F(ItemsReviewFilesTest, aNameThatIsAbsentIsThatOfThePath) {
   const URL item = LibraryDocuments.appendingPathComponent("a.txt");
   world.addFile(item);
