@@ -5,6 +5,7 @@
 
 #include "host/gtk/alert_dialog.h"
 #include "host/gtk/host_screen.h"
+#include "host/support/glib_ptr.h"
 #include "platform/ui/search_controller.h"
 
 namespace vaelo {
@@ -183,8 +184,12 @@ void GtkWindowHost::escape() {
   goBack();
 }
 
-void GtkWindowHost::showToast(const std::string& text) {
-  adw_toast_overlay_add_toast(ADW_TOAST_OVERLAY(toasts_), adw_toast_new(text.c_str()));
+void GtkWindowHost::showToast(const std::string& text, bool stays) {
+  // Its title is markup, which a name with "&" is not.
+  const std::string markup = takeString(g_markup_escape_text(text.c_str(), -1));
+  AdwToast* toast = adw_toast_new(markup.c_str());
+  if (stays) adw_toast_set_timeout(toast, 0);
+  adw_toast_overlay_add_toast(ADW_TOAST_OVERLAY(toasts_), toast);
 }
 
 void GtkWindowHost::setPageBanner(std::function<GtkWidget*()> make) {

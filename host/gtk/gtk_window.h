@@ -25,8 +25,8 @@ class GtkWindowHost : public Window, private NavigationHost, private Presentatio
   GtkWindow* widget() const { return GTK_WINDOW(window_); }
   /// Holds the pages as its child; what lies over them all is put on it.
   GtkOverlay* overlay() const { return GTK_OVERLAY(overlay_); }
-  /// A short message at the bottom of the window.
-  void showToast(const std::string& text);
+  /// A short message at the bottom of the window. One that stays goes when the user closes it.
+  void showToast(const std::string& text, bool stays = false);
   /// Puts what `make` makes between header and content of each page, of those that are shown and those to come.
   void setPageBanner(std::function<GtkWidget*()> make);
 
