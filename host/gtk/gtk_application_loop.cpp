@@ -95,7 +95,7 @@ void GtkApplicationLoop::launch() {
   offerToContinue();
   rebuiltToken_ = notifications_.addObserver(DocumentIndexRebuiltNotification, [this](const Notification&) {
     if (const auto shown = screens_.window()) {
-      shown->showToast("The drive’s index was damaged. It has been rebuilt, and the old one kept.");
+      shown->showToast("The drive’s index was damaged. It has been rebuilt, and the old one kept.", true);
     }
   });
 }
