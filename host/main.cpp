@@ -19,7 +19,7 @@ int main(int argc, char** argv) {
   const vaelo::HostFolders folders = vaelo::HostFolders::fromEnvironment();
   vaelo::HostPlatform platform(folders);
   vaelo::GtkScreens screens(platform.drive());
-  vaelo::GtkApplicationLoop loop(screens, platform.notifications(), platform.userActivities(),
+  vaelo::GtkApplicationLoop loop(screens, platform.drive(), platform.notifications(), platform.userActivities(),
                                  vaelo::RestorationStore(folders.restorationFile));
   platform.install(loop, screens);
   return vaelo::vaeloMain(argc, argv);

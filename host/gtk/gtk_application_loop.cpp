@@ -3,19 +3,41 @@
 
 #include <unicode/uloc.h>
 
+#include "host/desktop/recent_documents.h"
 #include "host/drive/drive_user_activities.h"
-#include "host/drive/local_cloud_documents.h"
+#include "host/drive/promise_file.h"
 #include "host/gtk/continue_banner.h"
+#include "host/gtk/drive_application.h"
 #include "host/gtk/gtk_screens.h"
 #include "host/gtk/gtk_window.h"
 #include "host/support/glib_ptr.h"
+#include "items/url_additions.h"
+#include "platform/archive.h"
 #include "platform/platform.h"
 
 namespace vaelo {
 
-GtkApplicationLoop::GtkApplicationLoop(GtkScreens& screens, NotificationCenter& notifications,
+namespace {
+
+constexpr unsigned IdleServiceEnds = 30000;  // milliseconds without a call from the desktop
+
+constexpr GOptionEntry Options[] = {
+    {"search", 0, 0, G_OPTION_ARG_NONE, nullptr, "Search in the drive", nullptr},
+    {"recent-document", 0, 0, G_OPTION_ARG_NONE, nullptr, "Open the document used last", nullptr},
+    {nullptr, 0, 0, G_OPTION_ARG_NONE, nullptr, nullptr, nullptr}};
+
+bool hasOption(GApplicationCommandLine* line, const char* name) {
+  return g_variant_dict_contains(g_application_command_line_get_options_dict(line), name);
+}
+
+}  // namespace
+
+GtkApplicationLoop::GtkApplicationLoop(GtkScreens& screens, LocalCloudDocuments& drive, NotificationCenter& notifications,
                                        DriveUserActivities& activities, RestorationStore restoration)
     : screens_(screens),
+      drive_(drive),
+      searchProvider_(drive, {[this](const std::string& id, std::uint32_t time) { openSearchResult(id, time); },
+                              [this](const std::string& query, std::uint32_t time) { continueSearch(query, time); }}),
       notifications_(notifications),
       activities_(activities),
       restoration_(std::move(restoration)),
@@ -29,18 +51,30 @@ int GtkApplicationLoop::run(int argc, char** argv, std::function<std::shared_ptr
   makeDelegate_ = std::move(makeDelegate);
   constexpr auto flags = static_cast<GApplicationFlags>(G_APPLICATION_HANDLES_COMMAND_LINE | G_APPLICATION_HANDLES_OPEN |
                                                         G_APPLICATION_CAN_OVERRIDE_APP_ID);
-  application_ = adw_application_new("com.marrow.VaeloDrive", flags);
+  application_ = makeDriveApplication("com.marrow.VaeloDrive", flags,
+                                      {[this](GDBusConnection* bus, const std::string& path, GError** error) {
+                                         return searchProvider_.exportOn(bus, path + "/SearchProvider", error);
+                                       },
+                                       [this] { searchProvider_.unexport(); }});
   screens_.setApplication(GTK_APPLICATION(application_));
   g_application_set_option_context_parameter_string(G_APPLICATION(application_), "[LINK...]");
   g_application_set_option_context_summary(G_APPLICATION(application_),
                                            "Browse and manage the documents of your cloud drive.\n"
                                            "LINK is one of the vaelodriveapp: scheme and opens that item.");
+  g_application_add_main_option_entries(G_APPLICATION(application_), Options);
   // Our texts follow the user's list of languages, so the direction does too, not the locale of numbers and dates.
   g_signal_connect(application_, "startup", G_CALLBACK(+[](GApplication*, gpointer) {
                      if (uloc_isRightToLeft(g_get_language_names()[0])) gtk_widget_set_default_direction(GTK_TEXT_DIR_RTL);
                    }),
                    nullptr);
-  g_signal_connect_swapped(application_, "activate", G_CALLBACK(+[](GtkApplicationLoop* self) { self->activate(); }), this);
+  g_signal_connect_swapped(application_, "startup", G_CALLBACK(+[](GtkApplicationLoop* self) { self->beginService(); }),
+                           this);
+  g_signal_connect_swapped(application_, "activate", G_CALLBACK(+[](GtkApplicationLoop* self) {
+                             const bool first = !self->delegate_;
+                             self->activate();
+                             if (first) self->restore();
+                           }),
+                           this);
   g_signal_connect(application_, "command-line",
                    G_CALLBACK(+[](GApplication*, GApplicationCommandLine* line, GtkApplicationLoop* self) -> int {
                      return self->commandLine(line);
@@ -53,6 +87,20 @@ int GtkApplicationLoop::run(int argc, char** argv, std::function<std::shared_ptr
                    }),
                    this);
   static const GActionEntry entries[] = {
+      {"search",
+       [](GSimpleAction*, GVariant*, gpointer self) {
+         static_cast<GtkApplicationLoop*>(self)->performShortcut({SearchShortcutType, {}});
+       },
+       nullptr,
+       nullptr,
+       nullptr,
+       {0, 0, 0}},
+      {"recent-document",
+       [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkApplicationLoop*>(self)->openRecentDocument(); },
+       nullptr,
+       nullptr,
+       nullptr,
+       {0, 0, 0}},
       {"about",
        [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkApplicationLoop*>(self)->showAbout(); },
        nullptr,
@@ -78,14 +126,63 @@ int GtkApplicationLoop::run(int argc, char** argv, std::function<std::shared_ptr
   return status;
 }
 
-void GtkApplicationLoop::activate() {
-  if (!delegate_) launch();
-  if (const auto window = screens_.window()) gtk_window_present(window->widget());
+void GtkApplicationLoop::beginService() {
+  GApplication* application = G_APPLICATION(application_);
+  if (!(g_application_get_flags(application) & G_APPLICATION_IS_SERVICE)) return;
+  // The desktop started us for a question, and the next one may follow soon.
+  g_application_set_inactivity_timeout(application, IdleServiceEnds);
+  // A window that the user closed is not to be brought back from the dead.
+  g_signal_connect(application_, "window-removed", G_CALLBACK(+[](GtkApplication* self, GtkWindow*) {
+                     if (!gtk_application_get_windows(self)) g_application_quit(G_APPLICATION(self));
+                   }),
+                   nullptr);
 }
 
-void GtkApplicationLoop::launch() {
+void GtkApplicationLoop::activate(std::uint32_t timestamp) {
+  if (!delegate_) launch({});
+  present(timestamp);
+}
+
+void GtkApplicationLoop::present(std::uint32_t timestamp) {
+  if (const auto window = screens_.window()) gtk_window_present_with_time(window->widget(), timestamp);
+}
+
+void GtkApplicationLoop::performShortcut(const ShortcutItem& item) {
+  if (delegate_) {
+    delegate_->applicationPerformActionForShortcutItemCompletionHandler(item, [](bool) {});
+  } else {
+    launch({item});
+  }
+  present(GDK_CURRENT_TIME);
+}
+
+void GtkApplicationLoop::openRecentDocument() {
+  const std::optional<URL> document = latestRecentDocument([this](const URL& url) {
+    return drive_.URLIsInDriveMirror(url) && !drive_.URLIsInDriveTrash(url) && physicalPathOf(url.path());
+  });
+  if (document) return performShortcut({RecentDocumentShortcutType, {{RecentDocumentURLKey, archiveURL(*document)}}});
+  activate();
+  if (const auto window = screens_.window()) window->showToast("No document of this drive was used recently.");
+}
+
+void GtkApplicationLoop::continueSearch(const std::string& query, std::uint32_t timestamp) {
+  activate(timestamp);
+  const auto activity = activities_.makeActivity(SearchContinuationActivityType);
+  activity->setUserInfo({{SearchQueryStringKey, query}});
+  continueActivity(activity);
+}
+
+void GtkApplicationLoop::openSearchResult(const std::string& documentID, std::uint32_t timestamp) {
+  activate(timestamp);
+  const auto activity = activities_.makeActivity(SearchResultActivityType);
+  activity->setUserInfo({{SearchResultIdentifierKey, documentID}});
+  continueActivity(activity);
+  const auto window = screens_.window();
+  if (window && !vlo_URLFromDocumentID(documentID)) window->showToast("This search result is no longer in the drive.");
+}
+
+void GtkApplicationLoop::launch(const LaunchOptions& options) {
   delegate_ = makeDelegate_();
-  const LaunchOptions options;
   delegate_->applicationWillFinishLaunchingWithOptions(options);
   delegate_->applicationDidFinishLaunchingWithOptions(options);
   const auto window = screens_.window();
@@ -127,6 +224,10 @@ int GtkApplicationLoop::commandLine(GApplicationCommandLine* line) {
   int count = 0;
   char** arguments = g_application_command_line_get_arguments(line, &count);
   const bool first = !delegate_;
+  const bool search = hasOption(line, "search");
+  const bool recent = hasOption(line, "recent-document");
+  if (search) performShortcut({SearchShortcutType, {}});
+  if (recent) openRecentDocument();
   activate();
   int status = 0;
   for (int i = 1; i < count; ++i) {
@@ -136,12 +237,18 @@ int GtkApplicationLoop::commandLine(GApplicationCommandLine* line) {
     g_application_command_line_printerr(line, "vaelo-drive: “%s” leads to nothing in the drive.\n", shown.c_str());
     status = 1;
   }
-  if (first && count == 1) restore();
+  if (first && count == 1 && !search && !recent) restore();
   g_strfreev(arguments);
   return status;
 }
 
 bool GtkApplicationLoop::openLink(const std::string& link) {
+  // Other programs' lists of recent documents name files.
+  const std::optional<URL> file = URL::fromFileURLString(link);
+  if (file && drive_.URLIsInDriveMirror(*file) && physicalPathOf(file->path())) {
+    performShortcut({RecentDocumentShortcutType, {{RecentDocumentURLKey, archiveURL(*file)}}});
+    return true;
+  }
   if (delegate_->applicationOpenURLOptions(link, {})) return true;
   if (const auto window = screens_.window()) window->showToast("The link leads to nothing in this drive.");
   return false;

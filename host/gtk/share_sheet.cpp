@@ -50,8 +50,8 @@ GtkWidget* makeHeader(const SharedItem& item, Callback closed) {
     gtk_widget_add_css_class(close, "circular");
     gtk_widget_set_valign(close, GTK_ALIGN_CENTER);
     gtk_widget_set_size_request(close, 44, 44);
-    gtk_widget_set_tooltip_text(close, "Close");
-    gtk_accessible_update_property(GTK_ACCESSIBLE(close), GTK_ACCESSIBLE_PROPERTY_LABEL, "Close", -1);
+    gtk_widget_set_tooltip_text(close, "Close Sheet");
+    gtk_accessible_update_property(GTK_ACCESSIBLE(close), GTK_ACCESSIBLE_PROPERTY_LABEL, "Close Sheet", -1);
     g_signal_connect_data(close, "clicked",
                           G_CALLBACK(+[](GtkButton*, gpointer held) { (*static_cast<Callback*>(held))(); }),
                           new Callback(std::move(closed)), deleteCallback, GConnectFlags(0));
