@@ -18,15 +18,17 @@ namespace vaelo {
 namespace {
 
 constexpr std::chrono::milliseconds Settling(100);
-constexpr std::size_t MostFolders = 256;  // of one item's tree
+constexpr std::size_t MostFolders = 256;    // of one item's tree
+constexpr std::size_t MostEntries = 20000;  // that are read to find them
 constexpr unsigned OwnMoves = IN_MOVE_SELF | IN_DELETE_SELF;
 constexpr unsigned Entries = IN_CREATE | IN_DELETE | IN_MOVED_FROM | IN_MOVED_TO | IN_CLOSE_WRITE | IN_MODIFY;
 
-std::vector<std::string> foldersIn(const std::string& folder) {
+std::vector<std::string> foldersIn(const std::string& folder, std::size_t& entries) {
   std::vector<std::string> found;
   const std::unique_ptr<DIR, int (*)(DIR*)> stream(::opendir(folder.c_str()), ::closedir);
   if (!stream) return found;
-  while (const dirent* entry = ::readdir(stream.get())) {
+  while (const dirent* entry = entries < MostEntries ? ::readdir(stream.get()) : nullptr) {
+    ++entries;
     const std::string name = entry->d_name;
     if (name != "." && name != ".." && entry->d_type == DT_DIR) found.push_back(folder + "/" + name);
   }
@@ -244,11 +246,12 @@ void ItemWatcher::arm(Item& item) {
   }
   if (item.state.isFolder()) {
     std::vector<std::string> pending = {path};
+    std::size_t entries = 0;
     while (!pending.empty() && item.folders.size() < MostFolders) {
       const std::string folder = std::move(pending.back());
       pending.pop_back();
       if (!add(item, folder, true, OwnMoves | Entries)) continue;
-      for (std::string& inside : foldersIn(folder)) pending.push_back(std::move(inside));
+      for (std::string& inside : foldersIn(folder, entries)) pending.push_back(std::move(inside));
     }
   }
   for (const auto& [watch, folder] : item.folders) ++users_[watch];

@@ -66,7 +66,11 @@ FactsPage::FactsPage(std::function<void()> arrived)
   gtk_widget_add_css_class(open_, "pill");
   gtk_widget_set_halign(open_, GTK_ALIGN_CENTER);
   gtk_box_append(GTK_BOX(box_), open_);
-  adw_status_page_set_child(ADW_STATUS_PAGE(page_), box_);
+  // On a wide window a bar from edge to edge is hard to read.
+  GtkWidget* clamp = adw_clamp_new();
+  adw_clamp_set_maximum_size(ADW_CLAMP(clamp), 400);
+  adw_clamp_set_child(ADW_CLAMP(clamp), box_);
+  adw_status_page_set_child(ADW_STATUS_PAGE(page_), clamp);
   g_signal_connect_swapped(open_, "clicked", G_CALLBACK(+[](FactsPage* self) { self->openElsewhere(); }), this);
 }
 
