@@ -2,10 +2,8 @@
 // What a preview's page says of a document that is not there, goes, comes, or becomes something else.
 #include <adwaita.h>
 
-#include "host/desktop/restoration_store.h"
 #include "host/drive/drive_file_progress.h"
 #include "host/drive/promise_file.h"
-#include "host/gtk/gtk_application_loop.h"
 #include "host/gtk/gtk_screens.h"
 #include "host/gtk/preview/preview_page.h"
 #include "host/host_platform.h"
@@ -17,6 +15,14 @@ namespace vaelo {
 namespace {
 
 using list_test::waitUntil;
+
+/// A page needs services, but no application that runs.
+class NoApplication : public Application {
+ public:
+  int run(int, char**, std::function<std::shared_ptr<ApplicationDelegate>()>) override { return 0; }
+  bool isRightToLeft() override { return false; }
+  std::string description() override { return ""; }
+};
 
 class OneDocument : public PreviewControllerDataSource {
  public:
@@ -62,9 +68,7 @@ class PresenterPageTest : public drive_test::DriveTest {
     adw_init();
     platform = std::make_unique<HostPlatform>(HostFolders{data, root + "/preferences.ini", root + "/restoration.ini"});
     screens = std::make_unique<GtkScreens>(platform->drive());
-    loop = std::make_unique<GtkApplicationLoop>(*screens, platform->notifications(), platform->userActivities(),
-                                                RestorationStore(root + "/restoration.ini"));
-    platform->install(*loop, *screens);
+    platform->install(application, *screens);
     window = gtk_window_new();
     gtk_window_set_default_size(GTK_WINDOW(window), 400, 500);
     gtk_window_present(GTK_WINDOW(window));
@@ -97,7 +101,7 @@ class PresenterPageTest : public drive_test::DriveTest {
   const std::string noText = std::string("\0\1\2\3\xff\xfe\0\0\1", 9);
   std::unique_ptr<HostPlatform> platform;
   std::unique_ptr<GtkScreens> screens;
-  std::unique_ptr<GtkApplicationLoop> loop;
+  NoApplication application;
   GtkWidget* window = nullptr;
   std::shared_ptr<OneDocument> source;
   std::shared_ptr<PreviewController> controller;

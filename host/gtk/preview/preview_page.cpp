@@ -1,9 +1,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/preview/preview_page.h"
 
-#include "host/desktop/recent_documents.h"
 #include <sys/stat.h>
 
+#include "host/desktop/recent_documents.h"
 #include "host/drive/packages.h"
 #include "host/gtk/bar_item_widget.h"
 
@@ -82,7 +82,7 @@ void PreviewPage::refresh() {
 void PreviewPage::infoReadAgain(GFileInfo* info) {
   reading_.reset();
   const char* type = info ? g_file_info_get_content_type(info) : nullptr;
-  type && viewedType_ == type ? view_->refresh() : load();
+  type&& viewedType_ == type ? view_->refresh() : load();
 }
 
 void PreviewPage::dropView() {
