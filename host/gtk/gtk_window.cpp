@@ -5,7 +5,6 @@
 
 #include "host/gtk/alert_dialog.h"
 #include "host/gtk/host_screen.h"
-#include "host/support/glib_ptr.h"
 #include "platform/ui/search_controller.h"
 
 namespace vaelo {
@@ -185,9 +184,13 @@ void GtkWindowHost::escape() {
 }
 
 void GtkWindowHost::showToast(const std::string& text, bool stays) {
-  // Its title is markup, which a name with "&" is not.
-  const std::string markup = takeString(g_markup_escape_text(text.c_str(), -1));
-  AdwToast* toast = adw_toast_new(markup.c_str());
+  // A toast's own title is one line of markup: too short for a phone, and a name with "&" shows nothing.
+  GtkWidget* label = gtk_label_new(text.c_str());
+  gtk_label_set_wrap(GTK_LABEL(label), TRUE);
+  gtk_label_set_xalign(GTK_LABEL(label), 0);
+  gtk_widget_add_css_class(label, "heading");
+  AdwToast* toast = adw_toast_new("");
+  adw_toast_set_custom_title(toast, label);
   if (stays) adw_toast_set_timeout(toast, 0);
   adw_toast_overlay_add_toast(ADW_TOAST_OVERLAY(toasts_), toast);
 }

@@ -72,8 +72,8 @@ TEST_F(BadInputListTest, AFolderThatCanBeReadAgainIsFollowedAgain) {
 
 TEST_F(BadInputListTest, EachReasonHasItsWords) {
   for (const auto& [number, words] :
-       {std::pair(EACCES, std::string("You don’t have the permission to see what is in it.")),
-        std::pair(EPERM, std::string("You don’t have the permission to see what is in it.")),
+       {std::pair(EACCES, std::string("You don’t have permission to see its items.")),
+        std::pair(EPERM, std::string("You don’t have permission to see its items.")),
         std::pair(ENOTDIR, std::string("It is no longer there.")),
         std::pair(ELOOP, std::string("The links to it lead in a circle.")), std::pair(EIO, std::string(g_strerror(EIO)))}) {
     view_->setUnreadable(number);

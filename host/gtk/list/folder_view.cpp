@@ -19,7 +19,7 @@ const char* reasonOf(int errorNumber) {
   switch (errorNumber) {
     case EACCES:
     case EPERM:
-      return _("You don’t have the permission to see what is in it.");
+      return _("You don’t have permission to see its items.");
     case ENOENT:
     case ENOTDIR:
       return _("It is no longer there.");
