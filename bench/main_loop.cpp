@@ -66,7 +66,8 @@ int main(int argc, char** argv) {
   const vaelo::HostFolders folders = vaelo::HostFolders::fromEnvironment();
   vaelo::HostPlatform platform(folders);
   vaelo::GtkScreens screens(platform.drive());
-  vaelo::GtkApplicationLoop loop(screens, platform.notifications(), vaelo::RestorationStore(folders.restorationFile));
+  vaelo::GtkApplicationLoop loop(screens, platform.drive(), platform.notifications(), platform.userActivities(),
+                                 vaelo::RestorationStore(folders.restorationFile));
   platform.install(loop, screens);
   waitForEvents = g_main_context_get_poll_func(nullptr);
   g_main_context_set_poll_func(nullptr, measuredPoll);

@@ -11,8 +11,20 @@ namespace vaelo {
 
 namespace {
 
+/// One made from a command line has no identifier and no entry to look into.
 bool isStartedOverTheBus(GAppInfo* app) {
-  return G_IS_DESKTOP_APP_INFO(app) && g_desktop_app_info_get_boolean(G_DESKTOP_APP_INFO(app), "DBusActivatable");
+  return G_IS_DESKTOP_APP_INFO(app) && g_app_info_get_id(app) &&
+         g_desktop_app_info_get_boolean(G_DESKTOP_APP_INFO(app), "DBusActivatable");
+}
+
+/// GIO starts programs through a helper, so a program that is not there would not be told.
+bool hasProgram(GAppInfo* app) {
+  const char* line = g_app_info_get_commandline(app);
+  char** words = nullptr;
+  if (!line || !g_shell_parse_argv(line, nullptr, &words, nullptr)) return false;
+  const bool found = !takeString(g_find_program_in_path(words[0])).empty();
+  g_strfreev(words);
+  return found;
 }
 
 void launched(GObject* app, GAsyncResult* result, gpointer held) {
@@ -36,6 +48,10 @@ bool launchApplication(GAppInfo* app, const std::vector<std::string>& uris, GApp
   if (isStartedOverTheBus(app)) {
     g_app_info_launch_uris_async(app, list, context, nullptr, launched, new LaunchFailed(std::move(failed)));
     return true;
+  }
+  if (!hasProgram(app)) {
+    failed("It is no longer installed.");
+    return false;
   }
   GError* error = nullptr;
   if (g_app_info_launch_uris(app, list, context, &error)) return true;
