@@ -187,6 +187,8 @@ void GtkWindowHost::showToast(const std::string& text, bool stays) {
   // A toast's own title is one line of markup: too short for a phone, and a name with "&" shows nothing.
   GtkWidget* label = gtk_label_new(text.c_str());
   gtk_label_set_wrap(GTK_LABEL(label), TRUE);
+  constexpr int phoneWidth = 32;  // characters beside the button that closes it
+  gtk_label_set_max_width_chars(GTK_LABEL(label), phoneWidth);
   gtk_label_set_xalign(GTK_LABEL(label), 0);
   gtk_widget_add_css_class(label, "heading");
   AdwToast* toast = adw_toast_new("");
