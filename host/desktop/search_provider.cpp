@@ -113,7 +113,7 @@ GVariant* metaOf(CloudDocuments& drive, const std::string& id, const URL& item) 
   return g_variant_builder_end(&meta);
 }
 
-/// Keeps the application from ending for want of windows while a call is under way.
+/// Keeps the application from ending for want of windows while a call is under way. Made and let go on the main thread.
 class Hold {
  public:
   Hold() : application_(g_application_get_default()) {
@@ -133,7 +133,11 @@ class Hold {
 
 SearchProvider::SearchProvider(LocalCloudDocuments& drive, Events events) : drive_(drive), events_(std::move(events)) {}
 
-SearchProvider::~SearchProvider() { unexport(); }
+SearchProvider::~SearchProvider() {
+  unexport();
+  const std::lock_guard lock(gate_->mutex);
+  gate_->closed = true;
+}
 
 bool SearchProvider::exportOn(GDBusConnection* bus, const std::string& objectPath, GError** error) {
   GDBusNodeInfo* node = g_dbus_node_info_new_for_xml(Interface, nullptr);
@@ -177,13 +181,16 @@ void SearchProvider::called(const std::string& method, GVariant* arguments, GDBu
 void SearchProvider::search(const std::vector<std::string>& terms, GDBusMethodInvocation* call) {
   if (searching_) *searching_ = true;
   searching_ = std::make_shared<std::atomic<bool>>(false);
-  worker_.run([&drive = drive_, terms, call, stopped = searching_, hold = std::make_shared<Hold>()] {
+  worker_.run([&drive = drive_, gate = gate_, terms, call, stopped = searching_,
+               hold = std::make_shared<Hold>()]() mutable -> std::function<void()> {
+    const std::lock_guard lock(gate->mutex);
+    if (gate->closed) return nullptr;
     std::vector<std::string> ids;
     for (const SearchHit& hit : NameSearch(terms).run(rootsOf(drive), MostResults, Budget, *stopped)) {
       const Result<std::int64_t> id = drive.index().documentIDFor(hit.path, true);
       if (id.value && *id.value > 0) ids.push_back(std::to_string(*id.value));
     }
-    return [ids, call, hold] {
+    return [ids, call, hold = std::move(hold)] {
       GVariantBuilder results;
       g_variant_builder_init(&results, G_VARIANT_TYPE_STRING_ARRAY);
       for (const std::string& id : ids) g_variant_builder_add(&results, "s", id.c_str());
@@ -193,19 +200,22 @@ void SearchProvider::search(const std::vector<std::string>& terms, GDBusMethodIn
 }
 
 void SearchProvider::describe(const std::vector<std::string>& ids, GDBusMethodInvocation* call) {
-  worker_.run([&drive = drive_, ids, call, hold = std::make_shared<Hold>()] {
-    GVariantBuilder metas;
-    g_variant_builder_init(&metas, G_VARIANT_TYPE("aa{sv}"));
-    for (std::size_t i = 0; i < std::min(ids.size(), MostResults); ++i) {
-      const std::optional<URL> item = itemWithID(drive, ids[i]);
-      if (item) g_variant_builder_add_value(&metas, metaOf(drive, ids[i], *item));
-    }
-    GVariant* answer = g_variant_ref_sink(g_variant_new("(aa{sv})", &metas));
-    return [answer, call, hold] {
-      g_dbus_method_invocation_return_value(call, answer);
-      g_variant_unref(answer);
-    };
-  });
+  worker_.run(
+      [&drive = drive_, gate = gate_, ids, call, hold = std::make_shared<Hold>()]() mutable -> std::function<void()> {
+        const std::lock_guard lock(gate->mutex);
+        if (gate->closed) return nullptr;
+        GVariantBuilder metas;
+        g_variant_builder_init(&metas, G_VARIANT_TYPE("aa{sv}"));
+        for (std::size_t i = 0; i < std::min(ids.size(), MostResults); ++i) {
+          const std::optional<URL> item = itemWithID(drive, ids[i]);
+          if (item) g_variant_builder_add_value(&metas, metaOf(drive, ids[i], *item));
+        }
+        GVariant* answer = g_variant_ref_sink(g_variant_new("(aa{sv})", &metas));
+        return [answer, call, hold = std::move(hold)] {
+          g_dbus_method_invocation_return_value(call, answer);
+          g_variant_unref(answer);
+        };
+      });
 }
 
 }  // namespace vaelo

@@ -6,6 +6,7 @@
 #include <atomic>
 #include <functional>
 #include <memory>
+#include <mutex>
 #include <string>
 #include <vector>
 
@@ -42,8 +43,15 @@ class SearchProvider {
   void search(const std::vector<std::string>& terms, GDBusMethodInvocation* call);
   void describe(const std::vector<std::string>& ids, GDBusMethodInvocation* call);
 
+  /// Keeps the drive from going while the worker is in it.
+  struct Gate {
+    std::mutex mutex;
+    bool closed = false;  // guarded by mutex
+  };
+
   LocalCloudDocuments& drive_;
   Events events_;
+  std::shared_ptr<Gate> gate_ = std::make_shared<Gate>();
   Worker worker_;
   std::shared_ptr<std::atomic<bool>> searching_;  // set to true: the search stops
   GDBusConnection* bus_ = nullptr;                // strong reference

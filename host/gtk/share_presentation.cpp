@@ -126,7 +126,8 @@ void SharePresentation::drop() {
   }
   if (flap_) {
     g_signal_handlers_disconnect_by_data(flap_, this);
-    gtk_overlay_remove_overlay(GTK_OVERLAY(overlay_), flap_);
+    // A window that ended first has let go of it.
+    if (gtk_widget_get_parent(flap_) == overlay_) gtk_overlay_remove_overlay(GTK_OVERLAY(overlay_), flap_);
     g_object_unref(std::exchange(flap_, nullptr));
     if (GtkWidget* pages = gtk_overlay_get_child(GTK_OVERLAY(overlay_))) gtk_widget_set_can_focus(pages, TRUE);
     if (focusBefore_ && gtk_widget_get_mapped(focusBefore_)) gtk_widget_grab_focus(focusBefore_);

@@ -101,7 +101,7 @@ class Share(unittest.TestCase):
 
     def clipboard(self, kind):
         return subprocess.run(["/usr/bin/python3", "-c", CLIPBOARD_READER, kind], env=self.app.desktop.environment, check=True,
-                              capture_output=True, text=True).stdout
+                              capture_output=True, text=True, timeout=30).stdout
 
 
 class Wide(Share):
@@ -117,6 +117,15 @@ class Wide(Share):
         (self.app.base / "org.example.Table.sh").unlink()
         self.choose("Open in “Table”")
         self.app.wait("“Table” Could Not Be Started")
+        self.assertTrue(self.app.running())
+
+    def test_any_application_can_be_chosen(self):
+        self.share()
+        self.choose("Open With Another Application…")
+        self.app.wait("Open “Budget 2026.csv”")
+        self.app.wait("Post")
+        self.app.key("Escape")
+        self.app.wait_gone("Post")
         self.assertTrue(self.app.running())
 
     def test_attaches_to_a_message(self):
@@ -152,7 +161,7 @@ class Wide(Share):
         self.app.wait("Link copied")
         link = self.clipboard("text/plain;charset=utf-8")
         self.assertTrue(link.startswith("vaelodriveapp:/"), link)
-        self.app.key("Escape")
+        self.app.click("Back", "push button")
         self.app.wait_title("Documents")
         self.assertEqual(self.app.link(link)[0], 0)
         self.app.wait_title("Budget 2026.csv")
@@ -176,7 +185,7 @@ class Wide(Share):
             ["xdotool", "search", "--onlyvisible", "--name", "Save a Copy"], env=self.app.desktop.environment, capture_output=True,
             text=True).stdout.split())[0]
         self.app.desktop.tool("xdotool", "windowfocus", "--sync", chooser)
-        self.app.wait("Save", "push button")
+        self.app.wait("_Save", "push button")
         self.app.key("ctrl+a")
         self.app.type(str(target))
         self.app.key("Return")
@@ -192,8 +201,11 @@ class Wide(Share):
         target = self.app.base / "copy.csv"
         target.write_text("precious")
         self.save_as(target)
-        self.app.wait("Replace", "push button")
+        self.app.wait("A file named “copy.csv” already exists.")
         self.assertEqual(target.read_text(), "precious")
+        self.app.key("alt+r")
+        self.app.wait("Saved a copy of “Budget 2026.csv”.")
+        self.assertEqual(target.read_bytes(), self.document.read_bytes())
 
     def test_what_is_not_downloaded_shares_its_link_alone(self):
         self.share("Documents/Thesis.pdf")

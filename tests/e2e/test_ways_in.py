@@ -1,6 +1,7 @@
 # SPDX-License-Identifier: GPL-3.0-or-later
 """The ways into the application from outside: the shell's search, shortcuts, links, and a start by the session bus."""
 import ast
+import configparser
 import pathlib
 import subprocess
 import unittest
@@ -10,6 +11,7 @@ from harness import PROGRAM, App, wait_for
 
 NAME = "com.marrow.VaeloDrive"
 PATH = "/com/marrow/VaeloDrive"
+DATA = pathlib.Path(__file__).resolve().parents[2] / "data"
 SEARCH = "org.gnome.Shell.SearchProvider2."
 
 
@@ -35,7 +37,12 @@ class Ways(unittest.TestCase):
         return done.stdout
 
     def search_call(self, method, *arguments):
-        return self.call(SEARCH + method, *arguments, path=PATH + "/SearchProvider")
+        provider = configparser.ConfigParser()
+        provider.read(DATA / f"{NAME}.search-provider.ini")
+        entry = provider["Shell Search Provider"]
+        self.assertEqual(entry["BusName"], NAME)
+        self.assertTrue((DATA / entry["DesktopId"]).is_file())
+        return self.call(SEARCH + method, *arguments, path=entry["ObjectPath"])
 
     def results(self, *terms):
         answer = self.search_call("GetInitialResultSet", str(list(terms)))
@@ -87,7 +94,7 @@ class ShellSearch(Ways):
         self.app.wait_log('Quarry Search Continuation: "minutes 1"')
 
     def test_hostile_terms_and_identifiers_do_no_harm(self):
-        for terms in ([], [""], ["\u202e\u0000"[:1]], ["../../etc/passwd"], ["%s%n%@"], ["x" * 100000], ["a"] * 5000, ["*?[", "\\\\"]):
+        for terms in ([], [""], ["\u202e"], ["../../etc/passwd"], ["%s%n%@"], ["x" * 100000], ["a"] * 5000, ["*?[", "\\\\"]):
             self.assertEqual(self.results(*terms), [], terms[:1])
         for identifier in ("", "0", "-1", "999999999999", "99999999999999999999999", "1; drop table", "/etc/passwd", "x" * 50000):
             self.assertNotIn("name", self.search_call("GetResultMetas", str([identifier])))
@@ -98,13 +105,9 @@ class ShellSearch(Ways):
         self.assertEqual(len(self.results("budget")), 1)
         self.assertTrue(self.app.running())
 
-    def results_of_a_gone_item(self):
+    def test_a_result_that_went_meanwhile_is_told(self):
         found = self.results("budget")
         (self.app.drive / "Documents" / "Budget 2026.csv").unlink()
-        return found
-
-    def test_a_result_that_went_meanwhile_is_told(self):
-        found = self.results_of_a_gone_item()
         self.assertNotIn("name", self.search_call("GetResultMetas", str(found)))
         self.search_call("ActivateResult", found[0], "['budget']", "0")
         self.app.wait("This search result is no longer in the drive.")
@@ -138,8 +141,8 @@ class Shortcuts(Ways):
         self.app.wait("No document of this drive was used recently.")
 
     def test_the_entry_names_what_the_application_does(self):
-        entry = (pathlib.Path(__file__).resolve().parents[2] / "data" / f"{NAME}.desktop").read_text()
-        known = self.call("org.freedesktop.DBus.Properties.GetAll", "org.gtk.Actions") and self.call("org.gtk.Actions.List")
+        entry = (DATA / f"{NAME}.desktop").read_text()
+        known = self.call("org.gtk.Actions.List")
         for action in entry.split("Actions=")[1].splitlines()[0].rstrip(";").split(";"):
             self.assertIn(f"'{action}'", known)
             self.assertIn(f"[Desktop Action {action}]", entry)
@@ -170,7 +173,7 @@ class Links(Ways):
     def test_a_file_of_the_drive_opens_and_others_do_not(self):
         self.assertEqual(self.app.link((self.app.drive / "Documents" / "Budget 2026.csv").as_uri())[0], 0)
         self.app.wait_title("Budget 2026.csv")
-        for link in ("file:///etc/passwd", "file:///%zz", "file://elsewhere" + str(self.app.drive), self.app.drive.as_uri() + "/gone"):
+        for link in ("file:///etc/passwd", "file:///%zz", f"file://elsewhere{self.app.drive}", self.app.drive.as_uri() + "/gone"):
             self.assertEqual(self.app.link(link)[0], 1, link)
 
     def test_bad_links_over_the_bus_are_told(self):
@@ -231,9 +234,8 @@ class BusActivation(Ways):
         self.app.process.wait(10)
         services = self.app.desktop.scratch / "run" / "dbus-1" / "services"
         services.mkdir(parents=True, exist_ok=True)
-        pid_file = self.app.base / "pid"
         starter = self.app.base / "start"
-        starter.write_text(f'#!/bin/sh\necho $$ > "{pid_file}"\nexec "{PROGRAM}" --gapplication-service > "{self.app.log_file}" 2>&1\n')
+        starter.write_text(f'#!/bin/sh\nexec "{PROGRAM}" --gapplication-service > "{self.app.log_file}" 2>&1\n')
         starter.chmod(0o755)
         (services / f"{NAME}.service").write_text(f"[D-BUS Service]\nName={NAME}\nExec={starter}\n")
         passed = {name: value for name, value in self.app.desktop.environment.items()
