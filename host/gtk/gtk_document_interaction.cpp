@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/gtk_document_interaction.h"
 
+#include <algorithm>
+
 #include "host/gtk/bar_item_widget.h"
 #include "host/gtk/gtk_window.h"
 #include "host/gtk/share_actions.h"
@@ -8,6 +10,8 @@
 namespace vaelo {
 
 namespace {
+
+constexpr int HeightLeftFree = 120;  // what a sheet lies over stays in sight, and a tap beside it possible
 
 /// The rectangle in the coordinates of the window's content, where the view is in a window.
 std::optional<graphene_rect_t> areaOf(const Rect& rect, const ViewRef& view) {
@@ -48,7 +52,9 @@ bool GtkDocumentInteraction::present(const ShareAnchor& anchor) {
   const bool narrow = window->traitCollection().horizontalSizeClass == SizeClass::Compact;
   std::function<void()> closed;
   if (narrow) closed = [this] { sheet_->close(); };
-  GtkWidget* content = makeShareSheet(actions->item(), actions->notice(), std::move(rows), std::move(closed));
+  GtkWidget* content = makeShareSheet(actions->item(), actions->notice(), std::move(rows),
+                                      std::max(200, gtk_widget_get_height(GTK_WIDGET(window->overlay())) - HeightLeftFree),
+                                      std::move(closed));
   sheet_ = std::make_unique<SharePresentation>(window, content, anchor, [this] {
     sheet_.reset();
     if (const auto delegate = delegate_.lock()) delegate->documentInteractionControllerDidDismissOptionsMenu(*this);

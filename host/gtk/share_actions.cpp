@@ -10,6 +10,7 @@
 #include "host/desktop/recent_documents.h"
 #include "host/gtk/alert_dialog.h"
 #include "host/gtk/gtk_window.h"
+#include "host/gtk/share_applications.h"
 #include "host/gtk/share_clipboard.h"
 #include "host/gtk/share_save.h"
 
@@ -127,23 +128,7 @@ bool ShareActions::openWithApplication(const ApplicationRecord& application) {
 void ShareActions::chooseApplication() {
   const auto window = window_.lock();
   if (!window || !hasContent()) return;
-  GtkWidget* chooser =
-      gtk_app_chooser_dialog_new_for_content_type(window->widget(), GTK_DIALOG_MODAL, item_.contentType.c_str());
-  gtk_app_chooser_dialog_set_heading(GTK_APP_CHOOSER_DIALOG(chooser),
-                                     ("Open “" + takeString(g_markup_escape_text(item_.name.c_str(), -1)) + "”").c_str());
-  GtkAppChooserWidget* list = GTK_APP_CHOOSER_WIDGET(gtk_app_chooser_dialog_get_widget(GTK_APP_CHOOSER_DIALOG(chooser)));
-  gtk_app_chooser_widget_set_show_all(list, TRUE);
-  gtk_app_chooser_widget_set_default_text(list, "No application can open this item.");
-  using Self = std::shared_ptr<ShareActions>;
-  g_signal_connect_data(
-      chooser, "response", G_CALLBACK(+[](GtkDialog* dialog, int response, gpointer held) {
-        const Self self = *static_cast<Self*>(held);
-        const GRef<GAppInfo> app(gtk_app_chooser_get_app_info(GTK_APP_CHOOSER(dialog)));
-        gtk_window_destroy(GTK_WINDOW(dialog));
-        if (response == GTK_RESPONSE_OK && app) self->openWith(app.get());
-      }),
-      new Self(shared_from_this()), [](gpointer held, GClosure*) { delete static_cast<Self*>(held); }, GConnectFlags(0));
-  gtk_window_present(GTK_WINDOW(chooser));
+  chooseApplicationFor(item_.name, window->widget(), [self = shared_from_this()](GAppInfo* app) { self->openWith(app); });
 }
 
 void ShareActions::sendByMail() {

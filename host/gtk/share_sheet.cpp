@@ -81,7 +81,8 @@ GtkWidget* makeRow(ShareRow& row) {
 
 }  // namespace
 
-GtkWidget* makeShareSheet(const SharedItem& item, const std::string& notice, std::vector<ShareRow> rows, Callback closed) {
+GtkWidget* makeShareSheet(const SharedItem& item, const std::string& notice, std::vector<ShareRow> rows, int mostHeight,
+                          Callback closed) {
   GtkWidget* box = gtk_box_new(GTK_ORIENTATION_VERTICAL, 12);
   for (auto margin :
        {gtk_widget_set_margin_top, gtk_widget_set_margin_bottom, gtk_widget_set_margin_start, gtk_widget_set_margin_end}) {
@@ -106,7 +107,7 @@ GtkWidget* makeShareSheet(const SharedItem& item, const std::string& notice, std
   GtkWidget* scrolled = gtk_scrolled_window_new();
   gtk_scrolled_window_set_policy(GTK_SCROLLED_WINDOW(scrolled), GTK_POLICY_NEVER, GTK_POLICY_AUTOMATIC);
   gtk_scrolled_window_set_propagate_natural_height(GTK_SCROLLED_WINDOW(scrolled), TRUE);
-  gtk_scrolled_window_set_max_content_height(GTK_SCROLLED_WINDOW(scrolled), 560);
+  gtk_scrolled_window_set_max_content_height(GTK_SCROLLED_WINDOW(scrolled), mostHeight);
   gtk_widget_set_size_request(scrolled, 340, -1);
   gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scrolled), box);
   return scrolled;

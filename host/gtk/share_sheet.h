@@ -21,8 +21,9 @@ struct ShareRow {
 };
 
 /// Makes the sheet: what is shared, what is to be known of it, and a list of rows. A row's `chosen` runs on a tap or Enter.
-/// `closed` is what the close button does; without one there is no such button. The caller sinks the reference. Main thread.
-GtkWidget* makeShareSheet(const SharedItem& item, const std::string& notice, std::vector<ShareRow> rows,
+/// `closed` is what the close button does; without one there is no such button. What is higher than `mostHeight` scrolls.
+/// The caller sinks the reference. Main thread.
+GtkWidget* makeShareSheet(const SharedItem& item, const std::string& notice, std::vector<ShareRow> rows, int mostHeight,
                           std::function<void()> closed);
 
 }  // namespace vaelo
