@@ -77,8 +77,10 @@ class ContractPlatform {
   virtual void setTags(const std::string& path, const std::vector<std::string>& tags) = 0;
   virtual void setShareRole(const std::string& path, const std::string& role) = 0;
   virtual void setModified(const std::string& path, Date date) = 0;
-  /// Another program's rename, which no service hears of.
+  // What another program does without coordination. Folders above are made as needed.
   virtual void renameBehind(const std::string& from, const std::string& to) = 0;
+  virtual void changeBehind(const std::string& path, const std::string& bytes) = 0;
+  virtual void removeBehind(const std::string& path) = 0;
   virtual void setAccount(std::optional<std::string> token) = 0;
   /// Another program has so many bytes of an item that is not downloaded; the item is there with the last of them.
   virtual void transfer(const std::string& path, std::int64_t completed, std::int64_t total) = 0;

@@ -12,17 +12,24 @@ using Names = std::vector<std::string>;
 class RecordingPresenter : public FilePresenter {
  public:
   RecordingPresenter(Queues& queues, std::optional<URL> url)
-      : url_(std::move(url)), queue_(queues.makeOperationQueue("presenter", QualityOfService::Default)) {}
+      : queue_(queues.makeOperationQueue("presenter", QualityOfService::Default)), url_(std::move(url)) {}
 
   std::vector<std::string> told() const {
     const std::lock_guard lock(mutex_);
     return told_;
   }
 
-  std::optional<URL> presentedItemURL() override { return url_; }
+  std::optional<URL> presentedItemURL() override {
+    const std::lock_guard lock(mutex_);
+    return url_;
+  }
   std::shared_ptr<OperationQueue> presentedItemOperationQueue() override { return queue_; }
   void presentedItemDidChange() override { note("changed"); }
-  void presentedItemDidMoveToURL(const URL& url) override { note("moved " + url.path()); }
+  void presentedItemDidMoveToURL(const URL& url) override {
+    note("moved " + url.path());
+    const std::lock_guard lock(mutex_);
+    url_ = url;
+  }
   void accommodatePresentedItemDeletionWithCompletionHandler(Completion completion) override {
     note("deleted");
     completion(std::nullopt);
@@ -37,10 +44,10 @@ class RecordingPresenter : public FilePresenter {
     const std::lock_guard lock(mutex_);
     told_.push_back(std::move(what));
   }
-  const std::optional<URL> url_;
   const std::shared_ptr<OperationQueue> queue_;
-  mutable std::mutex mutex_;
-  std::vector<std::string> told_;  // guarded by mutex_
+  mutable std::mutex mutex_;  // guards all below
+  std::optional<URL> url_;
+  std::vector<std::string> told_;
 };
 
 class CoordinationContract : public ContractTest {
@@ -215,6 +222,70 @@ TEST_P(CoordinationContract, LeavingTwiceOrWithoutHavingComeIsHarmless) {
   platform->coordination().removeFilePresenter(presenter);
   platform->coordination().removeFilePresenter(presenter);
   EXPECT_FALSE(write(item, WritingForDeleting));
+}
+
+// Other programs, which coordinate nothing.
+
+TEST_P(CoordinationContract, AnotherProgramsChangeIsTold) {
+  RecordingPresenter& presenter = present(item);
+  RecordingPresenter& beside = present(inDrive("folder/item2"));
+  platform->changeBehind(item.path(), "longer than before");
+  EXPECT_TRUE(platform->until([&] { return !presenter.told().empty(); }));
+  EXPECT_EQ(presenter.told().front(), "changed");
+  expectTold(beside, {});
+}
+
+TEST_P(CoordinationContract, AnotherProgramsRenameIsFollowed) {
+  RecordingPresenter& presenter = present(item);
+  platform->renameBehind(item.path(), inDrive("folder/renamed").path());
+  const std::string moved = "moved " + inDrive("folder/renamed").path();
+  EXPECT_TRUE(platform->until([&] { return presenter.told() == Names{moved}; }));
+  platform->renameBehind(folder.path(), inDrive("elsewhere").path());
+  EXPECT_TRUE(platform->until([&] {
+    return presenter.told() == Names{moved, "moved " + inDrive("elsewhere/renamed").path()};
+  })) << "with the folder above";
+}
+
+TEST_P(CoordinationContract, AnotherProgramsDeletionIsTold) {
+  RecordingPresenter& presenter = present(item);
+  platform->removeBehind(item.path());
+  EXPECT_TRUE(platform->until([&] { return !presenter.told().empty(); }));
+  EXPECT_EQ(presenter.told(), Names{"deleted"});
+}
+
+TEST_P(CoordinationContract, TheDeletionOfAFolderIsThatOfWhatIsInIt) {
+  RecordingPresenter& presenter = present(item);
+  platform->removeBehind(folder.path());
+  EXPECT_TRUE(platform->until([&] { return !presenter.told().empty(); }));
+  EXPECT_EQ(presenter.told(), Names{"deleted"});
+}
+
+TEST_P(CoordinationContract, SavingByRenamingIsAChange) {
+  RecordingPresenter& presenter = present(item);
+  platform->changeBehind(inDrive("folder/.item.new").path(), "saved anew");
+  platform->renameBehind(inDrive("folder/.item.new").path(), item.path());
+  EXPECT_TRUE(platform->until([&] { return !presenter.told().empty(); }));
+  EXPECT_EQ(presenter.told().front(), "changed");
+}
+
+TEST_P(CoordinationContract, WhatHappensInAPackageIsToldOfThePackage) {
+  const URL package = inDrive("album.sketchbundle", true);
+  platform->addFile(package.path() + "/pages/1");
+  RecordingPresenter& presenter = present(package);
+  platform->changeBehind(package.path() + "/pages/1", "longer than before");
+  EXPECT_TRUE(platform->until([&] { return !presenter.told().empty(); }));
+  EXPECT_EQ(presenter.told().front(), "changed");
+  platform->removeBehind(package.path() + "/pages/1");
+  EXPECT_TRUE(platform->until([&] { return presenter.told().back() == "deleted below " + package.path() + "/pages/1"; }));
+}
+
+TEST_P(CoordinationContract, ADocumentThatIsDownloadedHasChanged) {
+  const URL far = inDrive("far");
+  platform->addPromise(far.path(), PromiseFacts{4, {}, {}, false, {}, {}});
+  RecordingPresenter& presenter = present(far);
+  platform->transfer(far.path(), 4, 4);
+  EXPECT_TRUE(platform->until([&] { return !presenter.told().empty(); }));
+  EXPECT_EQ(presenter.told().front(), "changed");
 }
 
 }  // namespace

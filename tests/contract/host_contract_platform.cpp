@@ -154,6 +154,8 @@ class HostContractPlatform : public ContractPlatform {
     makeFolderFor(to);
     fs::rename(from, to);
   }
+  void changeBehind(const std::string& path, const std::string& bytes) override { write(path, bytes); }
+  void removeBehind(const std::string& path) override { fs::remove_all(path); }
   void setAccount(std::optional<std::string> token) override {
     // As another process does it: the file is replaced in one step.
     write(root_.path() + "/account.new", "[Account]\nName=Somebody\nToken=" + token.value_or("somebody") +

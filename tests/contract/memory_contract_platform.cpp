@@ -61,10 +61,12 @@ class MemoryContractPlatform : public ContractPlatform {
   void setModified(const std::string& path, Date date) override {
     memory_.disk.items[path].attributes.modificationDate = date;
   }
-  void renameBehind(const std::string& from, const std::string& to) override {
-    memory_.disk.addFolder(URL(to).deletingLastPathComponent().path());
-    memory_.disk.move(from, to);
+  void renameBehind(const std::string& from, const std::string& to) override { memory_.others.rename(from, to); }
+  void changeBehind(const std::string& path, const std::string& bytes) override {
+    memory_.clock->advance(std::chrono::milliseconds(1));
+    memory_.others.write(path, bytes.size());
   }
+  void removeBehind(const std::string& path) override { memory_.others.remove(path); }
   void setAccount(std::optional<std::string> token) override {
     memory_.cloud.setAccount(token ? std::optional(UbiquityIdentityToken{*token}) : std::nullopt);
   }
@@ -72,7 +74,7 @@ class MemoryContractPlatform : public ContractPlatform {
     memory_.queues.main().async([this, path, completed, total] {
       memory_.fileProgress.transfer(URL(path), completed, total);
       if (completed < total) return;
-      memory_.disk.items[path].isPromise = false;
+      memory_.others.download(path);
       memory_.fileProgress.finish(URL(path));
     });
   }

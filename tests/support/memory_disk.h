@@ -24,6 +24,8 @@ class MemoryDisk {
   /// An item that is not downloaded.
   MemoryItem& addPromise(const std::string& path, std::uint64_t size = 0);
 
+  Date now() const { return clock_->date(); }
+
   /// By logical path.
   std::map<std::string, MemoryItem> items;
 

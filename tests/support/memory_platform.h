@@ -16,6 +16,7 @@
 #include "tests/support/memory_formatting.h"
 #include "tests/support/memory_launch_services.h"
 #include "tests/support/memory_offers.h"
+#include "tests/support/memory_other_program.h"
 #include "tests/support/memory_preferences.h"
 #include "tests/support/memory_queues.h"
 #include "tests/support/memory_resource_values.h"
@@ -54,6 +55,7 @@ class MemoryPlatform {
   MemoryFileManager files{disk, record};
   MemoryResourceValues values{disk, types, record};
   MemoryFileCoordination coordination{record};
+  MemoryOtherProgram others{disk, coordination};
   MemoryCloudDocuments cloud{disk, queues, notifications, record};
   MemoryDocumentStore documents{disk, record};
   MemoryFileProvider provider{disk, cloud, queues};
