@@ -12,7 +12,7 @@ using Names = std::vector<std::string>;
 class RecordingPresenter : public FilePresenter {
  public:
   RecordingPresenter(Queues& queues, std::optional<URL> url)
-      : queue_(queues.makeOperationQueue("presenter", QualityOfService::Default)), url_(std::move(url)) {}
+      : url_(std::move(url)), queue_(queues.makeOperationQueue("presenter", QualityOfService::Default)) {}
 
   std::vector<std::string> told() const {
     const std::lock_guard lock(mutex_);
@@ -44,10 +44,10 @@ class RecordingPresenter : public FilePresenter {
     const std::lock_guard lock(mutex_);
     told_.push_back(std::move(what));
   }
-  const std::shared_ptr<OperationQueue> queue_;
-  mutable std::mutex mutex_;  // guards all below
+  mutable std::mutex mutex_;  // guards the two below
   std::optional<URL> url_;
   std::vector<std::string> told_;
+  const std::shared_ptr<OperationQueue> queue_;  // last: what is under way in it uses the others
 };
 
 class CoordinationContract : public ContractTest {
