@@ -26,7 +26,6 @@ SharePresentation::SharePresentation(const std::shared_ptr<GtkWindowHost>& windo
 
 SharePresentation::~SharePresentation() {
   drop();
-  g_clear_weak_pointer(&focusBefore_);
   g_object_unref(overlay_);
 }
 
@@ -121,6 +120,8 @@ void SharePresentation::drop() {
   if (ending_) g_source_remove(std::exchange(ending_, 0));
   if (popover_) {
     g_signal_handlers_disconnect_by_data(popover_, this);
+    // One that goes while it shows would keep the keyboard.
+    gtk_widget_set_visible(popover_, FALSE);
     gtk_widget_unparent(popover_);
     g_object_unref(std::exchange(popover_, nullptr));
   }
@@ -130,8 +131,9 @@ void SharePresentation::drop() {
     if (gtk_widget_get_parent(flap_) == overlay_) gtk_overlay_remove_overlay(GTK_OVERLAY(overlay_), flap_);
     g_object_unref(std::exchange(flap_, nullptr));
     if (GtkWidget* pages = gtk_overlay_get_child(GTK_OVERLAY(overlay_))) gtk_widget_set_can_focus(pages, TRUE);
-    if (focusBefore_ && gtk_widget_get_mapped(focusBefore_)) gtk_widget_grab_focus(focusBefore_);
   }
+  if (focusBefore_ && gtk_widget_get_mapped(focusBefore_)) gtk_widget_grab_focus(focusBefore_);
+  g_clear_weak_pointer(&focusBefore_);
 }
 
 }  // namespace vaelo
