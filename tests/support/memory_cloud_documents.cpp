@@ -63,6 +63,7 @@ CloudContainerRef MemoryCloudDocuments::containerWithIdentifier(const std::strin
 
 Result<CloudContainerRef> MemoryCloudDocuments::containerForURL(const URL& url) {
   Result<CloudContainerRef> result;
+  if (containerLookupTellsNothing) return result;
   if (containerError) result.error = containerError;
   if (containerError && !containerErrorComesWithValue) return result;
   const std::optional<std::string> identifier = containerIdentifierForURL(url);

@@ -39,7 +39,8 @@ class MemoryCloudDocuments : public CloudDocuments {
   bool containerErrorComesWithValue = false;
   /// There is no other copy of what is in the drive.
   std::optional<Error> evictError = memoryError(FileErrorCode::FeatureUnsupported, "", "It is not kept elsewhere");
-  CloudContainerRef containerOfEverything;  ///< instead of the one that holds the URL
+  bool containerLookupTellsNothing = false;  ///< neither a container nor an error
+  CloudContainerRef containerOfEverything;   ///< instead of the one that holds the URL
   std::map<std::string, Result<URL>> bookmarks;
   std::map<std::string, URL> logicalOfPromise;
   std::map<std::string, URL> physicalOfLogical;

@@ -4,6 +4,7 @@
 #include "app/settings.h"
 #include "platform/archive.h"
 #include "platform/ui/search_controller.h"
+#include "platform/url_components.h"
 #include "tests/unit/nav_review_fixture.h"
 
 namespace vaelo {
@@ -86,6 +87,14 @@ TEST_F(AppReviewEntryTest, modesAreKnownByTheirExactNames) {
   EXPECT_FALSE(open("vaelodriveapp:" + document.path() + "?mode=%zz")) << "no URL at all";
 }
 
+TEST_F(AppReviewEntryTest, aColonBehindASlashIsNoEndOfAScheme) {
+  const auto parts = URLComponents::parse("/a:b");
+  ASSERT_TRUE(parts);
+  EXPECT_EQ(parts->scheme, "");
+  EXPECT_EQ(parts->path, "/a:b");
+  EXPECT_FALSE(URLComponents::parse(":/a"));
+}
+
 TEST_F(AppReviewEntryTest, aLinkThatLeadsNowhereInTheDriveIsRefusedByTheWarp) {
   launch();
   presentSomething();
@@ -142,6 +151,13 @@ TEST_F(AppReviewEntryTest, anAliasThatIsNoArchiveFallsBack) {
   recentDocument({{RecentDocumentAliasURLKey, archiveURL(other).size() > 0 ? Value("text") : Value()},
                   {RecentDocumentDocIDKey, std::uint64_t{77}}});
   EXPECT_EQ(previewed(), document);
+}
+
+TEST_F(AppReviewEntryTest, anIdentifierThatIsNoNumberIsNotLookedUp) {
+  launch();
+  recentDocument({{RecentDocumentDocIDKey, "77"}, {RecentDocumentURLKey, archiveURL(document)}});
+  EXPECT_EQ(previewed(), document);
+  EXPECT_EQ(countOf("TBLibraryResolveDocumentId2 failed"), 0u);
 }
 
 // Continued activities.

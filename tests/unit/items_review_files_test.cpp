@@ -152,6 +152,19 @@ TEST_F(ItemsReviewFilesTest, aDeclaredTypeIsWelcomeWhereAnotherEntryIsBroken) {
   EXPECT_EQ(messages(), (Lines{"ERROR Expected array of strings", "INFO Container supports all UTIs"}));
 }
 
+TEST_F(ItemsReviewFilesTest, aTypeIsLookedAtOnceHoweverManyStandBetween) {
+  world.typeOfExtension["png"] = "public.png";
+  world.library->types.emplace({DeclaredDocumentType{Array{std::int64_t{3}, std::int64_t{4}}},
+                                DeclaredDocumentType{Array{std::int64_t{3}, "public.movie"}}});
+  EXPECT_FALSE(isValidInLibrary("a.png"));
+  EXPECT_EQ(messages(), (Lines{"ERROR Expected array of strings", "ERROR Expected array of strings"}));
+}
+
+TEST_F(ItemsReviewFilesTest, aLineThatBreaksWithoutAControlCharacterIsNoName) {
+  EXPECT_FALSE(FileUtils::isValidFilename("a\xE2\x80\xA8z"));
+  EXPECT_TRUE(FileUtils::isValidFilename("aXz"));
+}
+
 TEST_F(ItemsReviewFilesTest, anEmptyTypeIsWelcomeEverywhere) {
   world.typeOfExtension["empty"] = "";
   world.library->types.emplace({DeclaredDocumentType{Array{"public.png"}}});
@@ -193,6 +206,23 @@ TEST_F(ItemsReviewFilesTest, aContainerBesideAnErrorDoesNotServeByItself) {
   EXPECT_EQ(split(LibraryDocuments.appendingPathComponent("a"))->code, FileErrorCode::ReadUnknown);
   EXPECT_FALSE(container);
   EXPECT_EQ(names, Lines{"untouched"});
+}
+
+TEST_F(ItemsReviewFilesTest, aLookupThatTellsNothingIsTriedByIdentifierAndIsNoError) {
+  world.containerLookupTellsNothing = true;
+  const URL item = LibraryDocuments.appendingPathComponent("a.txt");
+  world.addFile(item, {{K::LocalizedName, "a"}});
+  EXPECT_FALSE(split(item));
+  EXPECT_EQ(container, world.library);
+  EXPECT_EQ(names, Lines{"a"});
+  world.containers.clear();
+  container = nullptr;
+  EXPECT_FALSE(split(item)) << "no error, and no container either";
+  EXPECT_FALSE(container);
+  EXPECT_EQ(messages(), Lines{"WARNING Split URL: (null)"});
+  EXPECT_FALSE(FileUtils::displayableLocationForURL(item));
+  world.typeOfExtension["txt"] = "public.text";
+  EXPECT_FALSE(FileUtils::isValidExtensionForContainer(item));
 }
 
 TEST_F(ItemsReviewFilesTest, anItemOutsideTheMirrorCannotBeSplitWhateverItsContainer) {

@@ -85,6 +85,27 @@ TEST_F(ItemsReviewRecordTest, aTargetOfOneComponentIsReadAgainstTheFolderThatIsK
   EXPECT_EQ(item->parentDirectoryURL(), Drive) << "the folder of the values comes later";
 }
 
+TEST_F(ItemsReviewRecordTest, aTargetOfOneComponentNeedsBothTheStoredTargetAndTheFolder) {
+  world.linkTargets.insert_or_assign(Item.path(), URL("/"));
+  const ResourceMap link{{K::TypeIdentifier, "public.symlink"}};
+  const auto without = filled();
+  without->setParentDirectoryURL(Drive);
+  without->initFromKeysAndValuesWithURL(link, Item);
+  EXPECT_FALSE(without->resolvedURL());
+  const auto item = linkFromAttributes("neighbour");
+  item->setParentDirectoryURL(std::nullopt);
+  item->initFromKeysAndValuesWithURL(link, Item);
+  EXPECT_FALSE(item->resolvedURL());
+}
+
+TEST_F(ItemsReviewRecordTest, aPromiseURLWithoutAResolvedOneIsAPromise) {
+  const auto item = filled();
+  item->setResolvedURL(std::nullopt);
+  EXPECT_TRUE(item->isPromise());
+  item->setPromiseURL(std::nullopt);
+  EXPECT_FALSE(item->isPromise());
+}
+
 TEST_F(ItemsReviewRecordTest, aTargetOfMoreComponentsStaysAsItIs) {
   const auto item = linkFromAttributes("neighbour");
   world.linkTargets.insert_or_assign(Item.path(), Target);
@@ -139,6 +160,12 @@ TEST_F(ItemsReviewRecordTest, onlyAPackageIsSummedUp) {
 TEST_F(ItemsReviewRecordTest, aContainerIsNotRenamedWhoeverOwnsIt) {
   world.addFolder(LibraryDocuments, {{K::IsShared, true}, {K::SharedItemRole, SharedItemRoleOwner}});
   EXPECT_FALSE(DRItem::initWithURL(LibraryDocuments)->renameable());
+}
+
+TEST_F(ItemsReviewRecordTest, aContainerOfWhichNothingIsToldKeepsTheNameOfItsFolder) {
+  world.addFolder(LibraryDocuments, {{K::LocalizedName, "Documents"}});
+  world.containerLookupTellsNothing = true;
+  EXPECT_EQ(DRItem::initWithURL(LibraryDocuments)->localizedName(), "Documents");
 }
 
 TEST_F(ItemsReviewRecordTest, fromAttributesNothingIsAContainerNorShared) {

@@ -69,6 +69,13 @@ TEST_F(ItemsReviewReferencesTest, aFolderOfAnotherContainerIsNeitherDesktopNorDo
   EXPECT_FALSE(vlo_isDesktopOrDocumentsFolder(Drive.appendingPathComponent("Documents")));
 }
 
+TEST_F(ItemsReviewReferencesTest, whereTheContainerIsUnknownNothingIsPromised) {
+  world.movableTo = {LibraryIdentifier, DriveIdentifier};
+  world.containerLookupTellsNothing = true;
+  EXPECT_FALSE(vlo_isDesktopOrDocumentsFolder(Drive.appendingPathComponent("Documents")));
+  EXPECT_FALSE(vlo_canCrossZoneMoveURLs({Document}));
+}
+
 TEST_F(ItemsReviewReferencesTest, theLargestNumbersAreReadToTheirLastDigit) {
   for (const char* number : {"18446744073709551614", "17000000000000000000", "9223372036854775808"}) {
     vlo_URLFromDocumentID(number);

@@ -67,6 +67,7 @@ class ItemsWorld : public MemoryPlatform {
   std::vector<CloudContainerRef>& containers = cloud.containers;
   std::optional<Error>& containerError = cloud.containerError;
   bool& containerErrorComesWithValue = cloud.containerErrorComesWithValue;
+  bool& containerLookupTellsNothing = cloud.containerLookupTellsNothing;
   CloudContainerRef& containerOfEverything = cloud.containerOfEverything;
   std::map<std::string, Result<URL>>& bookmarks = cloud.bookmarks;
   std::map<std::string, URL>& logicalOfPromise = cloud.logicalOfPromise;
