@@ -1,14 +1,182 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/decoder/document_decoder.h"
 
+#include <algorithm>
+#include <chrono>
+#include <cstring>
+
+#include "host/decoder/document_text.h"
+#include "host/decoder/document_words.h"
+#include "host/decoder/pixel_file.h"
 #include "host/support/decoder_error.h"
 
 namespace vaelo {
 
-DocumentDecoder::DocumentDecoder(UniqueFd document) : document_(std::move(document)) {}
+namespace {
 
-DecoderMessage DocumentDecoder::answer(const std::string&) {
-  return {std::string("error ") + DecoderError::Unsupported, UniqueFd()};
+using Clock = std::chrono::steady_clock;
+
+constexpr int MostPages = 200'000;
+constexpr double SmallestSide = 1;  // points; what is less can't be looked at
+constexpr double LargestSide = 20'000;
+constexpr double LargestScale = 64;
+constexpr int MostPixelsOnASide = 8192;
+constexpr int MostPixels = 16 * 1024 * 1024;
+constexpr int MostSizesInAnAnswer = 500;
+constexpr std::chrono::milliseconds SizesTake(10);
+constexpr std::chrono::milliseconds FindingTakes(60);
+constexpr std::size_t LongestAnswer = 60'000;  // bytes, within DecoderMessage::MaximumText
+constexpr int MostMatchesOnAPage = 500;
+
+DecoderMessage error(const char* reason) { return {std::string("error ") + reason, UniqueFd()}; }
+DecoderMessage ok() { return {"ok", UniqueFd()}; }
+DecoderMessage damaged() { return error(DecoderError::Damaged); }
+
+double side(double points) { return std::isfinite(points) ? std::clamp(points, SmallestSide, LargestSide) : SmallestSide; }
+
+}  // namespace
+
+DocumentDecoder::DocumentDecoder(UniqueFd document) : original_(std::move(document)) {}
+
+DecoderMessage DocumentDecoder::answer(const std::string& request) {
+  std::string_view words = request;
+  const std::string_view command = nextWord(words);
+  if (command == "open") return open(std::string(words));
+  if (!document_) return damaged();
+  if (command == "sizes") return sizes(words);
+  if (command == "render") return render(words);
+  if (command == "text") return text(words);
+  if (command == "find") return find(words);
+  if (command == "areas") return areas(words);
+  if (command == "mark") return marks_.add(words, pages_) ? ok() : error(DecoderError::Unsupported);
+  if (command == "unmark") {
+    marks_.clear();
+    return ok();
+  }
+  if (command == "save") return save();
+  return error(DecoderError::Unsupported);
+}
+
+DecoderMessage DocumentDecoder::open(const std::string& password) {
+  const char* problem = nullptr;
+  document_ = openPortableDocument(original_, password, problem);
+  if (!document_) return error(problem);
+  password_ = password;
+  pages_ = std::min(poppler_document_get_n_pages(document_.get()), MostPages);
+  if (pages_ <= 0) return damaged();
+  const bool mayMark = poppler_document_get_permissions(document_.get()) & POPPLER_PERMISSIONS_OK_TO_ADD_NOTES;
+  return {"ok " + std::to_string(pages_) + (mayMark ? " 1" : " 0") + sizesFrom(0), UniqueFd()};
+}
+
+DecoderMessage DocumentDecoder::sizes(std::string_view words) {
+  int from = 0;
+  if (!nextNumber(words, from) || from < 0 || from >= pages_) return error(DecoderError::Unsupported);
+  return {"ok" + sizesFrom(from), UniqueFd()};
+}
+
+// A page that can't be read gets a usual size and says so when it is rendered.
+std::string DocumentDecoder::sizesFrom(int from) const {
+  std::string found;
+  const Clock::time_point end = Clock::now() + SizesTake;
+  for (int i = from; i < pages_ && i < from + MostSizesInAnAnswer && (i == from || Clock::now() < end); ++i) {
+    double width = 595;
+    double height = 842;
+    if (const GRef<PopplerPage> read = page(i)) poppler_page_get_size(read.get(), &width, &height);
+    appendNumber(found, side(width));
+    appendNumber(found, side(height));
+  }
+  return found;
+}
+
+GRef<PopplerPage> DocumentDecoder::page(int index) const {
+  if (index < 0 || index >= pages_) return {};
+  return GRef<PopplerPage>(poppler_document_get_page(document_.get(), index));
+}
+
+DecoderMessage DocumentDecoder::render(std::string_view words) {
+  int index = 0;
+  double scale = 0;
+  int x = 0;
+  int y = 0;
+  int width = 0;
+  int height = 0;
+  if (!nextNumber(words, index) || !nextNumber(words, scale) || !nextNumber(words, x) || !nextNumber(words, y) ||
+      !nextNumber(words, width) || !nextNumber(words, height) || scale <= 0 || scale > LargestScale || x < 0 || y < 0 ||
+      width <= 0 || height <= 0 || width > MostPixelsOnASide || height > MostPixelsOnASide || width > MostPixels / height) {
+    return error(DecoderError::Unsupported);
+  }
+  const GRef<PopplerPage> shown = page(index);
+  if (!shown) return damaged();
+  const int stride = width * 4;
+  PixelFile pixels(static_cast<std::size_t>(stride) * static_cast<std::size_t>(height));
+  if (!pixels.data()) return error(DecoderError::TooBig);
+  cairo_surface_t* surface = cairo_image_surface_create_for_data(pixels.data(), CAIRO_FORMAT_ARGB32, width, height, stride);
+  cairo_t* context = cairo_create(surface);
+  cairo_set_source_rgb(context, 1, 1, 1);
+  cairo_paint(context);
+  cairo_translate(context, -x, -y);
+  cairo_scale(context, scale, scale);
+  poppler_page_render(shown.get(), context);
+  const bool drawn = cairo_status(context) == CAIRO_STATUS_SUCCESS;
+  cairo_destroy(context);
+  cairo_surface_finish(surface);
+  cairo_surface_destroy(surface);
+  return drawn ? DecoderMessage{"ok", pixels.take()} : damaged();
+}
+
+DecoderMessage DocumentDecoder::text(std::string_view words) {
+  int index = 0;
+  const GRef<PopplerPage> read = nextNumber(words, index) ? page(index) : nullptr;
+  if (!read) return damaged();
+  const PageText found = textOf(read.get());
+  if (found.boxes.empty()) return {"ok 0", UniqueFd()};
+  const std::size_t boxBytes = found.boxes.size() * sizeof found.boxes.front();
+  PixelFile file(boxBytes + found.text.size());
+  if (!file.data()) return error(DecoderError::TooBig);
+  std::memcpy(file.data(), found.boxes.data(), boxBytes);
+  std::memcpy(file.data() + boxBytes, found.text.data(), found.text.size());
+  return {"ok " + std::to_string(found.boxes.size()), file.take()};
+}
+
+DecoderMessage DocumentDecoder::find(std::string_view words) {
+  int from = 0;
+  if (!nextNumber(words, from) || from < 0 || from >= pages_ || words.empty()) return error(DecoderError::Unsupported);
+  const std::string wanted(words);
+  const Clock::time_point end = Clock::now() + FindingTakes;
+  int next = from;
+  std::vector<PageBox> matches;
+  do {
+    if (const GRef<PopplerPage> searched = page(next)) matches = findText(searched.get(), wanted, MostMatchesOnAPage);
+    ++next;
+  } while (matches.empty() && next < pages_ && Clock::now() < end);
+  std::string found = "ok " + std::to_string(next);
+  for (const PageBox& match : matches) {
+    for (const float edge : match) appendNumber(found, static_cast<double>(edge));
+  }
+  return {std::move(found), UniqueFd()};
+}
+
+DecoderMessage DocumentDecoder::areas(std::string_view words) {
+  int index = 0;
+  const GRef<PopplerPage> read = nextNumber(words, index) ? page(index) : nullptr;
+  if (!read) return damaged();
+  std::string found = "ok ";
+  for (const std::string& line : areasOf(document_.get(), read.get())) {
+    if (found.size() + line.size() < LongestAnswer) found += line + '\n';
+  }
+  return {std::move(found), UniqueFd()};
+}
+
+// What was saved is read back and must be as long as the original: it is going to take the original's place.
+DecoderMessage DocumentDecoder::save() {
+  const char* problem = nullptr;
+  UniqueFd marked = marks_.apply(original_, password_, problem);
+  if (!marked) return error(problem);
+  const GRef<PopplerDocument> readBack = openPortableDocument(marked, password_, problem);
+  if (!readBack || std::min(poppler_document_get_n_pages(readBack.get()), MostPages) != pages_) {
+    return error(DecoderError::Unsupported);
+  }
+  return {"ok", std::move(marked)};
 }
 
 }  // namespace vaelo

@@ -4,6 +4,10 @@
 #include <algorithm>
 #include <array>
 
+#include "host/gtk/preview/picture_view.h"
+#include "host/gtk/preview/portable_document_view.h"
+#include "host/gtk/preview/text_view.h"
+
 namespace vaelo {
 
 namespace {
@@ -14,7 +18,10 @@ struct Kind {
 };
 
 // The first that shows a type has it.
-constexpr std::array<Kind, 0> Kinds = {};
+constexpr std::array Kinds = {
+    Kind{showsPortableDocument, makePortableDocumentView}, Kind{showsPicture, makePictureView},
+    Kind{showsText, makeTextView},  // last, since much else is text too
+};
 
 const Kind* kindOf(const std::string& contentType) {
   const auto found = std::find_if(Kinds.begin(), Kinds.end(), [&](const Kind& kind) { return kind.shows(contentType); });

@@ -1,0 +1,140 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/decoder/document_marks.h"
+
+#include <fcntl.h>
+#include <sys/mman.h>
+#include <sys/stat.h>
+
+#include <algorithm>
+
+#include "host/decoder/document_ink.h"
+#include "host/decoder/document_words.h"
+#include "host/support/decoder_error.h"
+
+namespace vaelo {
+
+namespace {
+
+constexpr std::size_t MostMarks = 5000;
+constexpr off_t LargestDocument = 256 * 1024 * 1024;  // bytes; the marked one is made in memory
+
+double heightOf(PopplerPage* page) {
+  double height = 0;
+  poppler_page_get_size(page, nullptr, &height);
+  return height;
+}
+
+PopplerColor colourOf(const DocumentMark& mark) {
+  const auto part = [&](std::size_t i) { return static_cast<guint16>(std::clamp(mark.colour[i], 0.0, 1.0) * 65535); };
+  return {part(0), part(1), part(2)};
+}
+
+// Where the library counts upwards from the lower edge.
+PopplerQuadrilateral quadOf(const PageBox& box, double height) {
+  const double left = static_cast<double>(box[0]);
+  const double top = height - static_cast<double>(box[1]);
+  const double right = static_cast<double>(box[2]);
+  const double bottom = height - static_cast<double>(box[3]);
+  return {{left, top}, {right, top}, {left, bottom}, {right, bottom}};
+}
+
+GRef<PopplerAnnot> highlightOf(PopplerDocument* document, const std::vector<PageBox>& lines, double height) {
+  GArray* quads = g_array_new(FALSE, FALSE, sizeof(PopplerQuadrilateral));
+  PopplerRectangle all = {1e9, 1e9, -1e9, -1e9};
+  for (const PageBox& line : lines) {
+    const PopplerQuadrilateral quad = quadOf(line, height);
+    g_array_append_val(quads, quad);
+    all = {std::min(all.x1, quad.p3.x), std::min(all.y1, quad.p3.y), std::max(all.x2, quad.p2.x),
+           std::max(all.y2, quad.p2.y)};
+  }
+  GRef<PopplerAnnot> annotation(poppler_annot_text_markup_new_highlight(document, &all, quads));
+  g_array_unref(quads);
+  return annotation;
+}
+
+GRef<PopplerAnnot> noteOf(PopplerDocument* document, const DocumentMark& mark, double height) {
+  constexpr double side = 24;  // of the note's icon, points
+  const double left = mark.points.front()[0];
+  const double top = height - mark.points.front()[1];
+  PopplerRectangle place = {left, top - side, left + side, top};
+  GRef<PopplerAnnot> annotation(poppler_annot_text_new(document, &place));
+  poppler_annot_set_contents(annotation.get(), mark.text.c_str());
+  return annotation;
+}
+
+// The library can't write ink. It writes a highlight over the whole page in its place, long enough for the ink's words.
+GRef<PopplerAnnot> placeOfInk(PopplerDocument* document, const DocumentMark& mark, PopplerPage* page) {
+  double width = 0;
+  double height = 0;
+  poppler_page_get_size(page, &width, &height);
+  GRef<PopplerAnnot> annotation =
+      highlightOf(document, {{0, 0, static_cast<float>(width), static_cast<float>(height)}}, height);
+  poppler_annot_set_contents(annotation.get(), std::string(inkWordsLength(mark.points.size()), '.').c_str());
+  return annotation;
+}
+
+template <typename Number>
+bool nextNumbers(std::string_view& words, Number* numbers, std::size_t count) {
+  return std::all_of(numbers, numbers + count, [&](Number& number) { return nextNumber(words, number); });
+}
+
+}  // namespace
+
+bool DocumentMarks::add(std::string_view words, int pages) {
+  DocumentMark mark;
+  const std::string_view kind = nextWord(words);
+  if (!nextNumber(words, mark.page) || mark.page < 0 || mark.page >= pages || marks_.size() == MostMarks) return false;
+  if (!nextNumbers(words, mark.colour.data(), mark.colour.size())) return false;
+  if (kind == "highlight") {
+    mark.kind = DocumentMark::Kind::Highlight;
+    while (!words.empty()) {
+      if (!nextNumbers(words, mark.lines.emplace_back().data(), 4)) return false;
+    }
+  } else if (kind == "ink") {
+    mark.kind = DocumentMark::Kind::Ink;
+    if (!nextNumber(words, mark.width) || mark.width <= 0) return false;
+    while (!words.empty()) {
+      if (!nextNumbers(words, mark.points.emplace_back().data(), 2)) return false;
+    }
+  } else if (kind == "note") {
+    mark.kind = DocumentMark::Kind::Note;
+    if (!nextNumbers(words, mark.points.emplace_back().data(), 2)) return false;
+    mark.text = words;
+  } else {
+    return false;
+  }
+  if (mark.lines.empty() && mark.points.empty()) return false;
+  marks_.push_back(std::move(mark));
+  return true;
+}
+
+UniqueFd DocumentMarks::apply(const UniqueFd& original, const std::string& password, const char*& problem) const {
+  struct stat status = {};
+  problem = DecoderError::TooBig;
+  if (::fstat(original.get(), &status) != 0 || status.st_size > LargestDocument) return UniqueFd();
+  const GRef<PopplerDocument> document = openPortableDocument(original, password, problem);
+  if (!document) return UniqueFd();
+  problem = DecoderError::Unsupported;
+  // In the order in which they were made, which is the order in which they are written.
+  for (const DocumentMark& mark : marks_) {
+    const GRef<PopplerPage> page(poppler_document_get_page(document.get(), mark.page));
+    if (!page) return UniqueFd();
+    GRef<PopplerAnnot> annotation;
+    if (mark.kind == DocumentMark::Kind::Highlight)
+      annotation = highlightOf(document.get(), mark.lines, heightOf(page.get()));
+    if (mark.kind == DocumentMark::Kind::Note) annotation = noteOf(document.get(), mark, heightOf(page.get()));
+    if (mark.kind == DocumentMark::Kind::Ink) annotation = placeOfInk(document.get(), mark, page.get());
+    PopplerColor colour = colourOf(mark);
+    poppler_annot_set_color(annotation.get(), &colour);
+    poppler_annot_set_flags(annotation.get(), POPPLER_ANNOT_FLAG_PRINT);
+    poppler_page_add_annot(page.get(), annotation.get());
+  }
+  UniqueFd marked(::memfd_create("marked", MFD_CLOEXEC | MFD_ALLOW_SEALING));
+  // The library closes what it is given.
+  const int given = marked ? ::fcntl(marked.get(), F_DUPFD_CLOEXEC, 3) : -1;
+  if (given < 0 || !poppler_document_save_to_fd(document.get(), given, !marks_.empty(), nullptr)) return UniqueFd();
+  if (!writeInk(marked, status.st_size, marks_)) return UniqueFd();
+  return marked;
+}
+
+}  // namespace vaelo

@@ -1,0 +1,91 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/gtk/preview/text_load.h"
+
+#include <algorithm>
+
+namespace vaelo {
+
+namespace {
+
+constexpr gint64 SliceMicroseconds = 6000;
+constexpr std::size_t SliceBytes = 32 * 1024;
+// Painting goes before, but laying out what is out of sight comes after.
+constexpr int AppendPriority = GDK_PRIORITY_REDRAW + 2;
+// Marks of syntax take several times the memory of the text.
+constexpr std::uint64_t MostHighlighted = 8 * 1024 * 1024;
+
+// The end of the whole characters in the next slice.
+std::size_t sliceEnd(const std::string& text, std::size_t begin) {
+  std::size_t end = std::min(begin + SliceBytes, text.size());
+  while (end < text.size() && (static_cast<unsigned char>(text[end]) & 0xc0) == 0x80) --end;
+  return end;
+}
+
+}  // namespace
+
+TextLoad::TextLoad(const std::string& path, const std::string& name, const std::string& contentType, Events events)
+    : name_(name), contentType_(contentType), events_(std::move(events)), reader_(path), buffer_(gtk_source_buffer_new(nullptr)) {
+  gtk_text_buffer_set_enable_undo(GTK_TEXT_BUFFER(buffer_.get()), FALSE);
+  gtk_source_buffer_set_highlight_matching_brackets(buffer_.get(), FALSE);
+  reader_.next([this](TextPiece piece) { received(std::move(piece)); });
+}
+
+TextLoad::~TextLoad() { g_clear_handle_id(&idle_, g_source_remove); }
+
+void TextLoad::prepareLanguage() {
+  GtkSourceLanguageManager* languages = gtk_source_language_manager_get_default();
+  GtkSourceLanguage* language = gtk_source_language_manager_guess_language(languages, name_.c_str(), contentType_.c_str());
+  if (!language) return;
+  gtk_source_buffer_set_language(buffer_.get(), language);
+  gtk_source_buffer_set_highlight_syntax(buffer_.get(), piece_.documentBytes <= MostHighlighted);
+}
+
+void TextLoad::received(TextPiece piece) {
+  if (piece.error) {
+    finished_ = true;
+    const std::string error = piece.error;
+    // A document that was shown stays as far as it was read.
+    if (!begun_) return events_.failed(error);
+    piece_.shortened = true;
+    return events_.advanced();
+  }
+  piece_ = std::move(piece);
+  appended_ = 0;
+  if (!begun_) {
+    begun_ = true;
+    prepareLanguage();
+    if (!append()) return events_.advanced();
+  }
+  idle_ = g_idle_add_full(
+      AppendPriority,
+      +[](gpointer data) -> gboolean {
+        auto* self = static_cast<TextLoad*>(data);
+        if (self->append()) return G_SOURCE_CONTINUE;
+        self->idle_ = 0;
+        self->events_.advanced();
+        return G_SOURCE_REMOVE;
+      },
+      this, nullptr);
+  events_.advanced();
+}
+
+// True while there is more of the piece.
+bool TextLoad::append() {
+  const gint64 end = g_get_monotonic_time() + SliceMicroseconds;
+  GtkTextBuffer* buffer = GTK_TEXT_BUFFER(buffer_.get());
+  while (appended_ < piece_.text.size()) {
+    if (g_get_monotonic_time() > end) return true;
+    const std::size_t until = sliceEnd(piece_.text, appended_);
+    GtkTextIter place;
+    gtk_text_buffer_get_end_iter(buffer, &place);
+    gtk_text_buffer_insert(buffer, &place, piece_.text.data() + appended_, static_cast<int>(until - appended_));
+    appended_ = until;
+  }
+  piece_.text.clear();
+  piece_.text.shrink_to_fit();
+  finished_ = piece_.last;
+  if (!finished_) reader_.next([this](TextPiece piece) { received(std::move(piece)); });
+  return false;
+}
+
+}  // namespace vaelo
