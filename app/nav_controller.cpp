@@ -105,32 +105,6 @@ void NavController::initNewListController(const DocumentListControllerRef& list)
   list->setDelegate(weakSelf(this));
 }
 
-void NavController::setEditModeAndUpdateUIForViewController(bool edit, const DocumentListControllerRef& list) {
-  editMode_ = edit;
-  if (list) list->setEditingAnimated(edit, true);
-  configureVisibleControllerForMode();
-}
-
-void NavController::configureVisibleControllerForMode() {
-  const DocumentListControllerRef list = getTopDocumentListController();
-  if (!list) return;
-  configureNavBar(list);
-  configureToolbar(list);
-  updateStatusUI(list);
-}
-
-void NavController::configureNavBar(const DocumentListControllerRef& list) {
-  list->navigationItem().setHidesBackButton(editMode_, false);
-  list->navigationItem().setTitle(editMode_ ? localized("Select Items") : viewTitle_);
-}
-
-void NavController::configureToolbar(const DocumentListControllerRef& list) {
-  if (editMode_) return;
-  if (!statusBarOf(*list)) createStatusBarButtonPressDelegate(*list, upgradeOffer_, weakSelf(this));
-  displayStatusBar(*list);
-  updateStatusUI(list);
-}
-
 void NavController::navigationControllerWillShowViewControllerAnimated(NavigationController&, const ViewControllerRef&,
                                                                        bool) {}
 

@@ -13,6 +13,7 @@
 #include "platform/notifications.h"
 #include "platform/ui/document_interaction_controller.h"
 #include "platform/ui/document_list_controller_delegate.h"
+#include "platform/ui/document_target_selection_controller.h"
 #include "platform/ui/navigation_controller.h"
 #include "platform/ui/upgrade_flow_manager.h"
 
@@ -30,6 +31,7 @@ class NavController : public NavigationController,
                       public NavigationControllerDelegate,
                       public DocumentListControllerDelegate,
                       public DocumentInteractionControllerDelegate,
+                      public DocumentTargetSelectionControllerDelegate,
                       public QuotaFetcherDelegate,
                       public DocumentListControllerStatusBarDelegate {
  public:
@@ -87,11 +89,39 @@ class NavController : public NavigationController,
   void logContainerURL();
 
   // Modes and bars.
+  /// The Select button, the Cancel button, and a command that selects everything in the visible list.
+  void beginEditMode(const BarButtonItemRef& sender);
+  void endEditMode(const BarButtonItemRef& sender);
+  void selectAllItems(const BarButtonItemRef& sender);
   /// The one place where the mode changes.
   void setEditModeAndUpdateUIForViewController(bool edit, const DocumentListControllerRef& list);
   void configureVisibleControllerForMode();
   void configureNavBar(const DocumentListControllerRef& list);
   void configureToolbar(const DocumentListControllerRef& list);
+
+  // Names, folders and moves.
+  void showRenamePrompt(const URL& url);
+  void promtForNewFolderAndCreate();
+  void showMoveTargetForSelectedItems();
+  /// Asks where the items of the folder are to go, then moves them.
+  void showMoveTargetForItemsInFolder(const std::vector<URL>& items, const std::optional<URL>& folder);
+  /// Asks for the name of a new folder in `folder`, makes it, and moves the items, if any, into it.
+  void showNewFolderPromptDuringMoveItemsToMove(const std::optional<URL>& folder, const std::vector<URL>& items);
+  /// Tries every item; one error for each that could not be moved.
+  std::vector<Error> moveItemsToDirectoryToDirectory(const std::vector<URL>& items, const URL& folder);
+  void moveItemsToDirectoryAndShowErrorsToDirectory(const std::vector<URL>& items, const URL& folder);
+
+  // Deletion.
+  void showWarningAndDeleteDocument();
+  /// Asks, and deletes for good. The sheet points at `view`, or without one at the toolbar's button. A given list leaves
+  /// edit mode when the answer is yes. `finished` may be empty.
+  void showWarningAndDeleteURLsUsingViewWithDocumentListControllerFinishedCompletion(const std::vector<URL>& urls,
+                                                                                     const ViewRef& view,
+                                                                                     const DocumentListControllerRef& list,
+                                                                                     Completion finished);
+
+  /// The share sheet for an item, pointing at `view`, or without one at the window.
+  void showDICUrlCompletion(const ViewRef& view, const Value& item, Completion completion);
 
   // The status line.
   /// A value was fetched once, be it 0.
@@ -134,6 +164,10 @@ class NavController : public NavigationController,
   ViewControllerRef documentListControllerViewControllerForPreviewingItemAtURL(const DocumentListControllerRef& list,
                                                                                const URL& url) override;
 
+  // DocumentTargetSelectionControllerDelegate
+  void documentTargetSelectionControllerDidSelectItemAtURL(const std::shared_ptr<DocumentTargetSelectionController>& picker,
+                                                           const URL& folder) override;
+
   // DocumentInteractionControllerDelegate
   void documentInteractionControllerDidDismissOptionsMenu(DocumentInteractionController&) override {}
 
@@ -150,6 +184,17 @@ class NavController : public NavigationController,
   std::shared_ptr<DRItem> targetOfLink(const DRItem& link) const;
   bool openInDefaultApp(const std::shared_ptr<DRItem>& item);
   void showInfo(const URL& url);
+  void makeEditToolbar(const DocumentListControllerRef& list);
+  BarButtonItemRef editButton(const char* title, void (NavController::*action)());
+  /// Deletes what was confirmed; how many failed, and the last error that there was.
+  struct Failures {
+    std::int32_t count = 0;
+    std::optional<Error> latest;
+  };
+  Failures deleteConfirmed(const std::vector<URL>& urls);
+  void deleteContainer(const URL& url, Failures& failures);
+  static std::string newFolderEntered(const std::weak_ptr<NavController>& navigation, const URL& folder,
+                                      const std::vector<URL>& items, const std::string& name, bool& accepted);
   /// A new manager in the place of the present one, which no longer follows its document.
   std::shared_ptr<PreviewItemManager> replaceItemManager(long mode);
 

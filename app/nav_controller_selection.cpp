@@ -148,42 +148,4 @@ void NavController::orbPopToURL(const URL& url) {
   if (glimpse) pushViewController(glimpse, true);
 }
 
-void NavController::documentListControllerPerformActionURLOriginatingViewCompletion(const DocumentListControllerRef&,
-                                                                                    int action, const URL& url,
-                                                                                    const ViewRef&, Completion completion) {
-  if (action == ItemAction::More) {
-    // No list offers it any more, so no row waits for it to complete.
-    VLO_USER_ACTION("DLC Action More");
-    VLO_ERROR("performAction:%{public}@ -- More is deprecated, unexpected value", action);
-    return;
-  }
-  if (action == ItemAction::Info) {
-    VLO_USER_ACTION("DLC Action Info");
-    showInfo(url);
-    if (completion) completion();
-    return;
-  }
-  if (action == ItemAction::FirmpressPop) {
-    VLO_USER_ACTION("DLC Action Firmpress Pop");
-    VLO_INFO("Preview action: %@", url);
-    if (completion) completion();
-    orbPopToURL(url);
-    return;
-  }
-  VLO_ERROR("performAction:%{public}@ -- unexpected value", action);
-  if (completion) completion();
-}
-
-void NavController::showInfo(const URL& url) {
-  VLO_INFO("Info action: %@", url);
-  const std::shared_ptr<DRItem> item = DRItem::initWithURL(url);
-  VLO_INFO("Info action item: %@", item);
-  showPreviewPreviewMode(item, 1);
-}
-
-void NavController::documentListControllerPerformActionURL(const DocumentListControllerRef& list, int action,
-                                                           const URL& url) {
-  documentListControllerPerformActionURLOriginatingViewCompletion(list, action, url, view(), [] {});
-}
-
 }  // namespace vaelo

@@ -2,6 +2,7 @@
 #include <charconv>
 
 #include "app/nav_controller.h"
+#include "fileops/menu_enable_checks.h"
 #include "items/vlo_log.h"
 #include "platform/platform.h"
 
@@ -67,6 +68,8 @@ void NavController::updateStatusUI(DocumentListControllerRef list) {
   list->navigationItem().setTitle(
       selected > 0 ? formatting.localizedCount(".DICT.ITEMS_SELECTED.%d", static_cast<std::int64_t>(selected))
                    : formatting.localizedString("Select Items"));
+  if (barButtonMoveItem_) barButtonMoveItem_->setEnabled(MenuEnableChecks::canShowMoveForSelectedItems(*list));
+  if (barButtonDeleteItem_) barButtonDeleteItem_->setEnabled(MenuEnableChecks::canShowDeleteForSelectedItems(*list));
 }
 
 }  // namespace vaelo

@@ -96,6 +96,21 @@ std::string UIUtils::bestMessage(const std::optional<Error>& error) {
   return wordsOf(error);
 }
 
+void UIUtils::setCursorInTextFieldToBeforeExtension(TextField& field) {
+  const std::string& text = field.text();
+  const std::size_t dot = text.rfind('.');
+  if (dot == std::string::npos) return;
+  selectTextInTextFieldRange(field, {characterCount(std::string_view(text).substr(0, dot)), 0});
+}
+
+void UIUtils::selectTextInTextFieldRange(TextField& field, const TextRange& range) { field.setSelectedRange(range); }
+
+void UIUtils::addChildViewControllerChildViewController(const ViewControllerRef& parent, const ViewControllerRef& child) {
+  parent->addChild(child);
+  parent->view()->addSubview(child->view());
+  child->didMoveToParent(parent.get());
+}
+
 bool UIUtils::slateMode() { return Platform::current().screens.device().userInterfaceIdiom() == InterfaceIdiom::Slate; }
 
 }  // namespace vaelo

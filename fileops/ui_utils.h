@@ -9,12 +9,13 @@
 #include "platform/error.h"
 #include "platform/ui/alert_action.h"
 #include "platform/ui/bar_button_item.h"
+#include "platform/ui/text_field.h"
 #include "platform/ui/view_controller.h"
 #include "platform/url.h"
 
 namespace vaelo {
 
-/// Tells a person what went wrong. Main thread.
+/// Tells a person what went wrong, renames items, and helps screens and text fields. Main thread.
 class UIUtils {
  public:
   /// An alert with the title, the message (either may be empty) and one "OK" button over `parent`.
@@ -48,8 +49,18 @@ class UIUtils {
   static std::optional<std::string> messageForDeletePrompt(const std::vector<URL>& urls);
   /// One line for the error, empty for none.
   static std::string bestMessage(const std::optional<Error>& error);
+  /// Renames the item, of a bookmark the document that it points to. Nothing is done, and no error given, for the name that
+  /// it has. An empty or impossible name is WriteInvalidFileName. Blocks on the disk.
+  static std::optional<Error> renameItemAtURLToName(const URL& url, const std::string& name);
+  /// Where the item is when it has the name: its extension can't be taken off or changed.
+  static URL computeNewURLNewBasename(const URL& url, const std::string& name);
+  /// The caret before the last dot; a text without one keeps its caret.
+  static void setCursorInTextFieldToBeforeExtension(TextField& field);
+  /// Offset and length in characters from the start of the text.
+  static void selectTextInTextFieldRange(TextField& field, const TextRange& range);
   /// True on a tablet-class device.
   static bool slateMode();
+  static void addChildViewControllerChildViewController(const ViewControllerRef& parent, const ViewControllerRef& child);
 };
 
 }  // namespace vaelo

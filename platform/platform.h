@@ -16,6 +16,7 @@
 #include "platform/queues.h"
 #include "platform/resource_values.h"
 #include "platform/storage_quota.h"
+#include "platform/synced_key_value_store.h"
 #include "platform/type_identifiers.h"
 #include "platform/user_activity.h"
 
@@ -44,6 +45,7 @@ struct Platform {
   Queues& queues;
   ResourceValues& resourceValues;
   ScreenFactory& screens;
+  SyncedKeyValueStore& syncedStore;
   TypeIdentifiers& types;
   UserActivities& userActivities;
 

@@ -82,4 +82,10 @@ bool operator==(const Value& a, const Value& b) {
   return a.held_ == b.held_;
 }
 
+const char* Value::className() const {
+  static constexpr const char* Names[] = {"Null", "Boolean", "Number", "Number", "Number",     "String",
+                                          "Date", "URL",     "Data",   "Image",  "Dictionary", "Array"};
+  return Names[held_.index()];
+}
+
 }  // namespace vaelo

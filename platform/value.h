@@ -54,6 +54,8 @@ class Value {
 
   /// For log lines.
   std::string description() const;
+  /// What kind of thing it holds, for log lines: "URL", "String"…
+  const char* className() const;
   friend bool operator==(const Value& a, const Value& b);
 
  private:

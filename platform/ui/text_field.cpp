@@ -14,10 +14,6 @@ namespace {
 // File names need not be UTF-8: every byte that does not continue a character counts as the beginning of one.
 bool beginsCharacter(char byte) { return (static_cast<unsigned char>(byte) & 0xC0) != 0x80; }
 
-std::size_t characterCount(const std::string& text) {
-  return static_cast<std::size_t>(std::count_if(text.begin(), text.end(), beginsCharacter));
-}
-
 /// The index of the byte at which the character with that offset begins; the text's size at or beyond its end.
 std::size_t byteOffset(const std::string& text, std::size_t characters) {
   for (std::size_t at = 0; at < text.size(); ++at) {
@@ -33,6 +29,10 @@ TextRange cutTo(const std::string& text, const TextRange& range) {
 }
 
 }  // namespace
+
+std::size_t characterCount(std::string_view text) {
+  return static_cast<std::size_t>(std::count_if(text.begin(), text.end(), beginsCharacter));
+}
 
 void TextField::setText(std::string text) {
   if (text_ == text) return;

@@ -3,12 +3,16 @@
 
 #include <memory>
 #include <string>
+#include <string_view>
 
 #include "platform/ui/control.h"
 #include "platform/ui/label.h"
 #include "platform/ui/text_field_delegate.h"
 
 namespace vaelo {
+
+/// The characters of the text as ranges count them: Unicode code points, and every byte that is part of none.
+std::size_t characterCount(std::string_view text);
 
 enum class ClearButtonMode { Never, WhileEditing, Always };
 enum class ReturnKeyType { Default, Done, Search };

@@ -70,7 +70,7 @@ TEST_F(NavStackTest, AConfiguredListOffersEveryActionButMore) {
   EXPECT_EQ(nav->viewTitle(), "Plans");
   EXPECT_EQ(list->navigationItem().title(), "Plans");
   EXPECT_FALSE(list->navigationItem().hidesBackButton());
-  EXPECT_EQ(list->navigationItem().rightBarButtonItem(), nullptr);
+  EXPECT_EQ(list->navigationItem().rightBarButtonItem()->title(), "Select");
   EXPECT_EQ(list->view()->backgroundColor(), Color::white());
   EXPECT_EQ(list->delegate().get(), nav.get());
   EXPECT_TRUE(loggedStarting("DEBUG", "New DLC (1 items): \"Plans\", UTI="));
