@@ -3,6 +3,7 @@
 
 #include "host/gtk/bar_item_widget.h"
 #include "host/gtk/host_screen.h"
+#include "host/gtk/mirror/view_mirror.h"
 #include "host/gtk/preview/preview_page.h"
 
 namespace vaelo {
@@ -39,6 +40,9 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
     preview_ = std::make_unique<PreviewPage>(preview, [this] { showBar(); });
     gtk_widget_set_vexpand(preview_->widget(), TRUE);
     gtk_box_append(GTK_BOX(box_), preview_->widget());
+  } else {
+    mirror_ = std::make_unique<ViewMirror>(screen_->view());
+    gtk_box_append(GTK_BOX(box_), mirror_->widget());
   }
   gtk_widget_add_css_class(toolbar_, "toolbar");
   gtk_widget_set_size_request(toolbar_, -1, 46);

@@ -12,6 +12,7 @@ namespace vaelo {
 
 class HostScreen;
 class PreviewPage;
+class ViewMirror;
 
 /// One page of the window: a screen's header bar, its content and its toolbar, which follow the screen. Main thread.
 class ScreenPage {
@@ -51,6 +52,7 @@ class ScreenPage {
   std::vector<GtkWidget*> barWidgets_;
   std::function<void()> goBack_;
   std::unique_ptr<PreviewPage> preview_;
+  std::unique_ptr<ViewMirror> mirror_;
   bool canGoBack_ = false;
   bool toolbarHidden_ = true;
   std::shared_ptr<void> barToken_;

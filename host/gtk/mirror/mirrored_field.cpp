@@ -1,0 +1,127 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/gtk/mirror/mirrored_field.h"
+
+#include "host/gtk/mirror/mirrored_text.h"
+
+namespace vaelo {
+
+namespace {
+
+float xalignOf(TextAlignment alignment) {
+  if (alignment == TextAlignment::Center) return 0.5F;
+  return alignment == TextAlignment::Right ? 1 : 0;
+}
+
+}  // namespace
+
+MirroredField::MirroredField(TextField& field)
+    : field_(std::static_pointer_cast<TextField>(field.shared_from_this())),
+      entry_(gtk_entry_new()),
+      focus_(gtk_event_controller_focus_new()) {
+  gtk_widget_add_controller(entry_, focus_);
+  g_signal_connect_swapped(entry_, "changed", G_CALLBACK(+[](MirroredField* self) { self->typed(); }), this);
+  g_signal_connect_swapped(entry_, "activate", G_CALLBACK(+[](MirroredField* self) {
+                             const std::shared_ptr<TextField> kept = self->field_;
+                             kept->pressReturn();
+                           }),
+                           this);
+  g_signal_connect_swapped(entry_, "icon-release",
+                           G_CALLBACK(+[](MirroredField* self) { gtk_editable_set_text(GTK_EDITABLE(self->entry_), ""); }),
+                           this);
+  g_signal_connect_swapped(entry_, "notify::cursor-position",
+                           G_CALLBACK(+[](MirroredField* self) { self->selectionMoved(); }), this);
+  g_signal_connect_swapped(focus_, "enter", G_CALLBACK(+[](MirroredField* self) { self->focusCame(); }), this);
+  g_signal_connect_swapped(focus_, "leave", G_CALLBACK(+[](MirroredField* self) { self->focusLeft(); }), this);
+  update();
+}
+
+MirroredField::~MirroredField() {
+  g_signal_handlers_disconnect_by_data(entry_, this);
+  g_signal_handlers_disconnect_by_data(focus_, this);
+}
+
+void MirroredField::update() {
+  taking_ = true;
+  GtkEntry* entry = GTK_ENTRY(entry_);
+  if (field_->text() != gtk_editable_get_text(GTK_EDITABLE(entry_))) {
+    gtk_editable_set_text(GTK_EDITABLE(entry_), field_->text().c_str());
+  }
+  gtk_entry_set_placeholder_text(entry, field_->placeholder().empty() ? nullptr : field_->placeholder().c_str());
+  gtk_editable_set_alignment(GTK_EDITABLE(entry_), xalignOf(field_->textAlignment()));
+  PangoAttrList* attributes = attributesOf(field_->font());
+  gtk_entry_set_attributes(entry, attributes);
+  pango_attr_list_unref(attributes);
+  gtk_widget_set_sensitive(entry_, field_->enabled());
+  const bool clears = field_->clearButtonMode() == ClearButtonMode::Always ||
+                      (field_->clearButtonMode() == ClearButtonMode::WhileEditing && field_->isEditing());
+  gtk_entry_set_icon_from_icon_name(entry, GTK_ENTRY_ICON_SECONDARY,
+                                    clears && !field_->text().empty() ? "edit-clear-symbolic" : nullptr);
+  gtk_entry_set_icon_tooltip_text(entry, GTK_ENTRY_ICON_SECONDARY, "Clear");
+  // A name at rest looks like a title, and like a field while it is edited.
+  gtk_entry_set_has_frame(entry, field_->isEditing());
+  gtk_entry_set_input_hints(
+      entry,
+      static_cast<GtkInputHints>(
+          (field_->autocapitalizationType() == AutocapitalizationType::Words ? GTK_INPUT_HINT_UPPERCASE_WORDS
+                                                                             : GTK_INPUT_HINT_NONE) |
+          (field_->autocorrectionType() == AutocorrectionType::No ? GTK_INPUT_HINT_NO_SPELLCHECK : GTK_INPUT_HINT_NONE)));
+  if (!field_->accessibilityLabel().empty()) {
+    gtk_accessible_update_property(GTK_ACCESSIBLE(entry_), GTK_ACCESSIBLE_PROPERTY_LABEL,
+                                   field_->accessibilityLabel().c_str(), -1);
+  }
+  keepSelection();
+  const bool focused = gtk_event_controller_focus_contains_focus(GTK_EVENT_CONTROLLER_FOCUS(focus_));
+  if (field_->isEditing() && !focused) gtk_entry_grab_focus_without_selecting(entry);
+  if (!field_->isEditing() && focused) {
+    if (GtkRoot* root = gtk_widget_get_root(entry_)) gtk_root_set_focus(root, nullptr);
+  }
+  taking_ = false;
+}
+
+// The selection of the model, where it is one that code chose.
+void MirroredField::keepSelection() {
+  const TextRange& range = field_->selectedRange();
+  int start = 0;
+  int end = 0;
+  gtk_editable_get_selection_bounds(GTK_EDITABLE(entry_), &start, &end);
+  const int from = static_cast<int>(range.location);
+  const int to = from + static_cast<int>(range.length);
+  if (field_->isEditing() && (from != start || to != end)) gtk_editable_select_region(GTK_EDITABLE(entry_), from, to);
+}
+
+void MirroredField::selectionMoved() {
+  if (taking_ || !field_->isEditing()) return;
+  int start = 0;
+  int end = 0;
+  gtk_editable_get_selection_bounds(GTK_EDITABLE(entry_), &start, &end);
+  if (start == end) start = end = gtk_editable_get_position(GTK_EDITABLE(entry_));
+  field_->setSelectedRange({static_cast<std::size_t>(start), static_cast<std::size_t>(end - start)});
+}
+
+void MirroredField::typed() {
+  if (taking_) return;
+  const std::shared_ptr<TextField> kept = field_;
+  if (!kept->isEditing() && !kept->becomeFirstResponder()) {
+    update();
+    return;
+  }
+  if (!kept->userSetText(gtk_editable_get_text(GTK_EDITABLE(entry_)))) update();
+}
+
+void MirroredField::focusCame() {
+  if (taking_ || field_->isEditing()) return;
+  const std::shared_ptr<TextField> kept = field_;
+  if (kept->becomeFirstResponder()) return;
+  // What can't be changed doesn't take the keyboard either.
+  if (GtkRoot* root = gtk_widget_get_root(entry_)) gtk_root_set_focus(root, nullptr);
+}
+
+void MirroredField::focusLeft() {
+  // A dialog over the window takes the focus away without ending the editing.
+  GtkRoot* root = gtk_widget_get_root(entry_);
+  if (taking_ || !field_->isEditing() || !root || !GTK_IS_WINDOW(root) || !gtk_window_is_active(GTK_WINDOW(root))) return;
+  const std::shared_ptr<TextField> kept = field_;
+  if (!kept->resignFirstResponder()) gtk_entry_grab_focus_without_selecting(GTK_ENTRY(entry_));
+}
+
+}  // namespace vaelo

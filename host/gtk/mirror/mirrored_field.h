@@ -1,0 +1,32 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <memory>
+
+#include "host/gtk/mirror/mirrored_content.h"
+#include "platform/ui/text_field.h"
+
+namespace vaelo {
+
+/// One line of text that the user edits: what is typed is told to the model, which may refuse it.
+class MirroredField : public MirroredContent {
+ public:
+  explicit MirroredField(TextField& field);
+  ~MirroredField() override;
+  GtkWidget* widget() override { return entry_; }
+  void update() override;
+
+ private:
+  void typed();
+  void focusCame();
+  void focusLeft();
+  void selectionMoved();
+  void keepSelection();
+
+  std::shared_ptr<TextField> field_;
+  GtkWidget* entry_;
+  GtkEventController* focus_;
+  bool taking_ = false;  ///< the widget is being made to say what the model says
+};
+
+}  // namespace vaelo
