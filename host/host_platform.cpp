@@ -17,6 +17,7 @@ HostPlatform::HostPlatform(const HostFolders& folders)
       fileProvider_(drive_.layout(), drive_.index(), queues_),
       resourceValues_(drive_.layout(), drive_.index(), types_),
       userActivities_(drive_.layout(), log_, queues_),
+      syncedStore_(drive_.layout(), log_, notifications_),
       coordination_(folders.data + "/coordination.lock"),
       preferences_(folders.preferencesFile, log_) {}
 
@@ -43,9 +44,11 @@ void HostPlatform::install(Application& application, ScreenFactory& screens) {
                                .queues = queues_,
                                .resourceValues = resourceValues_,
                                .screens = screens,
+                               .syncedStore = syncedStore_,
                                .types = types_,
                                .userActivities = userActivities_});
   Platform::install(platform_.get());
+  syncedStore_.watch();
 }
 
 }  // namespace vaelo

@@ -6,6 +6,7 @@
 #include "host/desktop/gio_launch_services.h"
 #include "host/desktop/no_offers.h"
 #include "host/drive/drive_file_progress.h"
+#include "host/drive/drive_synced_store.h"
 #include "host/drive/drive_user_activities.h"
 #include "host/drive/local_cloud_documents.h"
 #include "host/drive/local_document_store.h"
@@ -68,6 +69,7 @@ class HostPlatform {
   LocalResourceValues resourceValues_;
   DriveFileProgress fileProgress_;
   DriveUserActivities userActivities_;
+  DriveSyncedStore syncedStore_;
   LocalFileCoordination coordination_;
   GioLaunchServices launchServices_;
   NoOffers offers_;

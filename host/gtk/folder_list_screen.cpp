@@ -3,6 +3,7 @@
 
 #include <adwaita.h>
 
+#include "host/gtk/item_actions_menu.h"
 #include "platform/platform.h"
 
 namespace vaelo {
@@ -64,9 +65,41 @@ void FolderListScreen::build() {
   events.activated = [this](const std::string& name) { activated(*view_, name, urlOf(name)); };
   events.itemsChanged = [this] { reportItems(); };
   events.folderRemoved = [this] { folderWasRemoved(); };
+  events.selectionChanged = [this] {
+    std::vector<URL> urls;
+    for (const std::string& name : view_->selection()) urls.push_back(urlOf(name));
+    setSelectedItems(urls);
+  };
+  events.contextRequested = [this](const std::string& name, GtkWidget* over, const GdkRectangle& at) {
+    offerActions(urlOf(name), over, at);
+  };
   events.refreshWanted = [this] { refresh(); };
   view_->setEvents(std::move(events));
+  editingToken_ =
+      listChanged().connect([this](DocumentListController&, DocumentListChange change) { followEditing(change); });
   fill();
+}
+
+void FolderListScreen::followEditing(DocumentListChange change) {
+  if (change == DocumentListChange::Editing) view_->setEditing(editing());
+  if (change != DocumentListChange::Selection || !editing()) return;
+  std::vector<std::string> names;
+  for (const URL& url : selectedItems()) names.push_back(nameOf(url));
+  if (names != view_->selection()) view_->setSelection(names);
+}
+
+void FolderListScreen::offerActions(const URL& url, GtkWidget* over, const GdkRectangle& at) {
+  if (editing()) return;
+  showItemActionsMenu(over, at, availableActions(), [self = sharedSelf(this), url, over, at](int action) {
+    // What the action shows points at where the menu was.
+    graphene_point_t place;
+    const graphene_point_t corner = {static_cast<float>(at.x), static_cast<float>(at.y)};
+    GtkWidget* window = GTK_WIDGET(gtk_widget_get_root(over));
+    if (!window || !gtk_widget_compute_point(over, window, &corner, &place)) return;
+    self->anchor_ = std::make_shared<View>(Rect{static_cast<double>(place.x), static_cast<double>(place.y),
+                                                static_cast<double>(at.width), static_cast<double>(at.height)});
+    self->userChoseAction(action, url, self->anchor_, [] {});
+  });
 }
 
 void FolderListScreen::fill() { view_->setFolder(presentedURL()->path()); }
@@ -142,6 +175,9 @@ void FolderListScreen::showSearch(const std::shared_ptr<SearchController>& searc
     results_->setEmptyText("Nothing found", "No item below this folder has such a name.");
     FolderViewEvents events;
     events.activated = [this](const std::string& path) { activated(*results_, path, URL(path)); };
+    events.contextRequested = [this](const std::string& path, GtkWidget* over, const GdkRectangle& at) {
+      offerActions(URL(path), over, at);
+    };
     results_->setEvents(std::move(events));
     g_signal_connect_swapped(searchEntry_, "search-changed", G_CALLBACK(+[](FolderListScreen* self) { self->queryTyped(); }),
                              this);

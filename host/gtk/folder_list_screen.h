@@ -33,6 +33,8 @@ class FolderListScreen : public DocumentListController, public HostScreen {
   virtual void fill();
   /// The URL that a row's name stands for.
   virtual URL urlOf(const std::string& name) const;
+  /// The name of the row that stands for an item of this list.
+  virtual std::string nameOf(const URL& url) const { return url.lastPathComponent(); }
   /// The items of all rows, in their order.
   virtual URLList shownItems();
   /// Where a search looks.
@@ -44,6 +46,9 @@ class FolderListScreen : public DocumentListController, public HostScreen {
   void build();
   /// The row `name` of `view`, which stands for `url`.
   void activated(FolderView& view, const std::string& name, const URL& url);
+  void offerActions(const URL& url, GtkWidget* over, const GdkRectangle& at);
+  /// Keeps check marks and selection in step with the model.
+  void followEditing(DocumentListChange change);
   void queryTyped();
   void beginSearch();
 
@@ -59,6 +64,8 @@ class FolderListScreen : public DocumentListController, public HostScreen {
   FolderSearch folderSearch_;
   std::shared_ptr<SearchController> search_;
   std::shared_ptr<void> queryToken_;
+  std::shared_ptr<void> editingToken_;
+  std::shared_ptr<View> anchor_;  ///< of the latest item action
 };
 
 }  // namespace vaelo

@@ -4,7 +4,9 @@
 #include <algorithm>
 
 #include "host/gtk/alert_dialog.h"
+#include "host/gtk/folder_picker.h"
 #include "host/gtk/host_screen.h"
+#include "platform/platform.h"
 #include "platform/ui/search_controller.h"
 
 namespace vaelo {
@@ -153,6 +155,9 @@ void GtkWindowHost::present(const ViewControllerRef&, const ViewControllerRef& p
     dialogs_[presented.get()] = showAlertDialog(alert, widget(), std::move(done));
     return;
   }
+  if (const auto picker = std::dynamic_pointer_cast<DocumentTargetSelectionController>(presented)) {
+    folderPicker_ = std::make_shared<FolderPicker>(picker, Platform::current().cloudDocuments, widget());
+  }
   if (const auto search = std::dynamic_pointer_cast<SearchController>(presented)) {
     const auto page = pages_.find(search->list().get());
     if (page != pages_.end() && page->second->hostScreen()) page->second->hostScreen()->showSearch(search);
@@ -161,6 +166,11 @@ void GtkWindowHost::present(const ViewControllerRef&, const ViewControllerRef& p
 }
 
 void GtkWindowHost::dismiss(const ViewControllerRef& presented, bool, std::function<void()> done) {
+  if (std::dynamic_pointer_cast<DocumentTargetSelectionController>(presented)) {
+    // It may be a press in the picker itself that takes it away.
+    g_idle_add_once([](gpointer held) { delete static_cast<std::shared_ptr<FolderPicker>*>(held); },
+                    new std::shared_ptr<FolderPicker>(std::move(folderPicker_)));
+  }
   const auto dialog = dialogs_.find(presented.get());
   if (dialog != dialogs_.end()) {
     gtk_window_destroy(dialog->second);

@@ -14,6 +14,8 @@
 
 namespace vaelo {
 
+class FolderPicker;
+
 /// The application's window on the display: one page for each screen of the root navigation controller's stack, alerts over
 /// it, and the keys and buttons that go back, search and refresh. Main thread.
 class GtkWindowHost : public Window, private NavigationHost, private PresentationHost {
@@ -50,6 +52,7 @@ class GtkWindowHost : public Window, private NavigationHost, private Presentatio
   GtkWidget* toasts_;
   GtkWidget* overlay_;
   GMenu* menu_;
+  std::shared_ptr<FolderPicker> folderPicker_;
   PageStack stack_;
   std::function<GtkWidget*()> makeBanner_;
   std::map<ViewController*, std::unique_ptr<ScreenPage>> pages_;

@@ -42,4 +42,12 @@ Date MemoryClock::date() const {
   return origin + std::chrono::duration_cast<Date::duration>(now_);
 }
 
+void MemoryClock::forgetWhatIsLeft() {
+  std::multimap<std::chrono::nanoseconds, Block> left;
+  {
+    const std::lock_guard lock(mutex_);
+    left.swap(blocks_);
+  }
+}
+
 }  // namespace vaelo

@@ -18,6 +18,8 @@ class MemoryClock {
   void advance(std::chrono::nanoseconds time);
   /// Goes on to the next block, however late, and runs it; false when there is none.
   bool runNext();
+  /// Drops the blocks that have not run: they may keep objects alive that keep the clock.
+  void forgetWhatIsLeft();
   Date date() const;
 
   /// The wall clock's time at the start.

@@ -22,9 +22,15 @@ MemoryPlatform::MemoryPlatform()
                 .queues = queues,
                 .resourceValues = values,
                 .screens = screens,
+                .syncedStore = syncedStore,
                 .types = types,
                 .userActivities = userActivities} {
   Platform::install(&platform_);
+}
+
+MemoryPlatform::~MemoryPlatform() {
+  Platform::install(nullptr);
+  clock->forgetWhatIsLeft();
 }
 
 }  // namespace vaelo

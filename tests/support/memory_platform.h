@@ -21,6 +21,7 @@
 #include "tests/support/memory_queues.h"
 #include "tests/support/memory_resource_values.h"
 #include "tests/support/memory_screens.h"
+#include "tests/support/memory_synced_store.h"
 #include "tests/support/memory_types.h"
 #include "tests/support/memory_user_activities.h"
 #include "tests/support/recording_log.h"
@@ -33,7 +34,7 @@ namespace vaelo {
 class MemoryPlatform {
  public:
   MemoryPlatform();
-  ~MemoryPlatform() { Platform::install(nullptr); }
+  ~MemoryPlatform();
   MemoryPlatform(const MemoryPlatform&) = delete;
   MemoryPlatform& operator=(const MemoryPlatform&) = delete;
 
@@ -64,6 +65,7 @@ class MemoryPlatform {
   MemoryLaunchServices launch{record};
   MemoryOffers offers;
   MemoryScreens screens{record};
+  MemorySyncedStore syncedStore;
 
  private:
   Platform platform_;

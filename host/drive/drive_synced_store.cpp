@@ -1,0 +1,131 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/drive/drive_synced_store.h"
+
+#include <memory>
+
+#include "host/drive/small_file.h"
+#include "host/support/glib_ptr.h"
+
+namespace vaelo {
+
+namespace {
+
+constexpr const char* FileName = "/.vaelo/values";
+/// Other programs write the file: what is nested deeper is not read.
+constexpr int DeepestNesting = 8;
+
+struct VariantFree {
+  void operator()(GVariant* variant) const { g_variant_unref(variant); }
+};
+using Variant = std::unique_ptr<GVariant, VariantFree>;
+
+Value valueOf(GVariant* variant, int depth);
+
+Dictionary dictionaryOf(GVariant* variant, int depth) {
+  Dictionary dictionary;
+  GVariantIter iterator;
+  g_variant_iter_init(&iterator, variant);
+  while (const Variant entry{g_variant_iter_next_value(&iterator)}) {
+    const Variant key(g_variant_get_child_value(entry.get(), 0));
+    const Variant value(g_variant_get_child_value(entry.get(), 1));
+    if (g_variant_is_of_type(key.get(), G_VARIANT_TYPE_STRING)) {
+      dictionary[g_variant_get_string(key.get(), nullptr)] = valueOf(value.get(), depth + 1);
+    }
+  }
+  return dictionary;
+}
+
+Array arrayOf(GVariant* variant, int depth) {
+  Array array;
+  GVariantIter iterator;
+  g_variant_iter_init(&iterator, variant);
+  while (const Variant entry{g_variant_iter_next_value(&iterator)}) array.push_back(valueOf(entry.get(), depth + 1));
+  return array;
+}
+
+Value valueOf(GVariant* variant, int depth) {
+  if (depth > DeepestNesting) return {};
+  switch (g_variant_classify(variant)) {
+    case G_VARIANT_CLASS_BOOLEAN:
+      return Value(g_variant_get_boolean(variant) != FALSE);
+    case G_VARIANT_CLASS_BYTE:
+      return Value(std::uint64_t{g_variant_get_byte(variant)});
+    case G_VARIANT_CLASS_UINT16:
+      return Value(std::uint64_t{g_variant_get_uint16(variant)});
+    case G_VARIANT_CLASS_UINT32:
+      return Value(std::uint64_t{g_variant_get_uint32(variant)});
+    case G_VARIANT_CLASS_UINT64:
+      return Value(std::uint64_t{g_variant_get_uint64(variant)});
+    case G_VARIANT_CLASS_INT16:
+      return Value(std::int64_t{g_variant_get_int16(variant)});
+    case G_VARIANT_CLASS_INT32:
+      return Value(std::int64_t{g_variant_get_int32(variant)});
+    case G_VARIANT_CLASS_INT64:
+      return Value(std::int64_t{g_variant_get_int64(variant)});
+    case G_VARIANT_CLASS_DOUBLE:
+      return Value(g_variant_get_double(variant));
+    case G_VARIANT_CLASS_STRING:
+      return Value(std::string(g_variant_get_string(variant, nullptr)));
+    case G_VARIANT_CLASS_VARIANT: {
+      const Variant held(g_variant_get_variant(variant));
+      return valueOf(held.get(), depth + 1);
+    }
+    case G_VARIANT_CLASS_ARRAY:
+      if (g_variant_is_of_type(variant, G_VARIANT_TYPE_DICTIONARY)) return dictionaryOf(variant, depth);
+      return arrayOf(variant, depth);
+    default:
+      return {};
+  }
+}
+
+}  // namespace
+
+DriveSyncedStore::DriveSyncedStore(const DriveLayout& layout, LogSink& log, NotificationCenter& notifications)
+    : path_(layout.mirrorRoot() + FileName), log_(log), notifications_(notifications) {}
+
+DriveSyncedStore::~DriveSyncedStore() {
+  if (!monitor_) return;
+  g_signal_handlers_disconnect_by_data(monitor_, this);
+  g_object_unref(monitor_);
+}
+
+Value DriveSyncedStore::objectForKey(const std::string& key) {
+  const std::lock_guard lock(mutex_);
+  if (!current_) values_ = read();
+  // Without a watch every question reads the file again.
+  current_ = monitor_ != nullptr;
+  const auto found = values_.find(key);
+  return found == values_.end() ? Value() : found->second;
+}
+
+Dictionary DriveSyncedStore::read() {
+  const Result<std::string> text = readSmallFile(path_);
+  if (!text.value) return {};
+  GError* problem = nullptr;
+  const Variant parsed(g_variant_parse(G_VARIANT_TYPE_VARDICT, text.value->data(), text.value->data() + text.value->size(),
+                                       nullptr, &problem));
+  if (parsed) return dictionaryOf(parsed.get(), 0);
+  const GErrorPtr owned(problem);
+  log_.write(LogType::Error, "drive: the synced values of " + path_ + " can't be read: " + owned->message);
+  return {};
+}
+
+void DriveSyncedStore::watch() {
+  const GRef<GFile> file(g_file_new_for_path(path_.c_str()));
+  monitor_ = g_file_monitor_file(file.get(), G_FILE_MONITOR_NONE, nullptr, nullptr);
+  if (!monitor_) return;
+  g_signal_connect_swapped(monitor_, "changed",
+                           G_CALLBACK(+[](DriveSyncedStore* self, GFile*, GFile*, GFileMonitorEvent event, GFileMonitor*) {
+                             // A file that is being written is read when it is whole.
+                             if (event == G_FILE_MONITOR_EVENT_CHANGED || event == G_FILE_MONITOR_EVENT_ATTRIBUTE_CHANGED)
+                               return;
+                             {
+                               const std::lock_guard lock(self->mutex_);
+                               self->current_ = false;
+                             }
+                             self->notifications_.post({SyncedStoreDidChangeExternallyNotification, {}});
+                           }),
+                           this);
+}
+
+}  // namespace vaelo

@@ -1,0 +1,43 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <gio/gio.h>
+
+#include <mutex>
+#include <string>
+
+#include "host/drive/drive_layout.h"
+#include "platform/logging.h"
+#include "platform/notifications.h"
+#include "platform/synced_key_value_store.h"
+
+namespace vaelo {
+
+/// The synced values as one small file in the mirror, MIRROR/.vaelo/values, which the drive carries to other devices: a
+/// dictionary in GVariant's text format (type a{sv}). A file that is none reads as empty, and the log says so.
+class DriveSyncedStore : public SyncedKeyValueStore {
+ public:
+  /// All outlive it.
+  DriveSyncedStore(const DriveLayout& layout, LogSink& log, NotificationCenter& notifications);
+  ~DriveSyncedStore() override;
+  DriveSyncedStore(const DriveSyncedStore&) = delete;
+  DriveSyncedStore& operator=(const DriveSyncedStore&) = delete;
+
+  Value objectForKey(const std::string& key) override;
+  /// Posts SyncedStoreDidChangeExternallyNotification whenever another process or device changed the file. Main thread,
+  /// once.
+  void watch();
+
+ private:
+  Dictionary read();
+
+  std::string path_;
+  LogSink& log_;
+  NotificationCenter& notifications_;
+  GFileMonitor* monitor_ = nullptr;
+  std::mutex mutex_;
+  bool current_ = false;  // guarded by mutex_: values_ is what the file says
+  Dictionary values_;     // guarded by mutex_
+};
+
+}  // namespace vaelo

@@ -1,0 +1,202 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/gtk/folder_picker.h"
+
+#include "fileops/ui_utils.h"
+#include "host/support/glib_ptr.h"
+#include "items/file_utils.h"
+#include "platform/platform.h"
+
+namespace vaelo {
+
+namespace {
+
+void describe(GtkWidget* widget, const char* label) {
+  gtk_widget_set_tooltip_text(widget, label);
+  gtk_accessible_update_property(GTK_ACCESSIBLE(widget), GTK_ACCESSIBLE_PROPERTY_LABEL, label, -1);
+}
+
+}  // namespace
+
+FolderPicker::FolderPicker(std::shared_ptr<DocumentTargetSelectionController> picker, CloudDocuments& drive, GtkWindow* over)
+    : picker_(std::move(picker)), drive_(drive) {
+  build(over);
+  FolderViewEvents events;
+  events.activated = [this](const std::string& path) { goTo(URL(path, true)); };
+  view_.setEvents(std::move(events));
+  view_.setEmptyText("No folders here", "");
+  // Within one library the way begins at its top; across libraries at the drive's root, which lists them.
+  std::optional<URL> top = drive_.defaultContainerURL();
+  if (!picker_->allowsCrossContainer() && !picker_->itemsToMove().empty()) {
+    const Result<CloudContainerRef> container = drive_.containerForURL(picker_->itemsToMove().front());
+    if (container.value && *container.value) top = (*container.value)->documentsFolderURL();
+  }
+  if (top) goTo(*top);
+  gtk_window_present(GTK_WINDOW(window_));
+}
+
+FolderPicker::~FolderPicker() {
+  g_signal_handlers_disconnect_by_data(window_, this);
+  g_signal_handlers_disconnect_by_data(back_, this);
+  g_signal_handlers_disconnect_by_data(move_, this);
+  g_signal_handlers_disconnect_by_data(newFolder_, this);
+  gtk_window_destroy(GTK_WINDOW(window_));
+}
+
+void FolderPicker::build(GtkWindow* over) {
+  window_ = adw_window_new();
+  gtk_window_set_transient_for(GTK_WINDOW(window_), over);
+  gtk_window_set_modal(GTK_WINDOW(window_), TRUE);
+  gtk_window_set_title(GTK_WINDOW(window_), "Move");
+  int width = 0;
+  int height = 0;
+  gtk_window_get_default_size(over, &width, &height);
+  gtk_window_set_default_size(GTK_WINDOW(window_), std::min(width, 440), std::min(height, 600));
+  GtkWidget* box = gtk_box_new(GTK_ORIENTATION_VERTICAL, 0);
+  GtkWidget* header = adw_header_bar_new();
+  adw_header_bar_set_show_end_title_buttons(ADW_HEADER_BAR(header), FALSE);
+  adw_header_bar_set_show_start_title_buttons(ADW_HEADER_BAR(header), FALSE);
+  GtkWidget* cancel = gtk_button_new_with_label("Cancel");
+  gtk_actionable_set_action_name(GTK_ACTIONABLE(cancel), "window.close");
+  adw_header_bar_pack_start(ADW_HEADER_BAR(header), cancel);
+  back_ = gtk_button_new_from_icon_name("go-previous-symbolic");
+  describe(back_, "Back");
+  g_signal_connect_swapped(back_, "clicked", G_CALLBACK(+[](FolderPicker* self) { self->goUp(); }), this);
+  adw_header_bar_pack_start(ADW_HEADER_BAR(header), back_);
+  title_ = adw_window_title_new(nullptr, invitation().c_str());
+  adw_header_bar_set_title_widget(ADW_HEADER_BAR(header), title_);
+  move_ = gtk_button_new_with_label("Move");
+  gtk_widget_add_css_class(move_, "suggested-action");
+  g_signal_connect_swapped(move_, "clicked", G_CALLBACK(+[](FolderPicker* self) { self->choose(); }), this);
+  adw_header_bar_pack_end(ADW_HEADER_BAR(header), move_);
+  newFolder_ = gtk_button_new_from_icon_name("folder-new-symbolic");
+  describe(newFolder_, "New Folder");
+  g_signal_connect_swapped(newFolder_, "clicked", G_CALLBACK(+[](FolderPicker* self) { self->askForNewFolder(); }), this);
+  adw_header_bar_pack_end(ADW_HEADER_BAR(header), newFolder_);
+  gtk_box_append(GTK_BOX(box), header);
+  gtk_widget_set_vexpand(view_.widget(), TRUE);
+  gtk_box_append(GTK_BOX(box), view_.widget());
+  refusal_ = gtk_label_new(nullptr);
+  gtk_label_set_wrap(GTK_LABEL(refusal_), TRUE);
+  gtk_label_set_justify(GTK_LABEL(refusal_), GTK_JUSTIFY_CENTER);
+  gtk_widget_add_css_class(refusal_, "dim-label");
+  for (void (*margin)(GtkWidget*, int) :
+       {gtk_widget_set_margin_top, gtk_widget_set_margin_bottom, gtk_widget_set_margin_start, gtk_widget_set_margin_end}) {
+    margin(refusal_, 12);
+  }
+  gtk_box_append(GTK_BOX(box), refusal_);
+  adw_window_set_content(ADW_WINDOW(window_), box);
+  g_signal_connect_swapped(window_, "close-request", G_CALLBACK(+[](FolderPicker* self) -> gboolean {
+                             const auto kept = self->picker_;
+                             kept->userCancelled();
+                             return TRUE;
+                           }),
+                           this);
+  GtkEventController* keys = gtk_event_controller_key_new();
+  g_signal_connect(keys, "key-pressed",
+                   G_CALLBACK(+[](GtkEventControllerKey*, guint key, guint, GdkModifierType, FolderPicker* self) {
+                     if (key != GDK_KEY_Escape) return static_cast<gboolean>(FALSE);
+                     gtk_window_close(GTK_WINDOW(self->window_));
+                     return static_cast<gboolean>(TRUE);
+                   }),
+                   this);
+  gtk_widget_add_controller(window_, keys);
+}
+
+std::string FolderPicker::invitation() const {
+  const std::vector<URL>& items = picker_->itemsToMove();
+  if (items.size() != 1) return "Move " + std::to_string(items.size()) + " items to…";
+  return "Move “" + takeString(g_filename_display_name(items.front().lastPathComponent().c_str())) + "” to…";
+}
+
+std::string FolderPicker::titleOf(const URL& folder) const {
+  if (drive_.isDocumentsContainer(folder)) {
+    const Result<CloudContainerRef> container = drive_.containerForURL(folder);
+    if (container.value && *container.value) return (*container.value)->localizedName();
+  }
+  return takeString(g_filename_display_name(folder.lastPathComponent().c_str()));
+}
+
+void FolderPicker::goTo(const URL& folder) {
+  way_.push_back(folder);
+  gtk_widget_set_sensitive(move_, FALSE);
+  const bool libraries = picker_->allowsCrossContainer() && way_.size() == 1;
+  worker_.run([this, folder, libraries, items = picker_->itemsToMove(), &drive = drive_]() -> std::function<void()> {
+    MoveTarget target = moveTargetAt(folder, items, libraries, drive);
+    return [this, folder, target = std::move(target)] {
+      if (way_.back() == folder) show(folder, target);
+    };
+  });
+}
+
+void FolderPicker::goUp() {
+  if (way_.size() < 2) return;
+  way_.pop_back();
+  const URL above = way_.back();
+  way_.pop_back();
+  goTo(above);
+}
+
+void FolderPicker::show(const URL& folder, MoveTarget target) {
+  adw_window_title_set_title(ADW_WINDOW_TITLE(title_), titleOf(folder).c_str());
+  gtk_widget_set_visible(back_, way_.size() > 1);
+  gtk_widget_set_sensitive(move_, target.refusal.empty());
+  gtk_label_set_text(GTK_LABEL(refusal_), target.refusal.c_str());
+  gtk_widget_set_visible(refusal_, !target.refusal.empty());
+  view_.setEntries(std::move(target.folders));
+  view_.grabFocus();
+}
+
+void FolderPicker::choose() {
+  const auto kept = picker_;
+  const URL folder = way_.back();
+  kept->userSelected(folder);
+}
+
+void FolderPicker::askForNewFolder() {
+  GtkWidget* dialog = adw_message_dialog_new(GTK_WINDOW(window_), "New Folder", "Enter a name for this folder.");
+  GtkWidget* entry = gtk_entry_new();
+  gtk_entry_set_placeholder_text(GTK_ENTRY(entry), "Folder Name");
+  gtk_entry_set_activates_default(GTK_ENTRY(entry), TRUE);
+  gtk_accessible_update_property(GTK_ACCESSIBLE(entry), GTK_ACCESSIBLE_PROPERTY_LABEL, "Folder Name", -1);
+  adw_message_dialog_set_extra_child(ADW_MESSAGE_DIALOG(dialog), entry);
+  adw_message_dialog_add_responses(ADW_MESSAGE_DIALOG(dialog), "cancel", "_Cancel", "create", "C_reate", nullptr);
+  adw_message_dialog_set_default_response(ADW_MESSAGE_DIALOG(dialog), "create");
+  adw_message_dialog_set_response_enabled(ADW_MESSAGE_DIALOG(dialog), "create", FALSE);
+  g_signal_connect(entry, "changed", G_CALLBACK(+[](GtkEditable* changed, AdwMessageDialog* shown) {
+                     const std::string name =
+                         Platform::current().characterClasses.trimmingWhitespaceAndNewlines(gtk_editable_get_text(changed));
+                     adw_message_dialog_set_response_enabled(shown, "create", FileUtils::isValidFilename(name));
+                   }),
+                   dialog);
+  g_signal_connect_object(dialog, "response::create", G_CALLBACK(+[](AdwMessageDialog* shown, char*, GtkWidget* window) {
+                            auto* self = static_cast<FolderPicker*>(g_object_get_data(G_OBJECT(window), "vaelo-picker"));
+                            GtkWidget* typed = adw_message_dialog_get_extra_child(shown);
+                            self->makeFolder(Platform::current().characterClasses.trimmingWhitespaceAndNewlines(
+                                gtk_editable_get_text(GTK_EDITABLE(typed))));
+                          }),
+                          window_, static_cast<GConnectFlags>(0));
+  g_object_set_data(G_OBJECT(window_), "vaelo-picker", this);
+  gtk_window_present(GTK_WINDOW(dialog));
+}
+
+void FolderPicker::makeFolder(const std::string& name) {
+  const URL made = way_.back().appendingPathComponent(name, true);
+  worker_.run([this, made]() -> std::function<void()> {
+    std::optional<Error> error;
+    if (FileUtils::exists(made)) {
+      error = Error{FileErrorDomain, FileErrorCode::WriteFileExists, {}, {}, {}};
+    } else {
+      error = FileUtils::mkdir(made);
+    }
+    return [this, made, error] {
+      if (!error) {
+        goTo(made);
+        return;
+      }
+      gtk_label_set_text(GTK_LABEL(refusal_), UIUtils::bestMessage(error).c_str());
+      gtk_widget_set_visible(refusal_, TRUE);
+    };
+  });
+}
+
+}  // namespace vaelo

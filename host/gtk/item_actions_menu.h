@@ -1,0 +1,15 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <gtk/gtk.h>
+
+#include <functional>
+
+namespace vaelo {
+
+/// Offers the actions of one item in a menu that points at `at`, in the coordinates of `over`. `available` has bit n for the
+/// code n of ItemAction. `chosen` gets the code, once, after the menu closed; nothing when the user changes their mind. Main
+/// thread.
+void showItemActionsMenu(GtkWidget* over, const GdkRectangle& at, unsigned available, std::function<void(int)> chosen);
+
+}  // namespace vaelo
