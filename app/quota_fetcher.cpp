@@ -59,11 +59,10 @@ void QuotaFetcher::performFetch() {
     VLO_DEBUG("Not fetching quota: backgrounded.");
     return;
   }
-  const char* function = __func__;
   const std::weak_ptr<QuotaFetcher> weakSelf = weak_from_this();
-  fetchUserQuotaWithCompletion([weakSelf, function](std::int64_t freeBytes, const std::optional<Error>& error) {
+  fetchUserQuotaWithCompletion([weakSelf](std::int64_t freeBytes, const std::optional<Error>& error) {
     if (error) {
-      logLine(LogLevel::Warning, function, __LINE__, "can't update quota: %{public}@", {*error});
+      VLO_WARNING("can't update quota: %{public}@", *error);
       return;
     }
     // The completion may run inside an operation of the fetcher's queue, which must not be the last to hold the fetcher.

@@ -35,7 +35,7 @@ std::string logFormatted(const std::string& format, const std::vector<LogArgumen
   return text;
 }
 
-void logLine(LogLevel level, const char* function, int line, const std::string& format,
+void logLine(LogLevel level, const std::string& function, int line, const std::string& format,
              const std::vector<LogArgument>& arguments) {
   static constexpr const char* names[] = {"ERROR", "WARNING", "INFO", "DEBUG"};
   const LogType type = level == LogLevel::Error   ? LogType::Error
@@ -45,9 +45,18 @@ void logLine(LogLevel level, const char* function, int line, const std::string& 
   Platform::current().log.write(type, prefix + logFormatted(format, arguments));
 }
 
+std::string functionInLog(const char* function, std::string_view signature) {
+  const std::string_view name = function;
+  if (name != "operator()") return function;
+  const std::string_view around = signature.substr(0, signature.find("::<lambda"));
+  const std::string_view unqualified = around.substr(0, around.find('('));
+  const std::size_t last = unqualified.rfind("::");
+  return std::string(last == std::string_view::npos ? unqualified : unqualified.substr(last + 2));
+}
+
 bool debugLinesAreWanted() { return Platform::current().log.wantsDebug(); }
 
-void logUserAction(const char* function, int line, const std::string& label) {
+void logUserAction(const std::string& function, int line, const std::string& label) {
   Platform::current().activityTracing.recordUserAction(label);
   logLine(LogLevel::Info, function, line, "================= %s", {label});
 }

@@ -4,6 +4,7 @@
 #include <concepts>
 #include <optional>
 #include <string>
+#include <string_view>
 #include <type_traits>
 #include <vector>
 
@@ -59,19 +60,24 @@ enum class LogLevel { Error, Warning, Info, Debug };
 /// sign.
 std::string logFormatted(const std::string& format, const std::vector<LogArgument>& arguments);
 /// Writes a line "(VLO)[LEVEL] function (line) message" to the platform's log.
-void logLine(LogLevel level, const char* function, int line, const std::string& format,
+void logLine(LogLevel level, const std::string& function, int line, const std::string& format,
              const std::vector<LogArgument>& arguments);
 bool debugLinesAreWanted();
 /// Records what the user did with activity tracing and logs it.
-void logUserAction(const char* function, int line, const std::string& label);
+void logUserAction(const std::string& function, int line, const std::string& label);
+/// The name that a line gets: `function`, or for a lambda that of the function around it, which `signature` tells (a
+/// compiler's __PRETTY_FUNCTION__).
+std::string functionInLog(const char* function, std::string_view signature);
 
 }  // namespace vaelo
 
-#define VLO_LOG(level, format, ...) ::vaelo::logLine(level, __func__, __LINE__, format, ::vaelo::LogArguments{__VA_ARGS__})
+#define VLO_FUNCTION ::vaelo::functionInLog(__func__, __PRETTY_FUNCTION__)
+#define VLO_LOG(level, format, ...) \
+  ::vaelo::logLine(level, VLO_FUNCTION, __LINE__, format, ::vaelo::LogArguments{__VA_ARGS__})
 #define VLO_ERROR(format, ...) VLO_LOG(::vaelo::LogLevel::Error, format __VA_OPT__(, ) __VA_ARGS__)
 #define VLO_WARNING(format, ...) VLO_LOG(::vaelo::LogLevel::Warning, format __VA_OPT__(, ) __VA_ARGS__)
 #define VLO_INFO(format, ...) VLO_LOG(::vaelo::LogLevel::Info, format __VA_OPT__(, ) __VA_ARGS__)
 // Its arguments are not made into text where nobody reads debug lines.
 #define VLO_DEBUG(format, ...) \
   (!::vaelo::debugLinesAreWanted() ? (void)0 : VLO_LOG(::vaelo::LogLevel::Debug, format __VA_OPT__(, ) __VA_ARGS__))
-#define VLO_USER_ACTION(label) ::vaelo::logUserAction(__func__, __LINE__, label)
+#define VLO_USER_ACTION(label) ::vaelo::logUserAction(VLO_FUNCTION, __LINE__, label)

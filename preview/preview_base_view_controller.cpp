@@ -250,10 +250,10 @@ FileProgress::Withdrawn PreviewBaseViewController::progressPublished(const std::
   } else {
     VLO_DEBUG("got progress %{public}@", progress);
   }
-  return [weak, observation] {
+  return [weak, observed = std::weak_ptr(observation)] {
     const auto self = weak.lock();
     if (!self) return;
-    std::erase(self->observations_, observation);
+    std::erase(self->observations_, observed.lock());
     self->subscriber_.reset();
   };
 }

@@ -13,6 +13,14 @@ TEST_F(LogTest, aLineHasLevelFunctionSourceLineAndMessage) {
             "(VLO)[WARNING] TestBody (" + std::to_string(__LINE__ - 2) + ") Evict error: full");
 }
 
+TEST_F(LogTest, aLineFromALambdaNamesTheFunctionAroundIt) {
+  const auto nested = [](int number) { [number] { VLO_INFO("%d", number); }(); };
+  nested(7);
+  EXPECT_EQ(world.recordedLog.lines().back(), "(VLO)[INFO] TestBody (" + std::to_string(__LINE__ - 2) + ") 7");
+  EXPECT_EQ(functionInLog("operator()", "vaelo::{anonymous}::Service::ask(int)::<lambda(bool)>"), "ask");
+  EXPECT_EQ(functionInLog("tell", "void vaelo::tell(int)"), "tell");
+}
+
 TEST_F(LogTest, levelsGoToTheTypesOfThePlatformsLog) {
   VLO_ERROR("e");
   VLO_WARNING("w");

@@ -224,8 +224,11 @@ TEST_F(PreviewBaseTest, ADocumentThatNothingOpensIsLogged) {
   EXPECT_TRUE(logged("INFO", "================= Pressed Open in <app>"));
   EXPECT_TRUE(logged("WARNING", "Failed to open document " + text(document) + " in default app"));
   log().clear();
-  giveOwningApplication(document);
+  const URL text = addFile("Plans/Notes.txt");
+  giveOwningApplication(text);
+  manager->setItemUpdatePreview(DRItem::initWithURL(text), false);
   screen->openInDefaultApp();
+  EXPECT_TRUE(logged("INFO", "Opening document " + text.absoluteString() + " in default app"));
   EXPECT_FALSE(loggedStarting("WARNING", "Failed to open document"));
 }
 

@@ -23,6 +23,7 @@ class PreviewFixture : public AppFixture {
   PreviewFixture() {
     loadNav();
     window->setRootViewController(nav);
+    window->makeKeyAndVisible();
     addFile("Plans/Report.pdf");
     log().clear();
   }

@@ -258,7 +258,7 @@ TEST_F(PreviewFollowingTest, WithoutABookmarkThereIsNoActivity) {
   const Error otherDomain{FileErrorDomain, 7, {}, {}, {}};
   const auto ask = [&](const Result<std::string>& answer) {
     answers.insert_or_assign(document.path(), answer);
-    show();
+    const auto manager = show();
     runAllQueues();
   };
   ask(notInDrive);
