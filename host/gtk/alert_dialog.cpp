@@ -3,6 +3,8 @@
 
 #include <adwaita.h>
 
+#include "host/gtk/prompt_dialog.h"
+
 namespace vaelo {
 
 namespace {
@@ -21,6 +23,7 @@ void responded(AdwMessageDialog*, const char* response, gpointer held) {
 }  // namespace
 
 GtkWindow* showAlertDialog(const std::shared_ptr<AlertController>& alert, GtkWindow* over, std::function<void()> shown) {
+  if (!alert->textFields().empty()) return showPromptDialog(alert, over, std::move(shown));
   const bool titled = !alert->title().empty();
   GtkWidget* dialog = adw_message_dialog_new(over, titled ? alert->title().c_str() : nullptr,
                                              alert->message().empty() ? nullptr : alert->message().c_str());

@@ -3,6 +3,7 @@
 
 #include <memory>
 
+#include "platform/ui/button.h"
 #include "platform/ui/label.h"
 
 namespace vaelo {
@@ -96,7 +97,9 @@ GtkWidget* makeBarItemWidget(const BarButtonItemRef& item) {
     const BarButtonItemRef shown = weak.lock();
     if (!shown) return;
     gtk_widget_set_sensitive(button, shown->enabled());
-    if (!look.icon) gtk_button_set_label(GTK_BUTTON(button), look.label ? look.label : shown->title().c_str());
+    const auto* custom = dynamic_cast<const Button*>(shown->customView().get());
+    const std::string& title = custom ? custom->title() : shown->title();
+    if (!look.icon) gtk_button_set_label(GTK_BUTTON(button), look.label ? look.label : title.c_str());
   };
   show();
   keepWithWidget(button, item->changed().connect([show](BarButtonItem&) { show(); }));

@@ -37,7 +37,8 @@ class MirroredPicture : public MirroredContent {
 class MirroredButton : public MirroredContent {
  public:
   explicit MirroredButton(Button& view)
-      : view_(std::static_pointer_cast<Button>(view.shared_from_this())), button_(gtk_button_new()) {
+      : view_(std::static_pointer_cast<Button>(view.shared_from_this())),
+        button_(GTK_WIDGET(g_object_ref_sink(gtk_button_new()))) {
     gtk_widget_add_css_class(button_, "flat");
     g_signal_connect_swapped(button_, "clicked", G_CALLBACK(+[](Button* pressed) {
                                const ViewRef kept = pressed->shared_from_this();
@@ -46,7 +47,10 @@ class MirroredButton : public MirroredContent {
                              view_.get());
     update();
   }
-  ~MirroredButton() override { g_signal_handlers_disconnect_by_data(button_, view_.get()); }
+  ~MirroredButton() override {
+    g_signal_handlers_disconnect_by_data(button_, view_.get());
+    g_object_unref(button_);
+  }
   GtkWidget* widget() override { return button_; }
   void update() override {
     gtk_button_set_label(GTK_BUTTON(button_), view_->title().c_str());
@@ -60,7 +64,7 @@ class MirroredButton : public MirroredContent {
 
 class MirroredDrawing : public MirroredContent {
  public:
-  explicit MirroredDrawing(View& view) : area_(gtk_drawing_area_new()) {
+  explicit MirroredDrawing(View& view) : area_(GTK_WIDGET(g_object_ref_sink(gtk_drawing_area_new()))) {
     gtk_drawing_area_set_draw_func(
         GTK_DRAWING_AREA(area_),
         [](GtkDrawingArea*, cairo_t* cairo, int, int, gpointer drawn) {
@@ -69,7 +73,10 @@ class MirroredDrawing : public MirroredContent {
         },
         &view, nullptr);
   }
-  ~MirroredDrawing() override { gtk_drawing_area_set_draw_func(GTK_DRAWING_AREA(area_), nullptr, nullptr, nullptr); }
+  ~MirroredDrawing() override {
+    gtk_drawing_area_set_draw_func(GTK_DRAWING_AREA(area_), nullptr, nullptr, nullptr);
+    g_object_unref(area_);
+  }
   GtkWidget* widget() override { return area_; }
   void update() override { gtk_widget_queue_draw(area_); }
 

@@ -14,7 +14,7 @@ namespace vaelo {
 class MirroredContent {
  public:
   virtual ~MirroredContent() = default;
-  /// Floating when it was just made; whoever puts it somewhere owns it.
+  /// Whoever puts it somewhere takes a reference of its own.
   virtual GtkWidget* widget() = 0;
   /// Takes over what changed in the view.
   virtual void update() = 0;

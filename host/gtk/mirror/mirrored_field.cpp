@@ -16,7 +16,7 @@ float xalignOf(TextAlignment alignment) {
 
 MirroredField::MirroredField(TextField& field)
     : field_(std::static_pointer_cast<TextField>(field.shared_from_this())),
-      entry_(gtk_entry_new()),
+      entry_(GTK_WIDGET(g_object_ref_sink(gtk_entry_new()))),
       focus_(gtk_event_controller_focus_new()) {
   gtk_widget_add_controller(entry_, focus_);
   g_signal_connect_swapped(entry_, "changed", G_CALLBACK(+[](MirroredField* self) { self->typed(); }), this);
@@ -38,6 +38,7 @@ MirroredField::MirroredField(TextField& field)
 MirroredField::~MirroredField() {
   g_signal_handlers_disconnect_by_data(entry_, this);
   g_signal_handlers_disconnect_by_data(focus_, this);
+  g_object_unref(entry_);
 }
 
 void MirroredField::update() {
