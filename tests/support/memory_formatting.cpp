@@ -42,11 +42,12 @@ std::string MemoryFormatting::byteCount(std::uint64_t bytes, ByteCountStyle styl
   return (isGrouped ? text.substr(0, 1) + "," + text.substr(1) : text) + " " + (bytes == 1 ? "byte" : Units[at].name);
 }
 
+// Longer in a longer style.
 std::string MemoryFormatting::localizedDate(Date date, DateStyle dateStyle, DateStyle timeStyle) {
   if (dateStyle == DateStyle::None && timeStyle == DateStyle::None) return "";
   const auto seconds = std::chrono::duration_cast<std::chrono::seconds>(date.time_since_epoch()).count();
   return std::to_string(seconds) + " s, date " + std::to_string(static_cast<int>(dateStyle)) + ", time " +
-         std::to_string(static_cast<int>(timeStyle));
+         std::to_string(static_cast<int>(timeStyle)) + std::string(static_cast<std::size_t>(dateStyle), '.');
 }
 
 std::string MemoryFormatting::localizedString(const std::string& key) {

@@ -60,8 +60,8 @@ TEST_F(DRItemTest, FieldsComeFromTheResourceValues) {
   EXPECT_TRUE(record->hasHiddenExtension());
   EXPECT_TRUE(record->renameable());
   EXPECT_FALSE(record->isPromise());
-  EXPECT_EQ(record->friendlyCreationDate(DateStyle::Long), "1000 s, date 3, time 1");
-  EXPECT_EQ(record->friendlyContentModificationDate(DateStyle::Short), "1000 s, date 1, time 1");
+  EXPECT_EQ(record->friendlyCreationDate(DateStyle::Long), "1000 s, date 3, time 1...");
+  EXPECT_EQ(record->friendlyContentModificationDate(DateStyle::Short), "1000 s, date 1, time 1.");
 }
 
 TEST_F(DRItemTest, AbsentValuesHaveTheirDefaults) {

@@ -45,10 +45,10 @@ TEST_F(DRItemTextTest, descriptionOfAPromisedPackageBehindALink) {
 
 TEST_F(DRItemTextTest, datesAreToldInTheStyleAskedForWithAShortTime) {
   const auto item = filled({{K::CreationDate, Date(std::chrono::seconds(60))}});
-  EXPECT_EQ(item->friendlyCreationDate(DateStyle::Long), "60 s, date 3, time 1");
+  EXPECT_EQ(item->friendlyCreationDate(DateStyle::Long), "60 s, date 3, time 1...");
   EXPECT_FALSE(item->friendlyContentModificationDate(DateStyle::Long));
   item->setContentModificationDate(Date(std::chrono::seconds(61)));
-  EXPECT_EQ(item->friendlyContentModificationDate(DateStyle::Medium), "61 s, date 2, time 1");
+  EXPECT_EQ(item->friendlyContentModificationDate(DateStyle::Medium), "61 s, date 2, time 1..");
   EXPECT_FALSE(DRItem::friendlyDateStyle(Value("yesterday"), DateStyle::Long));
 }
 

@@ -1,0 +1,180 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "items/file_tags.h"
+
+#include <gmock/gmock.h>
+
+#include <cmath>
+#include <cstdlib>
+
+#include "items/color_additions.h"
+#include "tests/support/memory_image.h"
+#include "tests/support/memory_platform.h"
+
+namespace vaelo {
+namespace {
+
+using ::testing::ElementsAre;
+using ::testing::IsEmpty;
+
+class FileTagsTest : public ::testing::Test {
+ protected:
+  void store(std::uint64_t version, Array tags) {
+    memory.syncedStore.values["RoverTagDict"] =
+        Value(Dictionary{{"RoverTagDictVersion", Value(version)}, {"RoverTags", Value(std::move(tags))}});
+    FileTags::_tagColorsDidChange();
+  }
+  static Value tag(const char* name, std::uint64_t label) {
+    return Value(Dictionary{{"n", Value(name)}, {"l", Value(label)}});
+  }
+  MemoryPlatform memory;
+};
+
+TEST_F(FileTagsTest, TheEightColoursOfTheLabels) {
+  const auto& colors = FileTags::_tagBlipColors();
+  EXPECT_THAT(colors, ElementsAre(Color{0.8, 0.8, 0.8, 1}, Color::systemGray(), Color::systemGreen(), Color::systemPurple(),
+                                  Color::systemBlue(), Color::systemYellow(), Color::systemRed(), Color::systemOrange()));
+}
+
+TEST_F(FileTagsTest, NamesComeInOrderWithTheirColours) {
+  store(2, {tag("Work", 6), tag("Home", 2)});
+  EXPECT_THAT(FileTags::allTags(), ElementsAre("Work", "Home"));
+  EXPECT_EQ(FileTags::tagColorsByTag().at("Work"), Color::systemRed());
+  EXPECT_EQ(FileTags::tagColorsByTag().at("Home"), Color::systemGreen());
+}
+
+TEST_F(FileTagsTest, OtherVersionsAreIgnoredWhole) {
+  for (const std::uint64_t version : {std::uint64_t{1}, std::uint64_t{3}}) {
+    store(2, {tag("Work", 6)});
+    store(version, {tag("Home", 2)});
+    EXPECT_THAT(FileTags::allTags(), IsEmpty());
+    EXPECT_THAT(FileTags::tagColorsByTag(), IsEmpty());
+    EXPECT_TRUE(memory.log.has("DEBUG",
+                               "Rover tag dictionary has incorrect version (" + std::to_string(version) + ", should be 2)"));
+  }
+  EXPECT_EQ(memory.log.count("WARNING", "Rover tag dictionary is empty"), 2u);
+}
+
+TEST_F(FileTagsTest, AMissingOrWrongDictionaryIsEmpty) {
+  memory.syncedStore.values.clear();
+  FileTags::_tagColorsDidChange();
+  EXPECT_TRUE(memory.log.has("WARNING", "Rover tag dictionary is empty"));
+  memory.syncedStore.values["RoverTagDict"] = Value("text");
+  FileTags::_tagColorsDidChange();
+  EXPECT_EQ(memory.log.count("WARNING", "Rover tag dictionary is empty"), 2u);
+  EXPECT_THAT(FileTags::allTags(), IsEmpty());
+}
+
+TEST_F(FileTagsTest, LabelsBeyondTheTableAreGreyAndNamesMayRepeat) {
+  store(2, {tag("Odd", 9), tag("Twice", 6), tag("Twice", 2)});
+  EXPECT_EQ(FileTags::tagColorsByTag().at("Odd"), FileTags::_tagBlipColors()[0]);
+  EXPECT_THAT(FileTags::allTags(), ElementsAre("Odd", "Twice", "Twice"));
+  EXPECT_EQ(FileTags::tagColorsByTag().at("Twice"), Color::systemGreen());
+}
+
+TEST_F(FileTagsTest, WhatIsNoNamedTagIsPassedOver) {
+  store(2, {Value("text"), Value(Dictionary{{"l", Value(std::uint64_t{2})}}), tag("Work", 6)});
+  EXPECT_THAT(FileTags::allTags(), ElementsAre("Work"));
+}
+
+TEST_F(FileTagsTest, FollowsTheStoreFromTheFirstUse) {
+  // The first use happens once in a process.
+  EXPECT_EXIT(
+      {
+        memory.syncedStore.values["RoverTagDict"] =
+            Value(Dictionary{{"RoverTagDictVersion", Value(std::uint64_t{2})}, {"RoverTags", Value(Array{tag("Work", 6)})}});
+        const bool first = FileTags::allTags() == std::vector<std::string>{"Work"};
+        memory.syncedStore.values["RoverTagDict"] =
+            Value(Dictionary{{"RoverTagDictVersion", Value(std::uint64_t{2})}, {"RoverTags", Value(Array{tag("Home", 1)})}});
+        memory.notifications.post({SyncedStoreDidChangeExternallyNotification, {}});
+        const bool second = FileTags::allTags() == std::vector<std::string>{"Home"};
+        std::_Exit(first && second ? 0 : 1);
+      },
+      ::testing::ExitedWithCode(0), "");
+}
+
+TEST_F(FileTagsTest, ABlipIsADotWithALighterRim) {
+  store(2, {tag("Work", 4)});
+  EXPECT_EQ(FileTags::blipWithTagImageSizeBlipHeightOffset("", {12, 16}, 10, {0, 3}), nullptr);
+  const ImageRef blip = FileTags::blipWithTagImageSizeBlipHeightOffset("Work", {12, 16}, 10, {0, 3});
+  ASSERT_NE(blip, nullptr);
+  EXPECT_EQ(blip->width(), 12);
+  EXPECT_EQ(blip->height(), 16);
+  // Blue is 0.21, 0.52, 0.89; the circle of 10 points stands 1 point in from its place.
+  EXPECT_THAT(std::dynamic_pointer_cast<const MemoryImage>(blip)->origin(),
+              ElementsAre("fillColor 0.21 0.52 0.89 1", "fillEllipse 1 4 8 8", "lineWidth 1",
+                          "strokeColor 0.605 0.76 0.945 1", "strokeEllipse 1 4 8 8"));
+  const ImageRef blank = FileTags::blipWithTagImageSizeBlipHeightOffset("unknown", {12, 16}, 10, {0, 3});
+  ASSERT_NE(blank, nullptr);
+  EXPECT_EQ(blank->width(), 12);
+  EXPECT_THAT(std::dynamic_pointer_cast<const MemoryImage>(blank)->origin(), IsEmpty());
+}
+
+class ColorBlendTest : public ::testing::Test {
+ protected:
+  static Color blend(const Color& d, const Color& s, const char* filter) {
+    return vlo_colorBlendedWithColorCompositingFilter(d, s, std::string(filter));
+  }
+  static void expectNear(const Color& color, double red, double green, double blue, double alpha) {
+    EXPECT_NEAR(color.red, red, 1e-12);
+    EXPECT_NEAR(color.green, green, 1e-12);
+    EXPECT_NEAR(color.blue, blue, 1e-12);
+    EXPECT_NEAR(color.alpha, alpha, 1e-12);
+  }
+  // Backdrop and source of the numbers below, which are worked out by hand.
+  const Color d{0.2, 0.5, 0.8, 0.5};
+  const Color s{0.5, 0.25, 1, 0.5};
+};
+
+TEST_F(ColorBlendTest, NoColourATransparentOneAndAnUnknownModeChangeNothing) {
+  EXPECT_EQ(vlo_colorBlendedWithColor(d, std::nullopt), d);
+  EXPECT_EQ(blend(d, s.withAlpha(0), CompositingFilter::Multiply), d);
+  EXPECT_EQ(blend(d, s.withAlpha(1e-8), CompositingFilter::Screen), d);
+  EXPECT_EQ(blend(d, s, "exclusion"), d);
+}
+
+TEST_F(ColorBlendTest, SourceOver) {
+  // alpha 0.5 + 0.5 * 0.5 = 0.75; red (0.25 + 0.05) / 0.75, green (0.125 + 0.125) / 0.75, blue (0.5 + 0.2) / 0.75
+  expectNear(vlo_colorBlendedWithColor(d, s), 0.4, 1.0 / 3, 0.7 / 0.75, 0.75);
+  EXPECT_EQ(blend(d, s, CompositingFilter::Normal), vlo_colorBlendedWithColor(d, s));
+  EXPECT_EQ(vlo_colorBlendedWithColorCompositingFilter(d, s, std::nullopt), vlo_colorBlendedWithColor(d, s));
+  EXPECT_EQ(vlo_colorBlendedWithColor(d, Color{1, 0, 0, 1}), (Color{1, 0, 0, 1}));
+  const Color faint = vlo_colorBlendedWithColor(d.withAlpha(-1), s.withAlpha(0.5));
+  expectNear(faint, 1, 1, 1, 0);
+}
+
+TEST_F(ColorBlendTest, MultiplyAndScreen) {
+  // 0.5 * s * d + 0.5 * d
+  expectNear(blend(d, s, CompositingFilter::Multiply), 0.15, 0.3125, 0.8, 0.5);
+  // 0.5 * d + 0.5 * (1 - (1 - s)(1 - d))
+  expectNear(blend(d, s, CompositingFilter::Screen), 0.4, 0.5625, 0.9, 0.5);
+}
+
+TEST_F(ColorBlendTest, OverlayDarkenLighten) {
+  // f: 2 * 0.5 * 0.2 = 0.2; d is 0.5: 1 - 2 * 0.75 * 0.5 = 0.25; 1 - 2 * 0 * 0.2 = 1
+  expectNear(blend(d, s, CompositingFilter::Overlay), 0.2, 0.375, 0.9, 0.5);
+  expectNear(blend(d, s, CompositingFilter::Darken), 0.2, 0.375, 0.8, 0.5);
+  expectNear(blend(d, s, CompositingFilter::Lighten), 0.35, 0.5, 0.9, 0.5);
+}
+
+TEST_F(ColorBlendTest, DodgeAndBurnHaveTheirGuardsAndNoClamps) {
+  // dodge: 0.2 / 0.5 = 0.4, 0.5 / 0.75, 0.8 / 0 = infinity (the guard looks at s)
+  const Color dodged = blend(d, s, CompositingFilter::ColorDodge);
+  EXPECT_NEAR(dodged.red, 0.3, 1e-12);
+  EXPECT_NEAR(dodged.green, 0.5 * (0.5 / 0.75) + 0.25, 1e-12);
+  EXPECT_TRUE(std::isinf(dodged.blue));
+  EXPECT_NEAR(blend(d, Color{0, 0, 0, 0.5}, CompositingFilter::ColorDodge).red, 0.6, 1e-12) << "f is 1";
+  // burn: 1 - (1 - d * 0.5) / s: -0.8, -2, 0.4; out 0.5 * f + 0.25 * d
+  expectNear(blend(d, s, CompositingFilter::ColorBurn), -0.35, -0.875, 0.4, 0.5);
+  EXPECT_NEAR(blend(d, Color{0, 0, 0, 0.5}, CompositingFilter::ColorBurn).red, 0.05, 1e-12) << "f is 0";
+}
+
+TEST_F(ColorBlendTest, PlusLighterAndPlusDarker) {
+  // min(s + d, 1): 0.7, 0.75, 1
+  expectNear(blend(d, s, CompositingFilter::PlusLighter), 0.45, 0.625, 0.9, 0.5);
+  // t = 1; u = (0.5 - 0.5 s) + (0.5 - d): 0.25 + 0.3, 0.375 + 0, 0 - 0.3 -> 0; out 1 - u / 0.5 clamped
+  expectNear(blend(d, s, CompositingFilter::PlusDarker), 0, 0.25, 1, 0.5);
+  expectNear(blend(d.withAlpha(0), s, CompositingFilter::PlusDarker), 0, 0, 0, 0);
+}
+
+}  // namespace
+}  // namespace vaelo
