@@ -94,13 +94,12 @@ void PreviewItemManager::registerBatonActivityForBookmark(const std::string& boo
   if (bookmark.empty()) return;
   const std::shared_ptr<UserActivity> activity =
       Platform::current().userActivities.makeActivity(Settings::batonVaeloActivityType());
-  {
-    const std::lock_guard lock(itemMutex_);
-    batonActivity_ = activity;
-  }
   activity->setEligibleForBaton(true);
   activity->setUserInfo({{UserActivityDocumentURLKey, bookmark}});
+  // Current before anybody can tell it to resign.
+  const std::lock_guard lock(itemMutex_);
   activity->becomeCurrent();
+  batonActivity_ = activity;
 }
 
 void PreviewItemManager::unregisterBatonActivity() {

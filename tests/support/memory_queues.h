@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <functional>
 #include <memory>
 
 #include "tests/support/memory_dispatch_queue.h"
@@ -18,6 +19,7 @@ class MemoryQueues : public Queues {
     return std::make_shared<MemoryDispatchQueue>(clock_, label);
   }
   std::shared_ptr<OperationQueue> makeOperationQueue(const std::string& name, QualityOfService quality) override {
+    if (makesOperationQueue) return makesOperationQueue(name, quality);
     return std::make_shared<MemoryOperationQueue>(clock_, name, quality);
   }
   std::unique_ptr<TimerSource> makeTimer(std::shared_ptr<DispatchQueue> queue, std::chrono::nanoseconds interval,
@@ -25,6 +27,9 @@ class MemoryQueues : public Queues {
     return std::make_unique<MemoryTimer>(queue ? std::move(queue) : makeSerialQueue("timer"), interval, std::move(handler));
   }
   Date now() override { return clock_->date(); }
+
+  /// Where a test wants other queues, with real threads.
+  std::function<std::shared_ptr<OperationQueue>(const std::string&, QualityOfService)> makesOperationQueue;
 
  private:
   std::shared_ptr<MemoryClock> clock_;

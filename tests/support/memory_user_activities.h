@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <atomic>
 #include <memory>
+#include <mutex>
 #include <string>
 #include <utility>
 #include <vector>
@@ -15,8 +17,14 @@ class MemoryUserActivity : public UserActivity {
  public:
   explicit MemoryUserActivity(std::string type) : type_(std::move(type)) {}
   std::string activityType() const override { return type_; }
-  Dictionary userInfo() const override { return userInfo_; }
-  void setUserInfo(Dictionary userInfo) override { userInfo_ = std::move(userInfo); }
+  Dictionary userInfo() const override {
+    const std::lock_guard lock(mutex_);
+    return userInfo_;
+  }
+  void setUserInfo(Dictionary userInfo) override {
+    const std::lock_guard lock(mutex_);
+    userInfo_ = std::move(userInfo);
+  }
   void setEligibleForBaton(bool eligible) override { eligible_ = eligible; }
   void becomeCurrent() override { current_ = true; }
   void resignCurrent() override { current_ = false; }
@@ -25,9 +33,10 @@ class MemoryUserActivity : public UserActivity {
 
  private:
   std::string type_;
-  Dictionary userInfo_;
-  bool eligible_ = false;
-  bool current_ = false;
+  mutable std::mutex mutex_;
+  Dictionary userInfo_;  // guarded by mutex_
+  std::atomic<bool> eligible_ = false;
+  std::atomic<bool> current_ = false;
 };
 
 class MemoryUserActivities : public UserActivities {

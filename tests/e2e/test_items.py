@@ -1,0 +1,116 @@
+# SPDX-License-Identifier: GPL-3.0-or-later
+"""What people do with items: create, rename, move, delete, look at the details; each seen on the disk."""
+import unittest
+
+from harness import App, wait_for
+
+
+class Items(unittest.TestCase):
+    def setUp(self):
+        def prepare(app):
+            app.drive.mkdir(parents=True)
+            (app.data / "account.ini").write_text("[Account]\nName=x\nToken=ab\nSignedIn=true\n")
+            for folder in ("Desktop", "Documents", "Plans"):
+                (app.drive / folder).mkdir()
+            for name in ("Report.txt", "Second.txt", "Third.txt"):
+                (app.drive / name).write_text(name)
+        self.app = App(prepare=prepare)
+        self.addCleanup(self.app.close)
+        self.app.wait("Report.txt", "list item")
+        self.drive = self.app.drive
+
+    def on_disk(self, path, there=True):
+        wait_for(f"{path} {'to be' if there else 'to go'}", lambda: (self.drive / path).exists() == there)
+
+    def menu(self, item, action):
+        self.app.click(item, "list item", button=3)
+        self.app.click(action, "menu item")
+
+    def choose(self, *items):
+        self.app.click("Select", "push button")
+        self.app.wait_title("Select Items")
+        for item in items:
+            self.app.click(item, "list item")
+
+    def test_a_folder_is_made(self):
+        app = self.app
+        app.click("Select", "push button")
+        app.click("New Folder", "push button")
+        app.wait("Enter a name for this folder.")
+        app.type("Letters")
+        app.click("Create", "push button")
+        self.on_disk("Letters")
+        app.wait("Letters", "list item")
+
+    def test_a_name_that_is_taken_keeps_the_prompt(self):
+        app = self.app
+        app.click("Select", "push button")
+        app.click("New Folder", "push button")
+        app.wait("Enter a name for this folder.")
+        app.type("Plans")
+        app.key("Return")
+        app.wait("Name is already taken")
+        app.key("Escape")
+        app.wait_gone("Enter a name for this folder.")
+
+    def test_renaming_keeps_the_extension(self):
+        app = self.app
+        self.menu("Report.txt", "Rename")
+        app.wait("Enter a new name for this item.")
+        app.key("ctrl+a")
+        app.type("Summary")
+        app.key("Return")
+        self.on_disk("Summary.txt")
+        self.assertEqual((self.drive / "Summary.txt").read_text(), "Report.txt")
+        app.wait("Summary.txt", "list item")
+
+    def test_items_move_through_the_picker(self):
+        app = self.app
+        self.choose("Second.txt", "Third.txt")
+        app.wait_title("2 Items Selected")
+        app.click("Move", "push button")
+        app.wait("Move 2 items to")
+        app.wait("The items are in this folder already.")
+        app.click("Plans", "list item")
+        wait_for("the way into the folder", lambda: not app.find("The items are in this folder already."))
+        app.click("Move", "push button")
+        self.on_disk("Plans/Second.txt")
+        self.on_disk("Plans/Third.txt")
+        self.on_disk("Second.txt", False)
+
+    def test_deleting_asks_first(self):
+        app = self.app
+        self.menu("Report.txt", "Delete")
+        app.wait("\"Report.txt\" will be permanently deleted")
+        app.click("Cancel", "push button")
+        app.wait_gone("\"Report.txt\" will be permanently deleted")
+        self.on_disk("Report.txt")
+        self.choose("Report.txt", "Second.txt")
+        app.click("Delete", "push button")
+        app.click("Delete from Vaelo Drive", "push button")
+        self.on_disk("Report.txt", False)
+        self.on_disk("Second.txt", False)
+        self.on_disk("Third.txt")
+        app.wait_title("Vaelo Drive")
+
+    def test_special_folders_stay(self):
+        self.menu("Documents", "Delete")
+        self.app.wait("This can’t be done with this item.")
+        self.on_disk("Documents")
+
+    def test_the_details_show_facts_and_rename_in_place(self):
+        app = self.app
+        self.menu("Report.txt", "Info")
+        for fact in ("Kind", "Size", "Where", "Modified"):
+            app.wait(fact)
+        app.click("Name", "text")
+        app.wait_title("Rename File")
+        app.key("ctrl+a")
+        app.type("Facts.txt")
+        app.key("Return")
+        self.on_disk("Facts.txt")
+        app.wait_gone("Rename File")
+
+
+if __name__ == "__main__":
+    unittest.main()
