@@ -77,7 +77,8 @@ TEST_F(FileTagsTest, WhatIsNoNamedTagIsPassedOver) {
 }
 
 TEST_F(FileTagsTest, FollowsTheStoreFromTheFirstUse) {
-  // The first use happens once in a process.
+  // The first use happens once in a process: this test gets one of its own.
+  GTEST_FLAG_SET(death_test_style, "threadsafe");
   EXPECT_EXIT(
       {
         memory.syncedStore.values["RoverTagDict"] =

@@ -108,6 +108,7 @@ TEST_F(NavMoveTest, WithNowhereToGoANewFolderIsAskedFor) {
   const URL top = *library->documentsFolderURL();
   const URL file = top.appendingPathComponent("a.txt");
   memory.disk.add(file.path());
+  memory.cloud.movesAreFree = false;
   ASSERT_FALSE(vlo_canCrossZoneMoveURLs({file}));
   nav->showMoveTargetForItemsInFolder({file}, top);
   EXPECT_EQ(picker(), nullptr);

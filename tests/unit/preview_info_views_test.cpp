@@ -17,7 +17,11 @@ using ::testing::SizeIs;
 
 class InfoViewsTest : public PreviewFixture {
  protected:
-  std::shared_ptr<DRItem> item() { return DRItem::initWithURL(document); }
+  std::shared_ptr<DRItem> item() {
+    const auto made = DRItem::initWithURL(document);
+    made->setLocalizedTypeDescription("Portable document");
+    return made;
+  }
   static std::vector<std::string> names(const FileInfoStackView& stack) {
     std::vector<std::string> found;
     for (const ViewRef& row : stack.arrangedSubviews()) {
