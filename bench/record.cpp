@@ -33,7 +33,8 @@ struct World {
   World()
       : platform({folder + "/data", folder + "/preferences.ini", folder + "/restoration.ini"}),
         screens(platform.drive()),
-        loop(screens, platform.notifications(), vaelo::RestorationStore(folder + "/restoration.ini")) {
+        loop(screens, platform.drive(), platform.notifications(), platform.userActivities(),
+             vaelo::RestorationStore(folder + "/restoration.ini")) {
     platform.install(loop, screens);
     document = folder + "/data/mirror/com~marrow~Kestrel/Report.txt";
     std::ofstream(document) << "text";

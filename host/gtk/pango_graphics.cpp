@@ -17,7 +17,7 @@ PangoContext* context() {
 
 GRef<PangoLayout> layoutOf(const std::string& text, const Font& font) {
   GRef<PangoLayout> layout(pango_layout_new(context()));
-  PangoFontDescription* description = pango_font_description_from_string("Cantarell, sans");
+  PangoFontDescription* description = pango_font_description_from_string(PangoGraphics::FontFamilies);
   pango_font_description_set_absolute_size(description, font.pointSize * PANGO_SCALE);
   pango_layout_set_font_description(layout.get(), description);
   pango_font_description_free(description);

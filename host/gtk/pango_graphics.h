@@ -10,6 +10,7 @@ namespace vaelo {
 /// Text by Pango, drawing by Cairo, icons of the icon theme.
 class PangoGraphics : public Graphics {
  public:
+  static constexpr const char* FontFamilies = "Cantarell, sans";
   FontMetrics fontMetrics(const Font& font) override;
   Size measure(const std::string& text, const Font& font, double maxWidth, int maxLines) override;
   ImageRef renderImage(const Size& size, const std::function<void(DrawingContext&)>& draw) override;

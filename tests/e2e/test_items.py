@@ -32,9 +32,9 @@ class Items(unittest.TestCase):
         """A button of the dialog that is in front, whose places are told within its own window."""
         app = self.app
         rows = wait_for(f"“{name}” in the dialog",
-                        lambda: [row for row in app.accessibility.showing() if row[1] == name and row[0] == "push button"])
+                        lambda: [row for row in app.accessibility.showing() if row[1].startswith(name) and row[0] == "push button"])
         geometry = dict(line.split("=") for line in
-                        app.desktop.tool("xdotool", "getactivewindow", "getwindowgeometry", "--shell").splitlines()
+                        app.desktop.tool("xdotool", "getwindowfocus", "getwindowgeometry", "--shell").splitlines()
                         if "=" in line)
         row = rows[-1]
         app.mouse("mousemove", "--sync", str(int(geometry["X"]) + row[2] + row[4] // 2),
@@ -71,7 +71,8 @@ class Items(unittest.TestCase):
         app = self.app
         self.menu("Report.txt", "r")
         app.wait("Enter a new name for this item.")
-        app.key("ctrl+a")
+        # The caret stands before the extension.
+        app.key(*["BackSpace"] * len("Report"))
         app.type("Summary")
         app.key("Return")
         self.on_disk("Summary.txt")
@@ -85,8 +86,7 @@ class Items(unittest.TestCase):
         app.click("Move", "push button")
         app.wait("Move 2 items to")
         app.wait("The items are in this folder already.")
-        app.type("Plans")
-        app.key("Return")
+        app.key("Down", "Down", "Return")
         wait_for("the way into the folder", lambda: not app.find("The items are in this folder already."))
         self.press("Move")
         self.on_disk("Plans/Second.txt")
@@ -120,7 +120,7 @@ class Items(unittest.TestCase):
             app.wait(fact)
         app.click("Name", "text")
         app.wait_title("Rename File")
-        app.key("ctrl+a")
+        app.key("End", *["BackSpace"] * len("Report.txt"))
         app.type("Facts.txt")
         app.key("Return")
         self.on_disk("Facts.txt")

@@ -76,7 +76,10 @@ GtkConstraintTarget* ViewMirror::targetOf(const View& view) const {
 }
 
 void ViewMirror::constrain() {
-  gtk_constraint_layout_remove_all_constraints(layout_);
+  // A new layout rather than an emptied one, whose solver keeps what it worked out.
+  GtkLayoutManager* layout = gtk_constraint_layout_new();
+  gtk_widget_set_layout_manager(field_, layout);
+  layout_ = GTK_CONSTRAINT_LAYOUT(layout);
   for (const auto& [key, node] : nodes_) {
     View& view = *const_cast<View*>(key);
     for (const LayoutConstraintRef& constraint : view.constraints()) tie(*constraint);

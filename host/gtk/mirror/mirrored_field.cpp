@@ -28,20 +28,23 @@ MirroredField::MirroredField(TextField& field)
   g_signal_connect_swapped(entry_, "icon-release",
                            G_CALLBACK(+[](MirroredField* self) { gtk_editable_set_text(GTK_EDITABLE(self->entry_), ""); }),
                            this);
-  g_signal_connect_swapped(entry_, "notify::cursor-position",
-                           G_CALLBACK(+[](MirroredField* self) { self->selectionMoved(); }), this);
+  for (const char* property : {"notify::cursor-position", "notify::selection-bound"}) {
+    g_signal_connect_swapped(entry_, property, G_CALLBACK(+[](MirroredField* self) { self->selectionMoved(); }), this);
+  }
   g_signal_connect_swapped(focus_, "enter", G_CALLBACK(+[](MirroredField* self) { self->focusCame(); }), this);
   g_signal_connect_swapped(focus_, "leave", G_CALLBACK(+[](MirroredField* self) { self->focusLeft(); }), this);
   update();
 }
 
 MirroredField::~MirroredField() {
+  g_clear_handle_id(&idle_, g_source_remove);
   g_signal_handlers_disconnect_by_data(entry_, this);
   g_signal_handlers_disconnect_by_data(focus_, this);
   g_object_unref(entry_);
 }
 
 void MirroredField::update() {
+  if (taking_) return;
   taking_ = true;
   GtkEntry* entry = GTK_ENTRY(entry_);
   if (field_->text() != gtk_editable_get_text(GTK_EDITABLE(entry_))) {
@@ -71,23 +74,21 @@ void MirroredField::update() {
                                    field_->accessibilityLabel().c_str(), -1);
   }
   keepSelection();
-  const bool focused = gtk_event_controller_focus_contains_focus(GTK_EVENT_CONTROLLER_FOCUS(focus_));
+  GtkRoot* root = gtk_widget_get_root(entry_);
+  GtkWidget* focus = root ? gtk_root_get_focus(root) : nullptr;
+  const bool focused = focus && (focus == entry_ || gtk_widget_is_ancestor(focus, entry_));
   if (field_->isEditing() && !focused) gtk_entry_grab_focus_without_selecting(entry);
-  if (!field_->isEditing() && focused) {
-    if (GtkRoot* root = gtk_widget_get_root(entry_)) gtk_root_set_focus(root, nullptr);
-  }
+  if (!field_->isEditing() && focused) gtk_root_set_focus(root, nullptr);
   taking_ = false;
 }
 
-// The selection of the model, where it is one that code chose.
+// The selection of the model, where it is one that code chose: what the user selects comes from the widget, in steps.
 void MirroredField::keepSelection() {
   const TextRange& range = field_->selectedRange();
-  int start = 0;
-  int end = 0;
-  gtk_editable_get_selection_bounds(GTK_EDITABLE(entry_), &start, &end);
+  if (!field_->isEditing() || range == known_) return;
+  known_ = range;
   const int from = static_cast<int>(range.location);
-  const int to = from + static_cast<int>(range.length);
-  if (field_->isEditing() && (from != start || to != end)) gtk_editable_select_region(GTK_EDITABLE(entry_), from, to);
+  gtk_editable_select_region(GTK_EDITABLE(entry_), from, from + static_cast<int>(range.length));
 }
 
 void MirroredField::selectionMoved() {
@@ -96,7 +97,8 @@ void MirroredField::selectionMoved() {
   int end = 0;
   gtk_editable_get_selection_bounds(GTK_EDITABLE(entry_), &start, &end);
   if (start == end) start = end = gtk_editable_get_position(GTK_EDITABLE(entry_));
-  field_->setSelectedRange({static_cast<std::size_t>(start), static_cast<std::size_t>(end - start)});
+  known_ = {static_cast<std::size_t>(start), static_cast<std::size_t>(end - start)};
+  field_->setSelectedRange(known_);
 }
 
 void MirroredField::typed() {
@@ -106,13 +108,32 @@ void MirroredField::typed() {
     update();
     return;
   }
-  if (!kept->userSetText(gtk_editable_get_text(GTK_EDITABLE(entry_)))) update();
+  taking_ = true;  // the widget has its own caret behind what was typed
+  kept->userSetText(gtk_editable_get_text(GTK_EDITABLE(entry_)));
+  known_ = kept->selectedRange();
+  taking_ = false;
+  update();
 }
 
 void MirroredField::focusCame() {
   if (taking_ || field_->isEditing()) return;
   const std::shared_ptr<TextField> kept = field_;
-  if (kept->becomeFirstResponder()) return;
+  if (kept->becomeFirstResponder()) {
+    // The toolkit selects all once the focus has come.
+    if (idle_ == 0) {
+      idle_ = g_idle_add_full(
+          G_PRIORITY_HIGH_IDLE,
+          [](gpointer self) -> gboolean {
+            auto* mirror = static_cast<MirroredField*>(self);
+            mirror->idle_ = 0;
+            mirror->known_ = {mirror->field_->text().size() + 1, 0};
+            mirror->keepSelection();
+            return G_SOURCE_REMOVE;
+          },
+          this, nullptr);
+    }
+    return;
+  }
   // What can't be changed doesn't take the keyboard either.
   if (GtkRoot* root = gtk_widget_get_root(entry_)) gtk_root_set_focus(root, nullptr);
 }

@@ -26,7 +26,9 @@ class MirroredField : public MirroredContent {
   std::shared_ptr<TextField> field_;
   GtkWidget* entry_;
   GtkEventController* focus_;
-  bool taking_ = false;  ///< the widget is being made to say what the model says
+  guint idle_ = 0;
+  TextRange known_;      ///< the selection that widget and model agreed on last
+  bool taking_ = false;  ///< one of the two is being made to say what the other says
 };
 
 }  // namespace vaelo

@@ -10,6 +10,8 @@ namespace vaelo {
 
 namespace {
 
+constexpr int MostPasses = 6;
+
 /// What a view shows is shown by its own widget; a button draws its title itself.
 bool showsItsSubviews(const View& view) { return dynamic_cast<const Button*>(&view) == nullptr; }
 
@@ -24,9 +26,6 @@ bool isLine(const View& view) { return view.backgroundColor() == Color::barHairl
 }  // namespace
 
 ViewMirror::ViewMirror(ViewRef root) : root_(std::move(root)), field_(gtk_fixed_new()) {
-  GtkLayoutManager* layout = gtk_constraint_layout_new();
-  gtk_widget_set_layout_manager(field_, layout);
-  layout_ = GTK_CONSTRAINT_LAYOUT(layout);
   area_ = GTK_WIDGET(g_object_ref_sink(makeMirrorArea(
       field_, [](gpointer self) { static_cast<ViewMirror*>(self)->allocated(); }, this)));
   gtk_widget_set_overflow(area_, GTK_OVERFLOW_HIDDEN);
@@ -50,13 +49,15 @@ ViewMirror::~ViewMirror() {
 void ViewMirror::viewChanged(View& view, ViewChange change) {
   const auto found = nodes_.find(&view);
   if (found != nodes_.end()) found->second.changed = true;
+  // What a layout changes is laid out again, but not for ever: texts that depend on their width may never agree with it.
+  if (!reporting_) passes_ = 0;
   if (change != ViewChange::Layout || !reporting_) scheduleUpdate();
 }
 
 void ViewMirror::viewWillBeDestroyed(View& view) { drop(view); }
 
 void ViewMirror::scheduleUpdate() {
-  if (idle_ != 0) return;
+  if (idle_ != 0 || passes_ >= MostPasses) return;
   // Before the frame clock lays out and draws.
   idle_ = g_idle_add_full(
       G_PRIORITY_HIGH_IDLE + 5,
@@ -69,6 +70,7 @@ void ViewMirror::scheduleUpdate() {
 }
 
 void ViewMirror::update() {
+  ++passes_;
   root_->layoutIfNeeded();
   std::vector<View*> present;
   collect(*root_, present);
@@ -104,7 +106,7 @@ void ViewMirror::drop(View& view) {
   view.setObserver(nullptr);
   found->second.content = nullptr;
   // Constraints keep no widget alive: they go before it.
-  gtk_constraint_layout_remove_all_constraints(layout_);
+  gtk_widget_set_layout_manager(field_, nullptr);
   if (found->second.slot) gtk_widget_unparent(found->second.slot);
   nodes_.erase(found);
   scheduleUpdate();
@@ -147,6 +149,12 @@ bool ViewMirror::report(View& view, const graphene_rect_t& above) {
   const double x = static_cast<double>(node->second.slot ? box.origin.x - above.origin.x : 0);
   const double y = static_cast<double>(node->second.slot ? box.origin.y - above.origin.y : 0);
   const Rect frame = {x, y, static_cast<double>(box.size.width), static_cast<double>(box.size.height)};
+  // Whoever places a view by its frame knows it already, and finer than the layout's whole pixels.
+  if (node->second.slot && view.translatesAutoresizingMaskIntoConstraints()) {
+    if (moved) view.setNeedsLayout();
+    view.layoutIfNeeded();
+    return false;
+  }
   const bool changed = frame != view.frame();
   if (changed || moved) view.setNeedsLayout();
   // What several lines of text need depends on the width that they got.

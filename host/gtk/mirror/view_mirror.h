@@ -60,9 +60,10 @@ class ViewMirror : public ViewObserver {
   ViewRef root_;
   GtkWidget* field_;  // holds the slots
   GtkWidget* area_;
-  GtkConstraintLayout* layout_;
+  GtkConstraintLayout* layout_ = nullptr;  // of field_, made anew with each set of constraints
   std::map<const View*, Node> nodes_;
   guint idle_ = 0;
+  int passes_ = 0;  ///< layouts since the model changed by itself
   bool reporting_ = false;
 };
 
