@@ -91,11 +91,6 @@ class CairoContext : public DrawingContext {
 
 }  // namespace
 
-void drawWithCairo(cairo_t* cairo, const std::function<void(DrawingContext&)>& draw) {
-  CairoContext context(cairo);
-  draw(context);
-}
-
 FontMetrics PangoGraphics::fontMetrics(const Font& font) {
   const GRef<PangoLayout> layout = layoutOf("X", font);
   PangoRectangle ink;
@@ -128,7 +123,8 @@ ImageRef PangoGraphics::renderImage(const Size& size, const std::function<void(D
   const int height = std::max(1, static_cast<int>(std::ceil(size.height)));
   cairo_surface_t* surface = cairo_image_surface_create(CAIRO_FORMAT_ARGB32, width, height);
   cairo_t* cairo = cairo_create(surface);
-  drawWithCairo(cairo, draw);
+  CairoContext drawing(cairo);
+  draw(drawing);
   cairo_destroy(cairo);
   cairo_surface_flush(surface);
   const auto stride = static_cast<gsize>(cairo_image_surface_get_stride(surface));

@@ -18,9 +18,6 @@ class PangoGraphics : public Graphics {
                         IconFormat format) override;
 };
 
-/// Runs `draw` with a context that draws with `cairo`.
-void drawWithCairo(cairo_t* cairo, const std::function<void(DrawingContext&)>& draw);
-
 /// An image as the toolkit holds it.
 class GtkImageData : public Image {
  public:

@@ -5,8 +5,8 @@
 
 #include <vector>
 
-#include "host/gtk/mirror/mirrored_field.h"
-#include "host/gtk/mirror/mirrored_text.h"
+#include "host/gtk/mirrored_field.h"
+#include "host/gtk/mirrored_text.h"
 
 namespace vaelo {
 
@@ -158,6 +158,7 @@ GtkWindow* showPromptDialog(const std::shared_ptr<AlertController>& alert, GtkWi
   alert->view();
   auto* dialog = new PromptDialog(alert, over);
   gtk_window_present(dialog->window());
+  alert->textFields().front()->becomeFirstResponder();
   if (shown) shown();
   return dialog->window();
 }

@@ -3,8 +3,10 @@
 
 #include "host/gtk/bar_item_widget.h"
 #include "host/gtk/host_screen.h"
-#include "host/gtk/mirror/view_mirror.h"
+#include "host/gtk/preview/facts_page.h"
 #include "host/gtk/preview/preview_page.h"
+#include "preview/preview_base_view_controller.h"
+#include "preview/preview_item_manager.h"
 
 namespace vaelo {
 
@@ -40,9 +42,11 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
     preview_ = std::make_unique<PreviewPage>(preview, [this] { showBar(); });
     gtk_widget_set_vexpand(preview_->widget(), TRUE);
     gtk_box_append(GTK_BOX(box_), preview_->widget());
-  } else {
-    mirror_ = std::make_unique<ViewMirror>(screen_->view());
-    gtk_box_append(GTK_BOX(box_), mirror_->widget());
+  } else if (std::dynamic_pointer_cast<PreviewBaseViewController>(screen_)) {
+    facts_ = std::make_unique<FactsPage>([this] { showFacts(); });
+    gtk_widget_set_vexpand(facts_->widget(), TRUE);
+    gtk_box_append(GTK_BOX(box_), facts_->widget());
+    showFacts();
   }
   gtk_widget_add_css_class(toolbar_, "toolbar");
   gtk_widget_set_size_request(toolbar_, -1, 46);
@@ -89,6 +93,20 @@ bool ScreenPage::closeSearch() { return hostScreen_ ? hostScreen_->closeSearch()
 void ScreenPage::refresh() {
   if (hostScreen_) hostScreen_->refresh();
   if (preview_) preview_->refresh();
+  if (facts_) showFacts();
+}
+
+void ScreenPage::showFacts() {
+  const auto details = std::static_pointer_cast<PreviewBaseViewController>(screen_);
+  const std::shared_ptr<PreviewItemManager> manager = details->itemManager();
+  const std::optional<URL> shown = manager && manager->item() ? manager->item()->resolvedURL() : std::nullopt;
+  if (!shown) {
+    facts_->showNothing();
+  } else if (manager->item()->isDownloaded()) {
+    facts_->show(*shown, "");
+  } else {
+    facts_->showNotDownloaded(*shown);
+  }
 }
 
 void ScreenPage::showBar() {

@@ -1,20 +1,22 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <gtk/gtk.h>
+
 #include <string>
 
-#include "host/gtk/mirror/mirrored_content.h"
 #include "platform/ui/font.h"
 #include "platform/ui/label.h"
 
 namespace vaelo {
 
 /// A label's text, with pictures in it where it has some.
-class MirroredText : public MirroredContent {
+class MirroredText {
  public:
   explicit MirroredText(Label& label);
-  GtkWidget* widget() override { return box_; }
-  void update() override;
+  GtkWidget* widget() { return box_; }
+  /// Takes over what changed in the model.
+  void update();
 
  private:
   GtkWidget* appendText(const std::string& text);

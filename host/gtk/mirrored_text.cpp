@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "host/gtk/mirror/mirrored_text.h"
+#include "host/gtk/mirrored_text.h"
 
 #include "host/gtk/pango_graphics.h"
 

@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "host/gtk/mirror/mirrored_field.h"
+#include "host/gtk/mirrored_field.h"
 
-#include "host/gtk/mirror/mirrored_text.h"
+#include "host/gtk/mirrored_text.h"
 
 namespace vaelo {
 

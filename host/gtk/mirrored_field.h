@@ -1,20 +1,22 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <gtk/gtk.h>
+
 #include <memory>
 
-#include "host/gtk/mirror/mirrored_content.h"
 #include "platform/ui/text_field.h"
 
 namespace vaelo {
 
 /// One line of text that the user edits: what is typed is told to the model, which may refuse it.
-class MirroredField : public MirroredContent {
+class MirroredField {
  public:
   explicit MirroredField(TextField& field);
-  ~MirroredField() override;
-  GtkWidget* widget() override { return entry_; }
-  void update() override;
+  ~MirroredField();
+  GtkWidget* widget() { return entry_; }
+  /// Takes over what changed in the model.
+  void update();
 
  private:
   void typed();
