@@ -104,12 +104,9 @@ void MirroredField::selectionMoved() {
 void MirroredField::typed() {
   if (taking_) return;
   const std::shared_ptr<TextField> kept = field_;
-  if (!kept->isEditing() && !kept->becomeFirstResponder()) {
-    update();
-    return;
-  }
-  taking_ = true;  // the widget has its own caret behind what was typed
-  kept->userSetText(gtk_editable_get_text(GTK_EDITABLE(entry_)));
+  // Meanwhile the widget keeps what was typed, and its own caret behind it.
+  taking_ = true;
+  if (kept->isEditing() || kept->becomeFirstResponder()) kept->userSetText(gtk_editable_get_text(GTK_EDITABLE(entry_)));
   known_ = kept->selectedRange();
   taking_ = false;
   update();

@@ -18,9 +18,10 @@ constexpr std::string_view Replacement = "\xef\xbf\xbd";
 constexpr gunichar NulPicture = 0x2400;  // a NUL would end the text
 
 // What Windows put where Latin-1 has control characters: 0x80 to 0x9f.
-constexpr std::array<std::uint16_t, 32> WindowsCharacters = {
-    0x20ac, 0xfffd, 0x201a, 0x0192, 0x201e, 0x2026, 0x2020, 0x2021, 0x02c6, 0x2030, 0x0160, 0x2039, 0x0152, 0xfffd, 0x017d, 0xfffd,
-    0xfffd, 0x2018, 0x2019, 0x201c, 0x201d, 0x2022, 0x2013, 0x2014, 0x02dc, 0x2122, 0x0161, 0x203a, 0x0153, 0xfffd, 0x017e, 0x0178};
+constexpr std::array<std::uint16_t, 32> WindowsCharacters = {0x20ac, 0xfffd, 0x201a, 0x0192, 0x201e, 0x2026, 0x2020, 0x2021,
+                                                             0x02c6, 0x2030, 0x0160, 0x2039, 0x0152, 0xfffd, 0x017d, 0xfffd,
+                                                             0xfffd, 0x2018, 0x2019, 0x201c, 0x201d, 0x2022, 0x2013, 0x2014,
+                                                             0x02dc, 0x2122, 0x0161, 0x203a, 0x0153, 0xfffd, 0x017e, 0x0178};
 
 void append(std::string& text, gunichar character) {
   char bytes[6];
@@ -45,7 +46,8 @@ bool TextDecoding::isBinary(std::string_view beginning) {
   const char* end = nullptr;
   g_utf8_validate_len(beginning.data(), beginning.size(), &end);
   const std::string_view rest = beginning.substr(static_cast<std::size_t>(end - beginning.data()));
-  const bool valid = rest.empty() || g_utf8_get_char_validated(rest.data(), static_cast<gssize>(rest.size())) == gunichar(-2);
+  const bool valid =
+      rest.empty() || g_utf8_get_char_validated(rest.data(), static_cast<gssize>(rest.size())) == gunichar(-2);
   const auto odd = std::count_if(beginning.begin(), beginning.end(), [valid](char byte) {
     const auto code = static_cast<unsigned char>(byte);
     return isOddControl(code) || (!valid && code >= 0x80 && code < 0xa0);
@@ -141,8 +143,10 @@ void TextDecoding::decodeUtf16(std::string_view bytes, bool last, std::string& t
     unit >= 0xd800 && unit < 0xe000 ? void(text += Replacement) : append(text, unit);
     at += 2;
   }
-  if (!last) pending_ = bytes.substr(at);
-  else if (at < bytes.size()) text += Replacement;
+  if (!last)
+    pending_ = bytes.substr(at);
+  else if (at < bytes.size())
+    text += Replacement;
 }
 
 }  // namespace vaelo

@@ -6,9 +6,9 @@
 
 namespace vaelo {
 
-/// Turns the bytes of a text document, piece by piece, into UTF-8 that a text view takes: valid, and without NUL. The encoding is
-/// told by a byte order mark; else it is UTF-8, unless the first bytes that are not ASCII are no UTF-8, which makes it Latin-1 in
-/// the form that Windows wrote. What can't be read becomes a replacement character.
+/// Turns the bytes of a text document, piece by piece, into UTF-8 that a text view takes: valid, and without NUL. The
+/// encoding is told by a byte order mark; else it is UTF-8, unless the first bytes that are not ASCII are no UTF-8, which
+/// makes it Latin-1 in the form that Windows wrote. What can't be read becomes a replacement character.
 class TextDecoding {
  public:
   /// What an incomplete character at the end stands for is known with the next call; `last` says that there is none.

@@ -50,13 +50,14 @@ TextFindBar::TextFindBar(GtkTextView* view)
                            this);
   GtkEventController* keys = gtk_event_controller_key_new();
   gtk_event_controller_set_propagation_phase(keys, GTK_PHASE_CAPTURE);
-  g_signal_connect(keys, "key-pressed",
-                   G_CALLBACK(+[](GtkEventControllerKey*, guint key, guint, GdkModifierType state, TextFindBar* self) -> gboolean {
-                     if (!(state & GDK_SHIFT_MASK) || (key != GDK_KEY_Return && key != GDK_KEY_KP_Enter)) return FALSE;
-                     self->step(false);
-                     return TRUE;
-                   }),
-                   this);
+  g_signal_connect(
+      keys, "key-pressed",
+      G_CALLBACK(+[](GtkEventControllerKey*, guint key, guint, GdkModifierType state, TextFindBar* self) -> gboolean {
+        if (!(state & GDK_SHIFT_MASK) || (key != GDK_KEY_Return && key != GDK_KEY_KP_Enter)) return FALSE;
+        self->step(false);
+        return TRUE;
+      }),
+      this);
   gtk_widget_add_controller(entry_, keys);
 }
 
@@ -75,8 +76,8 @@ void TextFindBar::setBuffer(GtkSourceBuffer* buffer) {
   context_.reset();
   if (!buffer) return;
   context_.reset(gtk_source_search_context_new(buffer, settings_.get()));
-  g_signal_connect_swapped(context_.get(), "notify::occurrences-count", G_CALLBACK(+[](TextFindBar* self) { self->showCount(); }),
-                           this);
+  g_signal_connect_swapped(context_.get(), "notify::occurrences-count",
+                           G_CALLBACK(+[](TextFindBar* self) { self->showCount(); }), this);
 }
 
 void TextFindBar::toggle() {
@@ -121,8 +122,8 @@ void TextFindBar::step(bool forward) {
           GtkTextIter from;
           GtkTextIter to;
           GError* error = nullptr;
-          const bool found =
-              gtk_source_search_context_forward_finish(GTK_SOURCE_SEARCH_CONTEXT(source), result, &from, &to, nullptr, &error);
+          const bool found = gtk_source_search_context_forward_finish(GTK_SOURCE_SEARCH_CONTEXT(source), result, &from, &to,
+                                                                      nullptr, &error);
           const GErrorPtr owned(error);
           if (found) static_cast<TextFindBar*>(self)->found(from, to);
         },
@@ -135,8 +136,8 @@ void TextFindBar::step(bool forward) {
         GtkTextIter from;
         GtkTextIter to;
         GError* error = nullptr;
-        const bool found =
-            gtk_source_search_context_backward_finish(GTK_SOURCE_SEARCH_CONTEXT(source), result, &from, &to, nullptr, &error);
+        const bool found = gtk_source_search_context_backward_finish(GTK_SOURCE_SEARCH_CONTEXT(source), result, &from, &to,
+                                                                     nullptr, &error);
         const GErrorPtr owned(error);
         if (found) static_cast<TextFindBar*>(self)->found(from, to);
       },

@@ -8,8 +8,8 @@
 
 namespace vaelo {
 
-/// A search bar that finds text in a text view on a source buffer: as one types, onwards with Enter and Ctrl+G, and back with
-/// Shift. Main thread; large texts are searched in slices.
+/// A search bar that finds text in a text view on a source buffer: as one types, onwards with Enter and Ctrl+G, and back
+/// with Shift. Main thread; large texts are searched in slices.
 class TextFindBar {
  public:
   /// `view` outlives the bar.

@@ -7,8 +7,8 @@
 
 namespace vaelo {
 
-/// Prepares lines for a text view, which lays out a line as a whole and keeps a record for each: every end of a line becomes a
-/// newline, a line that is too long goes on in the next, and there is a most of lines.
+/// Prepares lines for a text view, which lays out a line as a whole and keeps a record for each: every end of a line becomes
+/// a newline, a line that is too long goes on in the next, and there is a most of lines.
 class TextLines {
  public:
   TextLines(std::size_t mostCharacters, std::size_t mostLines) : mostCharacters_(mostCharacters), mostLines_(mostLines) {}

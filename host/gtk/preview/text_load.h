@@ -11,13 +11,13 @@
 
 namespace vaelo {
 
-/// Fills a text buffer with a document: the first screen at once, the rest in slices of some milliseconds whenever the main loop
-/// has nothing better to do. Main thread.
+/// Fills a text buffer with a document: the first screen at once, the rest in slices of some milliseconds whenever the main
+/// loop has nothing better to do. Main thread.
 class TextLoad {
  public:
   /// Called on the main thread, not by the constructor, and no more after the object is gone; each may end the object.
   struct Events {
-    std::function<void()> advanced;                      ///< there is more in the buffer: at least a first screen
+    std::function<void()> advanced;                        ///< there is more in the buffer: at least a first screen
     std::function<void(const std::string& error)> failed;  ///< nothing was read; a word of DecoderError
   };
 

@@ -88,7 +88,8 @@ struct TextReader::Reading {
   std::uint64_t documentBytes = 0;
 };
 
-TextReader::TextReader(const std::string& path, const TextLimits& limits) : reading_(std::make_shared<Reading>(path, limits)) {}
+TextReader::TextReader(const std::string& path, const TextLimits& limits)
+    : reading_(std::make_shared<Reading>(path, limits)) {}
 
 void TextReader::next(std::function<void(TextPiece)> received) {
   worker_.run([reading = reading_, received = std::move(received)]() -> std::function<void()> {

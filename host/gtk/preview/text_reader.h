@@ -20,12 +20,12 @@ struct TextLimits {
 
 /// The next piece of a text document.
 struct TextPiece {
-  std::string text;               ///< for a text view; may be empty
-  const char* error = nullptr;    ///< a word of DecoderError; then there is nothing else
+  std::string text;             ///< for a text view; may be empty
+  const char* error = nullptr;  ///< a word of DecoderError; then there is nothing else
   bool last = false;
-  bool shortened = false;         ///< with the last piece: the document goes on, but not for us
-  bool brokeLines = false;        ///< lines were too long, and go on in the next
-  std::uint64_t bytesRead = 0;    ///< of the document, up to here
+  bool shortened = false;       ///< with the last piece: the document goes on, but not for us
+  bool brokeLines = false;      ///< lines were too long, and go on in the next
+  std::uint64_t bytesRead = 0;  ///< of the document, up to here
   std::uint64_t documentBytes = 0;
 };
 
@@ -35,7 +35,8 @@ class TextReader {
  public:
   explicit TextReader(const std::string& path, const TextLimits& limits = {});
 
-  /// To be asked when the piece before was received, and not after the last one. `received` is not called after the object is gone.
+  /// To be asked when the piece before was received, and not after the last one. `received` is not called after the object
+  /// is gone.
   void next(std::function<void(TextPiece)> received);
 
  private:

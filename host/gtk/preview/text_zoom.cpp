@@ -16,8 +16,8 @@ constexpr double Largest = 4;
 TextZoom::TextZoom(GtkWidget* view)
     : view_(GTK_WIDGET(g_object_ref(view))),
       provider_(gtk_css_provider_new()),
-      controllers_{GTK_EVENT_CONTROLLER(gtk_gesture_zoom_new()), gtk_event_controller_scroll_new(GTK_EVENT_CONTROLLER_SCROLL_VERTICAL),
-                   gtk_event_controller_key_new()} {
+      controllers_{GTK_EVENT_CONTROLLER(gtk_gesture_zoom_new()),
+                   gtk_event_controller_scroll_new(GTK_EVENT_CONTROLLER_SCROLL_VERTICAL), gtk_event_controller_key_new()} {
   gtk_style_context_add_provider(gtk_widget_get_style_context(view), GTK_STYLE_PROVIDER(provider_.get()),
                                  GTK_STYLE_PROVIDER_PRIORITY_APPLICATION);
   for (GtkEventController* controller : controllers_) {
@@ -25,7 +25,8 @@ TextZoom::TextZoom(GtkWidget* view)
     gtk_widget_add_controller(view, controller);
   }
   g_signal_connect(controllers_[0], "begin",
-                   G_CALLBACK(+[](GtkGesture*, GdkEventSequence*, TextZoom* self) { self->pinchedFrom_ = self->scale_; }), this);
+                   G_CALLBACK(+[](GtkGesture*, GdkEventSequence*, TextZoom* self) { self->pinchedFrom_ = self->scale_; }),
+                   this);
   g_signal_connect(controllers_[0], "scale-changed", G_CALLBACK(+[](GtkGestureZoom*, double change, TextZoom* self) {
                      self->setScale(self->pinchedFrom_ * change);
                    }),
@@ -39,9 +40,8 @@ TextZoom::TextZoom(GtkWidget* view)
                    }),
                    this);
   g_signal_connect(controllers_[2], "key-pressed",
-                   G_CALLBACK(+[](GtkEventControllerKey*, guint key, guint, GdkModifierType state, TextZoom* self) -> gboolean {
-                     return (state & GDK_CONTROL_MASK) && self->key(key);
-                   }),
+                   G_CALLBACK(+[](GtkEventControllerKey*, guint key, guint, GdkModifierType state,
+                                  TextZoom* self) -> gboolean { return (state & GDK_CONTROL_MASK) && self->key(key); }),
                    this);
 }
 
