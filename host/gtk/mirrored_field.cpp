@@ -74,6 +74,7 @@ void MirroredField::update() {
                                    field_->accessibilityLabel().c_str(), -1);
   }
   keepSelection();
+  beginWithCaret();
   GtkRoot* root = gtk_widget_get_root(entry_);
   GtkWidget* focus = root ? gtk_root_get_focus(root) : nullptr;
   const bool focused = focus && (focus == entry_ || gtk_widget_is_ancestor(focus, entry_));
@@ -87,8 +88,28 @@ void MirroredField::keepSelection() {
   const TextRange& range = field_->selectedRange();
   if (!field_->isEditing() || range == known_) return;
   known_ = range;
+  if (idle_ != 0) first_ = range;
   const int from = static_cast<int>(range.location);
   gtk_editable_select_region(GTK_EDITABLE(entry_), from, from + static_cast<int>(range.length));
+}
+
+// The toolkit selects all when the focus comes: what the model chose for the beginning is put back after that.
+void MirroredField::beginWithCaret() {
+  if (field_->isEditing() == edited_) return;
+  edited_ = field_->isEditing();
+  if (!edited_ || idle_ != 0) return;
+  first_ = field_->selectedRange();
+  idle_ = g_idle_add_full(
+      G_PRIORITY_DEFAULT_IDLE,
+      [](gpointer self) -> gboolean {
+        auto* mirror = static_cast<MirroredField*>(self);
+        mirror->idle_ = 0;
+        mirror->field_->setSelectedRange(mirror->first_);
+        mirror->known_ = {mirror->field_->text().size() + 1, 0};
+        mirror->keepSelection();
+        return G_SOURCE_REMOVE;
+      },
+      this, nullptr);
 }
 
 void MirroredField::selectionMoved() {
@@ -98,7 +119,10 @@ void MirroredField::selectionMoved() {
   gtk_editable_get_selection_bounds(GTK_EDITABLE(entry_), &start, &end);
   if (start == end) start = end = gtk_editable_get_position(GTK_EDITABLE(entry_));
   known_ = {static_cast<std::size_t>(start), static_cast<std::size_t>(end - start)};
+  // The caret moves before the text that it moves through: the model must not put the old text back.
+  taking_ = true;
   field_->setSelectedRange(known_);
+  taking_ = false;
 }
 
 void MirroredField::typed() {
@@ -115,22 +139,7 @@ void MirroredField::typed() {
 void MirroredField::focusCame() {
   if (taking_ || field_->isEditing()) return;
   const std::shared_ptr<TextField> kept = field_;
-  if (kept->becomeFirstResponder()) {
-    // The toolkit selects all once the focus has come.
-    if (idle_ == 0) {
-      idle_ = g_idle_add_full(
-          G_PRIORITY_HIGH_IDLE,
-          [](gpointer self) -> gboolean {
-            auto* mirror = static_cast<MirroredField*>(self);
-            mirror->idle_ = 0;
-            mirror->known_ = {mirror->field_->text().size() + 1, 0};
-            mirror->keepSelection();
-            return G_SOURCE_REMOVE;
-          },
-          this, nullptr);
-    }
-    return;
-  }
+  if (kept->becomeFirstResponder()) return;
   // What can't be changed doesn't take the keyboard either.
   if (GtkRoot* root = gtk_widget_get_root(entry_)) gtk_root_set_focus(root, nullptr);
 }

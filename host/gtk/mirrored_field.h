@@ -24,11 +24,14 @@ class MirroredField {
   void focusLeft();
   void selectionMoved();
   void keepSelection();
+  void beginWithCaret();
 
   std::shared_ptr<TextField> field_;
   GtkWidget* entry_;
   GtkEventController* focus_;
   guint idle_ = 0;
+  TextRange first_;      ///< the selection with which editing began
+  bool edited_ = false;  ///< it was being edited at the latest update
   TextRange known_;      ///< the selection that widget and model agreed on last
   bool taking_ = false;  ///< one of the two is being made to say what the other says
 };
