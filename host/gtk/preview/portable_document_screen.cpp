@@ -55,8 +55,12 @@ void PortableDocumentScreen::opened(const PortableDocumentSource::Opened& opened
   pictures_ = std::make_unique<PagesPictures>(*source_, [this] { pictureArrived(); });
   GtkWidget* page = gtk_widget_get_parent(stack_);
   if (page && gtk_widget_get_width(page) > 0) canvas_.expectWidth(gtk_widget_get_width(page));
+  // A document that is read anew is shown where it was.
+  const PagePlace top = canvas_.placeAt(0, 0);
+  const bool isAnew = canvas_.layout().count() > 0;
   if (canvas_.layout().count() != opened.pages) canvas_.setCount(opened.pages);
   canvas_.setSizes(0, opened.sizes);
+  if (isAnew) canvas_.showPage(top.page, top.y);
   gtk_stack_set_visible_child(GTK_STACK(stack_), gtk_widget_get_ancestor(scrolled_, GTK_TYPE_OVERLAY));
   askForSizes(opened.sizes.size());
 }
