@@ -46,7 +46,7 @@ constexpr KnownType Known[] = {
     {"public.movie", "public.audiovisual-content", nullptr, ""},
     {"public.mpeg-4", "public.movie", "video/mp4", "mp4 m4v"},
     {"public.mpeg", "public.movie", "video/mpeg", "mpg mpeg"},
-    {"org.quicktime.movie", "public.movie", "video/quicktime", "mov qt"},
+    {"public.mov-movie", "public.movie", "video/quicktime", "mov qt"},
     {"public.avi", "public.movie", "video/x-msvideo", "avi"},
     {"org.webmproject.webm", "public.movie", "video/webm", "webm"},
     {"org.matroska.mkv", "public.movie", "video/x-matroska", "mkv"},

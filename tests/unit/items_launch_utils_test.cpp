@@ -117,7 +117,7 @@ TEST_F(LaunchUtilsTest, theBrowserNeverOpensInItself) {
 }
 
 TEST_F(LaunchUtilsTest, inALibraryItsOwnerOpensWhatItOwns) {
-  world.library->owners = {"main"};
+  world.appLibrary->owners = {"main"};
   install(app("main"));
   own({app("other"), app("main")});
   EXPECT_EQ(chosen(InLibrary), "main");
@@ -127,14 +127,14 @@ TEST_F(LaunchUtilsTest, inALibraryItsOwnerOpensWhatItOwns) {
 TEST_F(LaunchUtilsTest, inALibraryPicturesOpenInTheOwnerToo) {
   const URL picture = LibraryDocuments.appendingPathComponent("a.png");
   world.addFile(picture);
-  world.library->owners = {"main"};
+  world.appLibrary->owners = {"main"};
   install(app("main"));
   own({app("main")});
   EXPECT_EQ(chosen(picture), "main");
 }
 
 TEST_F(LaunchUtilsTest, anOwnerThatDoesNotOwnTheTypeGivesWayToTheFirstCandidate) {
-  world.library->owners = {"main"};
+  world.appLibrary->owners = {"main"};
   install(app("main"));
   own({app("other"), app("third")});
   EXPECT_EQ(chosen(InLibrary), "other");
@@ -144,7 +144,7 @@ TEST_F(LaunchUtilsTest, anOwnerThatDoesNotOwnTheTypeGivesWayToTheFirstCandidate)
 }
 
 TEST_F(LaunchUtilsTest, withoutCandidatesTheNextOwnerIsTried) {
-  world.library->owners = {"main", "second"};
+  world.appLibrary->owners = {"main", "second"};
   install(app("main"));
   install(app("second"));
   EXPECT_FALSE(chosen(InLibrary));
@@ -153,7 +153,7 @@ TEST_F(LaunchUtilsTest, withoutCandidatesTheNextOwnerIsTried) {
 }
 
 TEST_F(LaunchUtilsTest, anOwnerThatIsNotInstalledOrCopiesGivesWayToTheNext) {
-  world.library->owners = {"gone", "removed", "copier", "second"};
+  world.appLibrary->owners = {"gone", "removed", "copier", "second"};
   ApplicationRecord removed = app("removed", false);
   removed.isInstalled = false;
   install(removed);
@@ -170,7 +170,7 @@ TEST_F(LaunchUtilsTest, aLibraryWithoutOwnersOrOutsideTheTableHasNoDefault) {
   own({app("other")});
   EXPECT_FALSE(chosen(InLibrary));
   EXPECT_FALSE(chosen(URL("/outside/a.txt")));
-  world.library->owners = {"other"};
+  world.appLibrary->owners = {"other"};
   install(app("other"));
   world.containers = {world.drive};
   EXPECT_FALSE(chosen(InLibrary));

@@ -33,7 +33,7 @@ TEST_F(LocationsTest, separators) {
 
 TEST_F(LocationsTest, namesRunFromTheFirstFolderToTheItem) {
   EXPECT_FALSE(split(Deep));
-  EXPECT_EQ(container, world.library);
+  EXPECT_EQ(container, world.appLibrary);
   EXPECT_EQ(names, (Names{"<one>", "<two>", "<deep.png>"}));
 }
 
@@ -41,12 +41,12 @@ TEST_F(LocationsTest, slotsAreOptional) {
   EXPECT_FALSE(FileUtils::containerAndRelativePathforURLContainerRelativePathComponents(Deep, nullptr, &names));
   EXPECT_EQ(names.size(), 3u);
   EXPECT_FALSE(FileUtils::containerAndRelativePathforURLContainerRelativePathComponents(Deep, &container, nullptr));
-  EXPECT_EQ(container, world.library);
+  EXPECT_EQ(container, world.appLibrary);
 }
 
 TEST_F(LocationsTest, theDocumentsFolderItselfWritesNoNames) {
   EXPECT_FALSE(split(LibraryDocuments));
-  EXPECT_EQ(container, world.library);
+  EXPECT_EQ(container, world.appLibrary);
   EXPECT_EQ(names, Names{"untouched"});
 }
 
@@ -68,7 +68,7 @@ TEST_F(LocationsTest, aFailedLookupIsTriedByIdentifierAndStillReported) {
     const auto error = split(Deep);
     ASSERT_TRUE(error);
     EXPECT_EQ(error->code, FileErrorCode::ReadUnknown);
-    EXPECT_EQ(container, world.library);
+    EXPECT_EQ(container, world.appLibrary);
     EXPECT_EQ(names.size(), 3u);
     EXPECT_EQ(split(LibraryDocuments)->code, FileErrorCode::ReadUnknown);
   }
@@ -87,13 +87,13 @@ TEST_F(LocationsTest, outsideAllContainersNothingIsWritten) {
 TEST_F(LocationsTest, pathsThatCannotBeSplitAreAFormattingError) {
   for (const std::optional<URL>& folder :
        {std::optional<URL>(), std::optional(URL("/outside")), std::optional(Deep.appendingPathComponent("below"))}) {
-    world.library->folder = folder;
+    world.appLibrary->folder = folder;
     if (folder) world.addFolder(*folder);
     const auto error = split(Deep);
     ASSERT_TRUE(error);
     EXPECT_EQ(error->domain, FileErrorDomain);
     EXPECT_EQ(error->code, 2048);
-    EXPECT_EQ(container, world.library);
+    EXPECT_EQ(container, world.appLibrary);
     EXPECT_EQ(names, Names{"untouched"});
   }
 }

@@ -16,8 +16,8 @@ class NamesTest : public ItemsTest {
     return FileUtils::isValidExtensionForContainer(LibraryDocuments.appendingPathComponent(name));
   }
   void declare(std::vector<Value> contentTypes) {
-    world.library->types.emplace();
-    for (Value& value : contentTypes) world.library->types->push_back({std::move(value)});
+    world.appLibrary->types.emplace();
+    for (Value& value : contentTypes) world.appLibrary->types->push_back({std::move(value)});
   }
 };
 
@@ -83,7 +83,7 @@ TEST_F(NamesTest, theDriveAndALibraryThatDeclaresNothingTakeEverything) {
 
 TEST_F(NamesTest, noContainerOrNoDocumentsFolderTakesNothing) {
   EXPECT_FALSE(FileUtils::isValidExtensionForContainer(URL("/outside/a.txt")));
-  world.library->folder = std::nullopt;
+  world.appLibrary->folder = std::nullopt;
   EXPECT_FALSE(isValidInLibrary("a.txt"));
   EXPECT_TRUE(messages().empty());
 }

@@ -143,19 +143,19 @@ TEST_F(ItemsReviewFilesTest, mediaTypesAreTriedInTheirOrder) {
 
 TEST_F(ItemsReviewFilesTest, aDeclaredTypeIsWelcomeWhereAnotherEntryIsBroken) {
   world.typeOfExtension["png"] = "public.png";
-  world.library->types.emplace({DeclaredDocumentType{Array{std::int64_t{3}, "public.png"}}});
+  world.appLibrary->types.emplace({DeclaredDocumentType{Array{std::int64_t{3}, "public.png"}}});
   EXPECT_TRUE(isValidInLibrary("a.png"));
   EXPECT_EQ(messages(), (Lines{"ERROR Expected array of strings", "INFO Extension png conforms to UTI public.png"}));
   world.recordedLog.clear();
-  world.library->types.emplace({DeclaredDocumentType{Array{std::int64_t{3}, "public.data"}}});
+  world.appLibrary->types.emplace({DeclaredDocumentType{Array{std::int64_t{3}, "public.data"}}});
   EXPECT_TRUE(isValidInLibrary("a.png"));
   EXPECT_EQ(messages(), (Lines{"ERROR Expected array of strings", "INFO Container supports all UTIs"}));
 }
 
 TEST_F(ItemsReviewFilesTest, aTypeIsLookedAtOnceHoweverManyStandBetween) {
   world.typeOfExtension["png"] = "public.png";
-  world.library->types.emplace({DeclaredDocumentType{Array{std::int64_t{3}, std::int64_t{4}}},
-                                DeclaredDocumentType{Array{std::int64_t{3}, "public.movie"}}});
+  world.appLibrary->types.emplace({DeclaredDocumentType{Array{std::int64_t{3}, std::int64_t{4}}},
+                                   DeclaredDocumentType{Array{std::int64_t{3}, "public.movie"}}});
   EXPECT_FALSE(isValidInLibrary("a.png"));
   EXPECT_EQ(messages(), (Lines{"ERROR Expected array of strings", "ERROR Expected array of strings"}));
 }
@@ -167,7 +167,7 @@ TEST_F(ItemsReviewFilesTest, aLineThatBreaksWithoutAControlCharacterIsNoName) {
 
 TEST_F(ItemsReviewFilesTest, anEmptyTypeIsWelcomeEverywhere) {
   world.typeOfExtension["empty"] = "";
-  world.library->types.emplace({DeclaredDocumentType{Array{"public.png"}}});
+  world.appLibrary->types.emplace({DeclaredDocumentType{Array{"public.png"}}});
   EXPECT_TRUE(isValidInLibrary("a.empty"));
   EXPECT_TRUE(FileUtils::isValidExtensionForContainer(URL("/outside/a.empty")));
   EXPECT_TRUE(FileUtils::isValidExtensionForContainer(URL("/outside/plain")));
@@ -177,9 +177,9 @@ TEST_F(ItemsReviewFilesTest, anEmptyTypeIsWelcomeEverywhere) {
 
 TEST_F(ItemsReviewFilesTest, aPathThatCannotBeSplitWinsOverAFailedLookup) {
   world.containerError = fileError(FileErrorCode::ReadUnknown);
-  world.library->folder = std::nullopt;
+  world.appLibrary->folder = std::nullopt;
   EXPECT_EQ(split(LibraryDocuments.appendingPathComponent("a"))->code, FileErrorCode::Formatting);
-  EXPECT_EQ(container, world.library);
+  EXPECT_EQ(container, world.appLibrary);
 }
 
 TEST_F(ItemsReviewFilesTest, aFailedLookupIsReportedWithoutComponentsToo) {
@@ -187,7 +187,7 @@ TEST_F(ItemsReviewFilesTest, aFailedLookupIsReportedWithoutComponentsToo) {
   const URL item = LibraryDocuments.appendingPathComponent("a");
   EXPECT_EQ(FileUtils::containerAndRelativePathforURLContainerRelativePathComponents(item, &container, nullptr)->code,
             FileErrorCode::ReadUnknown);
-  EXPECT_EQ(container, world.library);
+  EXPECT_EQ(container, world.appLibrary);
 }
 
 TEST_F(ItemsReviewFilesTest, aLookupThatGivesAContainerAndAnErrorNeedsTheTableOfContainers) {
@@ -199,7 +199,7 @@ TEST_F(ItemsReviewFilesTest, aLookupThatGivesAContainerAndAnErrorNeedsTheTableOf
 }
 
 TEST_F(ItemsReviewFilesTest, aContainerBesideAnErrorDoesNotServeByItself) {
-  world.containerOfEverything = world.library;
+  world.containerOfEverything = world.appLibrary;
   world.containers.clear();
   world.containerError = fileError(FileErrorCode::ReadUnknown);
   world.containerErrorComesWithValue = true;
@@ -213,7 +213,7 @@ TEST_F(ItemsReviewFilesTest, aLookupThatTellsNothingIsTriedByIdentifierAndIsNoEr
   const URL item = LibraryDocuments.appendingPathComponent("a.txt");
   world.addFile(item, {{K::LocalizedName, "a"}});
   EXPECT_FALSE(split(item));
-  EXPECT_EQ(container, world.library);
+  EXPECT_EQ(container, world.appLibrary);
   EXPECT_EQ(names, Lines{"a"});
   world.containers.clear();
   container = nullptr;
@@ -226,9 +226,9 @@ TEST_F(ItemsReviewFilesTest, aLookupThatTellsNothingIsTriedByIdentifierAndIsNoEr
 }
 
 TEST_F(ItemsReviewFilesTest, anItemOutsideTheMirrorCannotBeSplitWhateverItsContainer) {
-  world.containerOfEverything = world.library;
+  world.containerOfEverything = world.appLibrary;
   EXPECT_EQ(split(URL("/outside/a"))->code, FileErrorCode::Formatting);
-  EXPECT_EQ(container, world.library);
+  EXPECT_EQ(container, world.appLibrary);
   EXPECT_EQ(names, Lines{"untouched"});
 }
 

@@ -44,7 +44,7 @@ TEST_F(ItemsReviewReferencesTest, theFirstContainerThatTakesItemsAnswersForAll) 
       std::make_shared<TestContainer>("org~example~First", "First", URL("/drive/mirror/org~example~First/Documents", true));
   const auto last =
       std::make_shared<TestContainer>("org~example~Last", "The last", URL("/drive/mirror/org~example~Last/Documents", true));
-  world.containers = {first, world.drive, world.library, last};
+  world.containers = {first, world.drive, world.appLibrary, last};
   world.movableTo = {LibraryIdentifier, "org~example~Last"};
   EXPECT_TRUE(vlo_canCrossZoneMoveURLs({Document}));
   EXPECT_EQ(world.calls, (Lines{std::string("canMove ") + DriveIdentifier + " org~example~First",
@@ -65,7 +65,7 @@ TEST_F(ItemsReviewReferencesTest, theFolderTestAsksForTheContainerFirst) {
 }
 
 TEST_F(ItemsReviewReferencesTest, aFolderOfAnotherContainerIsNeitherDesktopNorDocuments) {
-  world.containerOfEverything = world.library;
+  world.containerOfEverything = world.appLibrary;
   EXPECT_FALSE(vlo_isDesktopOrDocumentsFolder(Drive.appendingPathComponent("Documents")));
 }
 
@@ -134,7 +134,7 @@ TEST_F(ItemsReviewReferencesTest, aDocumentCountsAsOpenedOnceItWasHandedOver) {
 TEST_F(ItemsReviewReferencesTest, inALibraryTheBrowserMayBeAnOwner) {
   own({app("com.marrow.VaeloDrive")});
   world.applications.insert_or_assign("com.marrow.VaeloDrive", app("com.marrow.VaeloDrive"));
-  world.library->owners = {"com.marrow.VaeloDrive"};
+  world.appLibrary->owners = {"com.marrow.VaeloDrive"};
   EXPECT_TRUE(open(InLibrary));
   EXPECT_FALSE(open(Document));
 }
@@ -144,7 +144,7 @@ TEST_F(ItemsReviewReferencesTest, inALibraryTheDocumentOfABookmarkIsJudged) {
   world.bookmarks.insert_or_assign(InLibrary.path(), letter);
   own({app("main")});
   world.applications.insert_or_assign("main", app("main"));
-  world.library->owners = {"main"};
+  world.appLibrary->owners = {"main"};
   EXPECT_TRUE(open(InLibrary));
   EXPECT_TRUE(world.called("record " + letter.path()) && world.called("open " + letter.path() + " with main"));
   EXPECT_EQ(LaunchUtils::defaultAppForDocumentRequireOpenIn(InLibrary, false)->bundleIdentifier, "main");
@@ -159,7 +159,7 @@ TEST_F(ItemsReviewReferencesTest, withoutItsContainerNobodyIsAskedForADocument) 
 
 TEST_F(ItemsReviewReferencesTest, anOwnerThatIsUnknownIsNotInstalledEvenWhereOthersOwnTheType) {
   own({app("other")});
-  world.library->owners = {"gone"};
+  world.appLibrary->owners = {"gone"};
   EXPECT_FALSE(open(InLibrary)) << "the first candidate stands in for an installed owner only";
   EXPECT_EQ(messages().back(), "DEBUG Container Sketchbook: Default app (gone) not installed");
 }
@@ -167,7 +167,7 @@ TEST_F(ItemsReviewReferencesTest, anOwnerThatIsUnknownIsNotInstalledEvenWhereOth
 TEST_F(ItemsReviewReferencesTest, theFirstOwnerThatAnswersEndsTheSearch) {
   own({app("second"), app("first")});
   for (const char* owner : {"first", "second"}) world.applications.insert_or_assign(owner, app(owner));
-  world.library->owners = {"first", "second"};
+  world.appLibrary->owners = {"first", "second"};
   EXPECT_EQ(LaunchUtils::defaultAppForDocumentRequireOpenIn(InLibrary, true)->bundleIdentifier, "first");
   EXPECT_FALSE(logged("DEBUG", "Container Sketchbook: Default app (second) supports open in place"));
 }

@@ -63,7 +63,7 @@ class ItemsWorld : public MemoryPlatform {
 
   // The cloud.
   std::shared_ptr<MemoryContainer> drive = cloud.drive;
-  std::shared_ptr<MemoryContainer> library = cloud.addContainer(LibraryIdentifier, "Sketchbook");
+  std::shared_ptr<MemoryContainer> appLibrary = cloud.addContainer(LibraryIdentifier, "Sketchbook");
   std::vector<CloudContainerRef>& containers = cloud.containers;
   std::optional<Error>& containerError = cloud.containerError;
   bool& containerErrorComesWithValue = cloud.containerErrorComesWithValue;
