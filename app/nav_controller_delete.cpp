@@ -30,8 +30,11 @@ void NavController::showWarningAndDeleteURLsUsingViewWithDocumentListControllerF
     UIUtils::showUnsupportedError(visibleViewController());
     return;
   }
-  const auto answered = [self = sharedSelf(this), urls, list, finished = std::move(finished)](const AlertActionRef&,
-                                                                                              bool cancelled) {
+  // The screens own the sheet that holds this.
+  const auto answered = [weak = weakSelf(this), urls, list, finished = std::move(finished)](const AlertActionRef&,
+                                                                                            bool cancelled) {
+    const auto self = weak.lock();
+    if (!self) return;
     Failures failures;
     if (cancelled) {
       VLO_USER_ACTION("Delete was Cancelled (nav)");
