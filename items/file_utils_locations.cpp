@@ -41,7 +41,8 @@ std::optional<Error> FileUtils::containerAndRelativePathforURLContainerRelativeP
   if (!components) return lookup.error;
 
   const std::optional<URL> documents = found->documentsFolderURL();
-  const auto top = documents ? depthInMirror(*documents) : std::nullopt;
+  if (!documents) return formattingError();
+  const auto top = depthInMirror(*documents);
   const auto own = depthInMirror(url);
   if (!top || !own || *own < *top) return formattingError();
   if (*own == *top) return lookup.error;
