@@ -6,6 +6,7 @@
 #include <sys/stat.h>
 
 #include <algorithm>
+#include <cstdio>
 
 #include "host/decoder/document_ink.h"
 #include "host/decoder/document_words.h"
@@ -130,9 +131,11 @@ UniqueFd DocumentMarks::apply(const UniqueFd& original, const std::string& passw
     poppler_page_add_annot(page.get(), annotation.get());
   }
   UniqueFd marked(::memfd_create("marked", MFD_CLOEXEC | MFD_ALLOW_SEALING));
-  // The library closes what it is given.
+  // The library keeps what it is given.
   const int given = marked ? ::fcntl(marked.get(), F_DUPFD_CLOEXEC, 3) : -1;
   if (given < 0 || !poppler_document_save_to_fd(document.get(), given, !marks_.empty(), nullptr)) return UniqueFd();
+  // It neither closes its stream nor writes out what is still in it; only all streams together can be reached from here.
+  if (std::fflush(nullptr) != 0) return UniqueFd();
   if (!writeInk(marked, status.st_size, marks_)) return UniqueFd();
   return marked;
 }

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 // vaelo-preview-decoder KIND: reads documents for the previews, apart from the application. On standard input is a
-// SOCK_SEQPACKET socket; the first message on it is the document's path, each further one a request.
+// SOCK_SEQPACKET socket; the first message on it is the document's path, and the open document when it may be another one by
+// now; each further one is a request.
 #include <fcntl.h>
 #include <sys/stat.h>
 
@@ -18,8 +19,9 @@ using vaelo::UniqueFd;
 DecoderMessage error(const char* reason) { return {std::string("error ") + reason, UniqueFd()}; }
 
 // A pipe or a device would be waited for without end, so the document is opened as if it could block.
-UniqueFd openDocument(const std::string& path, const char*& problem) {
-  UniqueFd file(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY));
+UniqueFd openDocument(DecoderMessage named, const char*& problem) {
+  UniqueFd file = std::move(named.file);
+  if (!file) file = UniqueFd(::open(named.text.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY));
   struct stat status = {};
   if (!file) {
     problem = errno == ENOENT ? vaelo::DecoderError::Gone : vaelo::DecoderError::Unreadable;
@@ -35,10 +37,10 @@ int main(int argc, char** argv) {
   if (argc != 2) return 2;
   constexpr int socket = 0;
   vaelo::enterSandbox();
-  const std::optional<DecoderMessage> path = vaelo::receiveDecoderMessage(socket);
-  if (!path) return 0;
+  std::optional<DecoderMessage> named = vaelo::receiveDecoderMessage(socket);
+  if (!named) return 0;
   const char* problem = nullptr;
-  UniqueFd document = openDocument(path->text, problem);
+  UniqueFd document = openDocument(std::move(*named), problem);
   std::unique_ptr<vaelo::Decoder> decoder = problem ? nullptr : vaelo::makeDecoder(argv[1], std::move(document));
   if (!problem && !decoder) problem = vaelo::DecoderError::Unsupported;
   while (const std::optional<DecoderMessage> request = vaelo::receiveDecoderMessage(socket)) {

@@ -10,6 +10,7 @@
 #include "host/gtk/drive_application.h"
 #include "host/gtk/gtk_screens.h"
 #include "host/gtk/gtk_window.h"
+#include "host/gtk/preview/portable_document_marks.h"
 #include "host/support/glib_ptr.h"
 #include "items/url_additions.h"
 #include "platform/archive.h"
@@ -119,6 +120,7 @@ int GtkApplicationLoop::run(int argc, char** argv, std::function<std::shared_ptr
   const char* quitKeys[] = {"<Control>q", nullptr};
   gtk_application_set_accels_for_action(GTK_APPLICATION(application_), "app.quit", quitKeys);
   const int status = g_application_run(G_APPLICATION(application_), argc, argv);
+  PortableDocumentMarks::finishAll();
   if (delegate_) {
     saveState();
     delegate_.reset();

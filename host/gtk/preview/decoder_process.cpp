@@ -40,14 +40,14 @@ struct DecoderProcess::State : std::enable_shared_from_this<DecoderProcess::Stat
   guint watch = 0;
   guint timer = 0;
 
-  void start(const std::string& kind, const std::string& path) {
+  void start(const std::string& kind, const std::string& path, UniqueFd document) {
     int ends[2];
     if (::socketpair(AF_UNIX, SOCK_SEQPACKET | SOCK_CLOEXEC, 0, ends) != 0) return end(DecoderError::Crashed);
     socket = UniqueFd(ends[0]);
     const GRef<GSubprocessLauncher> launcher(g_subprocess_launcher_new(G_SUBPROCESS_FLAGS_NONE));
     g_subprocess_launcher_take_stdin_fd(launcher.get(), ends[1]);
     process.reset(g_subprocess_launcher_spawn(launcher.get(), nullptr, decoderPath().c_str(), kind.c_str(), nullptr));
-    if (!process || !sendDecoderMessage(socket.get(), {path, UniqueFd()})) return end(DecoderError::Crashed);
+    if (!process || !sendDecoderMessage(socket.get(), {path, std::move(document)})) return end(DecoderError::Crashed);
     watch = g_unix_fd_add(
         socket.get(), static_cast<GIOCondition>(G_IO_IN | G_IO_HUP),
         +[](int, GIOCondition, gpointer self) -> gboolean { return static_cast<State*>(self)->answered(); }, this);
@@ -117,8 +117,9 @@ struct DecoderProcess::State : std::enable_shared_from_this<DecoderProcess::Stat
   }
 };
 
-DecoderProcess::DecoderProcess(const std::string& kind, const std::string& path) : state_(std::make_shared<State>()) {
-  state_->start(kind, path);
+DecoderProcess::DecoderProcess(const std::string& kind, const std::string& path, UniqueFd document)
+    : state_(std::make_shared<State>()) {
+  state_->start(kind, path, std::move(document));
 }
 
 DecoderProcess::~DecoderProcess() {

@@ -23,8 +23,8 @@ class DecoderProcess {
   };
   using Done = std::function<void(Answer)>;
 
-  /// `kind` as makeDecoder() knows it; `path` absolute.
-  DecoderProcess(const std::string& kind, const std::string& path);
+  /// `kind` as makeDecoder() knows it; `path` absolute. `document` is read instead of what is at the path, when it is given.
+  DecoderProcess(const std::string& kind, const std::string& path, UniqueFd document = UniqueFd());
   ~DecoderProcess();
   DecoderProcess(const DecoderProcess&) = delete;
   DecoderProcess& operator=(const DecoderProcess&) = delete;

@@ -1,18 +1,53 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/preview/portable_document_screen.h"
 
+#include <fcntl.h>
+
 #include <algorithm>
+#include <utility>
 
 namespace vaelo {
 
-PortableDocumentScreen::PortableDocumentScreen(const PreviewedDocument& document, DocumentViewEvents events)
+namespace {
+
+constexpr GdkRGBA SelectionColour = {0.21F, 0.52F, 0.89F, 0.35F};
+constexpr GdkRGBA FoundColour = {1, 0.85F, 0, 0.45F};
+constexpr GdkRGBA CurrentColour = {1, 0.45F, 0, 0.6F};
+
+}  // namespace
+
+PortableDocumentScreen::PortableDocumentScreen(const PreviewedDocument& document, DocumentViewEvents events,
+                                               FileCoordination* coordination)
     : document_(document),
       events_(std::move(events)),
+      coordination_(coordination),
       canvas_({[this](GtkSnapshot* snapshot, int page, const PageArea& area) { draw(snapshot, page, area); },
                [this] { moved(); }}),
       stack_(GTK_WIDGET(g_object_ref_sink(gtk_stack_new()))),
+      pages_(gtk_box_new(GTK_ORIENTATION_VERTICAL, 0)),
       scrolled_(gtk_scrolled_window_new()),
+      notice_(stack_.get()),
       gestures_(canvas_, scrolled_),
+      findBar_(canvas_.widget(), {[this](const std::string& text) { find_.search(text, canvas_.currentPage()); },
+                                  [this](bool forward) { find_.step(forward); }}),
+      find_({[this] { showFound(); },
+             [this](int page, const PageRect& place) {
+               canvas_.reveal(page, place.left, place.top, place.right, place.bottom);
+             }}),
+      selecting_(canvas_, stack_.get(),
+                 {[this](int page) { return texts_ ? texts_->of(page) : nullptr; }, [this] { return markup_.mayMark(); },
+                  [this](int page, std::vector<PageRect> lines) { markup_.highlight(page, std::move(lines)); }}),
+      markup_(canvas_, stack_.get(),
+              {[this] { return events_.shouldSave(); }, notice_.teller(), [this] { toolChosen(); },
+               [this] {
+                 if (std::exchange(refreshWhenSaved_, false)) refresh();
+               }}),
+      pointer_(canvas_,
+               {[this](bool finger) { return source_ && (!finger || markup_.tool() != MarkTool::None); },
+                [this](double x, double y, int presses) { press(x, y, presses); },
+                [this](double x, double y) { drag(x, y); }, [this](bool cancelled) { release(cancelled); },
+                [this](double x, double y) { longPress(x, y); }, [this](double x, double y) { selecting_.showMenu(x, y); },
+                [this] { return markup_.tool() == MarkTool::None || markup_.tool() == MarkTool::Highlight; }}),
       indicator_([this](int page) {
         canvas_.showPage(page);
         gtk_widget_grab_focus(canvas_.widget());
@@ -25,18 +60,19 @@ PortableDocumentScreen::PortableDocumentScreen(const PreviewedDocument& document
   gtk_overlay_set_child(GTK_OVERLAY(overlay), scrolled_);
   gtk_overlay_add_overlay(GTK_OVERLAY(overlay), indicator_.widget());
   gtk_widget_set_vexpand(overlay, TRUE);
-  gtk_stack_add_child(GTK_STACK(stack_), overlay);
-  gtk_stack_add_child(GTK_STACK(stack_), password_.widget());
+  for (GtkWidget* child : {findBar_.widget(), markup_.bar().widget(), overlay}) gtk_box_append(GTK_BOX(pages_), child);
+  gtk_stack_add_child(GTK_STACK(stack_.get()), pages_);
+  gtk_stack_add_child(GTK_STACK(stack_.get()), password_.widget());
   GtkEventController* keys = gtk_event_controller_key_new();
   g_signal_connect(keys, "key-pressed",
                    G_CALLBACK(+[](GtkEventControllerKey*, guint key, guint, GdkModifierType state,
-                                  PortableDocumentScreen* self) -> gboolean { return self->gestures_.key(key, state); }),
+                                  PortableDocumentScreen* self) -> gboolean { return self->key(key, state); }),
                    this);
   gtk_widget_add_controller(canvas_.widget(), keys);
   load("");
 }
 
-PortableDocumentScreen::~PortableDocumentScreen() { g_object_unref(stack_); }
+PortableDocumentScreen::~PortableDocumentScreen() = default;
 
 void PortableDocumentScreen::load(const std::string& password) {
   if (!nextSource_) nextSource_ = std::make_unique<PortableDocumentSource>(document_.path);
@@ -45,15 +81,19 @@ void PortableDocumentScreen::load(const std::string& password) {
 
 void PortableDocumentScreen::opened(const PortableDocumentSource::Opened& opened, const std::string& password) {
   if (opened.error == DecoderError::Locked) {
-    gtk_stack_set_visible_child(GTK_STACK(stack_), password_.widget());
+    gtk_stack_set_visible_child(GTK_STACK(stack_.get()), password_.widget());
     if (!password.empty()) password_.refuse();
     return events_.shown();
   }
   if (!opened.error.empty()) return events_.failed(messageForDecoderError(opened.error));
   pictures_.reset();
+  texts_.reset();
+  find_.setSource(nullptr, 0);
+  selecting_.clear();
   source_ = std::move(nextSource_);
+  texts_ = std::make_unique<PagesTexts>(*source_, [this] { selecting_.textRead(); });
   pictures_ = std::make_unique<PagesPictures>(*source_, [this] { pictureArrived(); });
-  GtkWidget* page = gtk_widget_get_parent(stack_);
+  GtkWidget* page = gtk_widget_get_parent(stack_.get());
   if (page && gtk_widget_get_width(page) > 0) canvas_.expectWidth(gtk_widget_get_width(page));
   // A document that is read anew is shown where it was.
   const PagePlace top = canvas_.placeAt(0, 0);
@@ -61,7 +101,9 @@ void PortableDocumentScreen::opened(const PortableDocumentSource::Opened& opened
   if (canvas_.layout().count() != opened.pages) canvas_.setCount(opened.pages);
   canvas_.setSizes(0, opened.sizes);
   if (isAnew) canvas_.showPage(top.page, top.y);
-  gtk_stack_set_visible_child(GTK_STACK(stack_), gtk_widget_get_ancestor(scrolled_, GTK_TYPE_OVERLAY));
+  gtk_stack_set_visible_child(GTK_STACK(stack_.get()), pages_);
+  beginMarkup(opened.mayBeMarked);
+  find_.setSource(source_.get(), opened.pages);
   askForSizes(opened.sizes.size());
 }
 
@@ -99,7 +141,7 @@ void PortableDocumentScreen::moved() {
   for (const int page : {last + 1, first - 1}) {
     if (page >= 0 && page < layout.count()) wanted.push_back({page, layout.size(page), std::nullopt});
   }
-  pictures_->want(std::move(wanted), canvas_.zoom() * gtk_widget_get_scale_factor(stack_));
+  pictures_->want(std::move(wanted), canvas_.zoom() * gtk_widget_get_scale_factor(stack_.get()));
 }
 
 void PortableDocumentScreen::pictureArrived() {
@@ -113,6 +155,13 @@ void PortableDocumentScreen::draw(GtkSnapshot* snapshot, int page, const PageAre
   if (!pictures_) return;
   const std::string problem = pictures_->problemOf(page);
   if (!pictures_->draw(snapshot, page, area) && !problem.empty()) drawProblem(snapshot, problem, area);
+  const PageOverlay overlay(snapshot, area, canvas_.zoom());
+  markup_.draw(overlay, page);
+  overlay.fill(selecting_.selection().rectsOn(page), SelectionColour);
+  const std::vector<PageRect>& found = find_.placesOn(page);
+  for (std::size_t i = 0; i < found.size(); ++i) {
+    overlay.fill({found[i]}, find_.isCurrent(page, i) ? CurrentColour : FoundColour);
+  }
 }
 
 void PortableDocumentScreen::drawProblem(GtkSnapshot* snapshot, const std::string& problem, const PageArea& area) {
@@ -132,14 +181,106 @@ void PortableDocumentScreen::drawProblem(GtkSnapshot* snapshot, const std::strin
   gtk_snapshot_restore(snapshot);
 }
 
+// What was saved here is on the screen already. While it is being saved it can't be told from what others write.
 void PortableDocumentScreen::refresh() {
+  refreshWhenSaved_ = markup_.isSaving();
+  if (refreshWhenSaved_ || markup_.wrote(document_.path)) return;
   nextSource_.reset();
   load("");
 }
 
-std::vector<GtkWidget*> PortableDocumentScreen::headerWidgets() { return {}; }
+void PortableDocumentScreen::beginMarkup(bool mayBeMarked) {
+  UniqueFd file(source_->file() ? ::fcntl(source_->file().get(), F_DUPFD_CLOEXEC, 3) : -1);
+  if (!document_.mayBeEdited || !mayBeMarked || !file) return markup_.end();
+  markup_.begin({document_.path, document_.name, source_->password(), std::move(file), source_->version(), coordination_});
+}
 
-bool PortableDocumentScreen::toggleFind() { return false; }
-bool PortableDocumentScreen::closeFind() { return false; }
+std::vector<GtkWidget*> PortableDocumentScreen::headerWidgets() {
+  std::vector<GtkWidget*> widgets = {
+      makeFindButton(G_CALLBACK(+[](PortableDocumentScreen* self) { self->toggleFind(); }), this)};
+  if (document_.mayBeEdited) widgets.push_back(markup_.bar().makeToggle());
+  return widgets;
+}
+
+bool PortableDocumentScreen::toggleFind() {
+  if (!source_) return false;
+  findBar_.toggle();
+  return true;
+}
+
+bool PortableDocumentScreen::closeFind() {
+  if (findBar_.close()) return true;
+  if (markup_.tool() != MarkTool::None) {
+    markup_.bar().putToolAway();
+    return true;
+  }
+  if (markup_.bar().isOpen()) {
+    markup_.bar().open(false);
+    return true;
+  }
+  return selecting_.clear();
+}
+
+void PortableDocumentScreen::showFound() {
+  canvas_.redraw();
+  const int count = find_.count();
+  const bool nothing = count == 0 && !find_.isSearching() && !find_.text().empty();
+  std::string text = nothing ? "Not found" : "";
+  if (find_.isSearching() && count == 0) text = "Searching…";
+  if (count > 0) {
+    text = std::to_string(find_.position()) + " of " + std::to_string(count) + (find_.isSearching() ? "…" : "");
+  }
+  findBar_.showCount(text, nothing);
+}
+
+bool PortableDocumentScreen::key(guint key, GdkModifierType state) {
+  if (!source_) return false;
+  if ((state & GDK_CONTROL_MASK) && key == GDK_KEY_z && markup_.undo()) return true;
+  const bool isEnter = key == GDK_KEY_Return || key == GDK_KEY_KP_Enter || key == GDK_KEY_space;
+  if (isEnter && markup_.tool() == MarkTool::Note) {
+    markup_.askForNote(canvas_.width() / 2, canvas_.height() / 3);
+    return true;
+  }
+  return selecting_.key(key, state) || gestures_.key(key, state);
+}
+
+void PortableDocumentScreen::toolChosen() {
+  const MarkTool tool = markup_.tool();
+  // One finger draws then instead of scrolling; two fingers still zoom.
+  gtk_scrolled_window_set_kinetic_scrolling(GTK_SCROLLED_WINDOW(scrolled_), tool == MarkTool::None);
+  const char* cursor = tool == MarkTool::Ink ? "crosshair" : tool == MarkTool::Note ? "cell" : "text";
+  gtk_widget_set_cursor_from_name(canvas_.widget(), tool == MarkTool::None ? nullptr : cursor);
+  if (tool == MarkTool::Highlight) return selecting_.highlight();
+  if (tool != MarkTool::None) selecting_.clear();
+}
+
+void PortableDocumentScreen::press(double x, double y, int presses) {
+  longPressed_ = false;
+  if (markup_.tool() == MarkTool::Ink) return markup_.press(x, y);
+  if (markup_.tool() == MarkTool::Note) return markup_.askForNote(x, y);
+  selecting_.begin(x, y, presses);
+}
+
+void PortableDocumentScreen::drag(double x, double y) {
+  if (markup_.tool() == MarkTool::Ink) return markup_.drag(x, y);
+  if (markup_.tool() != MarkTool::Note) selecting_.extend(x, y);
+}
+
+void PortableDocumentScreen::release(bool cancelled) {
+  if (markup_.tool() == MarkTool::Ink) return markup_.release(cancelled);
+  if (markup_.tool() == MarkTool::Highlight && !cancelled) selecting_.highlight();
+  if (!longPressed_ || cancelled) return;
+  longPressed_ = false;
+  selecting_.showMenu(lastX_, lastY_);
+}
+
+// A finger has no other button: the menu comes when it is lifted.
+void PortableDocumentScreen::longPress(double x, double y) {
+  if (!source_) return;
+  selecting_.begin(x, y, 2);
+  longPressed_ = true;
+  lastX_ = x;
+  lastY_ = y;
+}
 
 }  // namespace vaelo

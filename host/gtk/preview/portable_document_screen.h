@@ -8,32 +8,55 @@
 #include <vector>
 
 #include "host/gtk/preview/document_view.h"
+#include "host/gtk/preview/find_bar.h"
 #include "host/gtk/preview/pages_canvas.h"
 #include "host/gtk/preview/pages_gestures.h"
 #include "host/gtk/preview/pages_indicator.h"
 #include "host/gtk/preview/pages_pictures.h"
+#include "host/gtk/preview/pages_pointer.h"
+#include "host/gtk/preview/pages_selecting.h"
+#include "host/gtk/preview/pages_texts.h"
+#include "host/gtk/preview/portable_document_find.h"
+#include "host/gtk/preview/portable_document_markup.h"
 #include "host/gtk/preview/portable_document_password.h"
 #include "host/gtk/preview/portable_document_source.h"
+#include "host/gtk/preview/window_notice.h"
 
 namespace vaelo {
 
 /// The widgets of one portable document and what joins them. Main thread.
 class PortableDocumentScreen {
  public:
-  PortableDocumentScreen(const PreviewedDocument& document, DocumentViewEvents events);
+  /// `coordination`, by which marks are saved, outlives all views; null does without.
+  PortableDocumentScreen(const PreviewedDocument& document, DocumentViewEvents events,
+                         FileCoordination* coordination = nullptr);
   ~PortableDocumentScreen();
   PortableDocumentScreen(const PortableDocumentScreen&) = delete;
   PortableDocumentScreen& operator=(const PortableDocumentScreen&) = delete;
-  GtkWidget* widget() const { return stack_; }
+  GtkWidget* widget() const { return stack_.get(); }
 
   void refresh();
   std::vector<GtkWidget*> headerWidgets();
   bool toggleFind();
   bool closeFind();
 
+  // For tests.
   PagesCanvas& canvas() { return canvas_; }
+  FindBar& findBar() { return findBar_; }
+  PortableDocumentFind& find() { return find_; }
+  PagesSelecting& selecting() { return selecting_; }
+  PortableDocumentMarkup& markup() { return markup_; }
+  /// As if a pointer did it.
+  void press(double x, double y, int presses);
+  void drag(double x, double y);
+  void release(bool cancelled);
 
  private:
+  bool key(guint key, GdkModifierType state);
+  void longPress(double x, double y);
+  void toolChosen();
+  void beginMarkup(bool mayBeMarked);
+  void showFound();
   void load(const std::string& password);
   void opened(const PortableDocumentSource::Opened& opened, const std::string& password);
   void askForSizes(std::size_t known);
@@ -44,16 +67,29 @@ class PortableDocumentScreen {
 
   PreviewedDocument document_;
   DocumentViewEvents events_;
+  FileCoordination* coordination_;
   PagesCanvas canvas_;
-  GtkWidget* stack_;
+  GRef<GtkWidget> stack_;  // of the pages with their bars, and what asks for a password
+  GtkWidget* pages_;
   GtkWidget* scrolled_;
+  WindowNotice notice_;
   PagesGestures gestures_;
+  FindBar findBar_;
+  PortableDocumentFind find_;
+  PagesSelecting selecting_;
+  PortableDocumentMarkup markup_;
+  PagesPointer pointer_;
   PagesIndicator indicator_;
   PortableDocumentPassword password_;
   std::unique_ptr<PortableDocumentSource> source_;
   std::unique_ptr<PagesPictures> pictures_;
+  std::unique_ptr<PagesTexts> texts_;
   std::unique_ptr<PortableDocumentSource> nextSource_;  // while the document is read anew
   bool shown_ = false;
+  bool refreshWhenSaved_ = false;
+  bool longPressed_ = false;  // by the finger that is still there
+  double lastX_ = 0;          // where it pressed
+  double lastY_ = 0;
 };
 
 }  // namespace vaelo

@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/preview/portable_document_source.h"
 
+#include <fcntl.h>
+
 #include <algorithm>
 #include <charconv>
 #include <cmath>
@@ -39,8 +41,18 @@ std::vector<double> numbersIn(const std::string& words) {
 
 std::vector<PageSize> pageSizesIn(const std::string& words) { return sizesFrom(numbersIn(words), 0); }
 
+PortableDocumentSource::PortableDocumentSource(const std::string& path)
+    : path_(path), file_(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY)) {
+  if (file_) version_ = versionOf(file_.get()).value_or(FileVersion());
+}
+
+void PortableDocumentSource::start() {
+  UniqueFd given(file_ ? ::fcntl(file_.get(), F_DUPFD_CLOEXEC, 3) : -1);
+  process_ = std::make_unique<DecoderProcess>("document", path_, std::move(given));
+}
+
 void PortableDocumentSource::open(const std::string& password, std::function<void(Opened)> done) {
-  if (!process_) process_ = std::make_unique<DecoderProcess>("document", path_);
+  if (!process_) start();
   password_ = password;
   ask(
       "open " + password,
@@ -86,12 +98,8 @@ void PortableDocumentSource::answered(DecoderProcess::Answer answer) {
 
 void PortableDocumentSource::restart() {
   ++restarts_;
-  process_ = std::make_unique<DecoderProcess>("document", path_);
-  jobs_.push_front({"open " + password_,
-                    [this](const DecoderProcess::Answer&) {
-                      if (restarted_) restarted_();
-                    },
-                    OpeningTakes});
+  start();
+  jobs_.push_front({"open " + password_, [](const DecoderProcess::Answer&) {}, OpeningTakes});
 }
 
 }  // namespace vaelo

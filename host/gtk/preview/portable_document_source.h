@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "host/gtk/preview/decoder_process.h"
+#include "host/gtk/preview/file_version.h"
 #include "host/gtk/preview/pages_layout.h"
 #include "host/support/glib_ptr.h"
 
@@ -25,7 +26,8 @@ struct PixelRect {
 };
 
 /// A portable document in the decoder's process. A page that crashes it or takes too long fails alone: the process is
-/// started anew for the others, a few times. Main thread; no callback comes after the object is gone.
+/// started anew for the others, a few times. What is read is the file that was there at first, whatever takes its place.
+/// Main thread; no callback comes after the object is gone.
 class PortableDocumentSource {
  public:
   struct Opened {
@@ -36,9 +38,13 @@ class PortableDocumentSource {
   };
   using Done = std::function<void(DecoderProcess::Answer)>;
 
-  explicit PortableDocumentSource(const std::string& path) : path_(path) {}
-  /// `restarted` is called when a new process has read the document, as it is now, anew.
-  void setRestarted(std::function<void()> restarted) { restarted_ = std::move(restarted); }
+  explicit PortableDocumentSource(const std::string& path);
+  /// The open document; none when it could not be opened.
+  const UniqueFd& file() const { return file_; }
+  /// As it was when it was opened.
+  const FileVersion& version() const { return version_; }
+  /// The last one that was tried.
+  const std::string& password() const { return password_; }
   /// Before all else; again with a password when the document is locked.
   void open(const std::string& password, std::function<void(Opened)> done);
   /// Requests of DocumentDecoder, answered in order.
@@ -52,15 +58,16 @@ class PortableDocumentSource {
   };
   void next();
   void answered(DecoderProcess::Answer answer);
+  void start();
   void restart();
 
   std::string path_;
+  UniqueFd file_;
+  FileVersion version_;
   std::string password_;
-  std::function<void()> restarted_;
   std::deque<Job> jobs_;
   bool asking_ = false;
   int restarts_ = 0;
-  std::string broken_;  // why there will be no process any more
   std::unique_ptr<DecoderProcess> process_;
 };
 

@@ -2,6 +2,7 @@
 #include "host/gtk/preview/portable_document_view.h"
 
 #include "host/gtk/preview/portable_document_screen.h"
+#include "platform/platform.h"
 
 namespace vaelo {
 
@@ -10,7 +11,7 @@ namespace {
 class PortableDocumentView : public DocumentView {
  public:
   PortableDocumentView(const PreviewedDocument& document, DocumentViewEvents events)
-      : screen_(document, std::move(events)) {}
+      : screen_(document, std::move(events), &Platform::current().fileCoordination) {}
   GtkWidget* widget() override { return screen_.widget(); }
   void refresh() override { screen_.refresh(); }
   std::vector<GtkWidget*> headerWidgets() override { return screen_.headerWidgets(); }

@@ -1,15 +1,14 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
-#include <adwaita.h>
 #include <gtksourceview/gtksource.h>
 
+#include "host/gtk/preview/find_bar.h"
 #include "host/support/glib_ptr.h"
 
 namespace vaelo {
 
-/// A search bar that finds text in a text view on a source buffer: as one types, onwards with Enter and Ctrl+G, and back
-/// with Shift. Main thread; large texts are searched in slices.
+/// A find bar for a text view on a source buffer. Main thread; large texts are searched in slices.
 class TextFindBar {
  public:
   /// `view` outlives the bar.
@@ -17,24 +16,22 @@ class TextFindBar {
   ~TextFindBar();
   TextFindBar(const TextFindBar&) = delete;
   TextFindBar& operator=(const TextFindBar&) = delete;
-  GtkWidget* widget() const { return bar_; }
+  GtkWidget* widget() const { return bar_.widget(); }
 
   /// The view has another buffer, or is about to have.
   void setBuffer(GtkSourceBuffer* buffer);
-  void toggle();
+  void toggle() { bar_.toggle(); }
   /// False when it is closed already.
-  bool close();
+  bool close() { return bar_.close(); }
 
  private:
-  void searchChanged();
+  void searchChanged(const std::string& text);
   void step(bool forward);
   void found(const GtkTextIter& begin, const GtkTextIter& end);
   void showCount();
 
   GtkTextView* view_;
-  GtkWidget* bar_;
-  GtkWidget* entry_;
-  GtkWidget* count_;
+  FindBar bar_;
   GRef<GtkSourceSearchSettings> settings_;
   GRef<GtkSourceSearchContext> context_;
   GRef<GCancellable> searching_;

@@ -75,11 +75,7 @@ class TextView : public DocumentView {
   }
 
   std::vector<GtkWidget*> headerWidgets() override {
-    GtkWidget* find = gtk_button_new_from_icon_name("edit-find-symbolic");
-    gtk_widget_set_tooltip_text(find, "Find in This Document");
-    gtk_accessible_update_property(GTK_ACCESSIBLE(find), GTK_ACCESSIBLE_PROPERTY_LABEL, "Find in This Document", -1);
-    g_signal_connect_swapped(find, "clicked", G_CALLBACK(+[](TextView* self) { self->toggleFind(); }), this);
-    return {find};
+    return {makeFindButton(G_CALLBACK(+[](TextView* self) { self->toggleFind(); }), this)};
   }
 
   bool toggleFind() override {

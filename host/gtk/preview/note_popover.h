@@ -1,0 +1,36 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <gtk/gtk.h>
+
+#include <functional>
+#include <string>
+
+namespace vaelo {
+
+/// Asks for the text of a note. What was written is kept however it closes, unless the user gives it up. Main thread.
+class NotePopover {
+ public:
+  /// `parent` outlives this object.
+  explicit NotePopover(GtkWidget* parent);
+  ~NotePopover();
+  NotePopover(const NotePopover&) = delete;
+  NotePopover& operator=(const NotePopover&) = delete;
+  /// At a place in the parent's coordinates; `written` gets a text that is not empty. One that is open is finished first.
+  void ask(const GdkRectangle& place, std::function<void(const std::string&)> written);
+  bool isOpen() const { return gtk_widget_get_visible(popover_); }
+  /// Keeps what was written.
+  void finish() { gtk_popover_popdown(GTK_POPOVER(popover_)); }
+  void giveUp();
+  /// As if it was written by the user.
+  void setText(const std::string& text);
+
+ private:
+  void closed();
+
+  GtkWidget* popover_;
+  GtkWidget* text_;
+  std::function<void(const std::string&)> written_;
+};
+
+}  // namespace vaelo
