@@ -65,7 +65,7 @@ std::optional<ApplicationRecord> LaunchUtils::appForDocumentInDrive(const URL& d
     return std::nullopt;
   }
   const ApplicationRecord& app = candidates.front();
-  VLO_DEBUG("App for %@: %@, %@, %@, %@, %@, %@, %@, %@, %@, %@, %@", resolved, app.itemName, app.localizedName,
+  VLO_DEBUG("App for %@: %@, %@, %@, %@, %@, %@, %@, %@, %@, %@, %@", document, app.itemName, app.localizedName,
             app.localizedShortName, app.shortVersionString, app.vendorName, app.bundleIdentifier, app.executableName,
             app.bundleContainerURL, app.isInstalled, app.itemID, app.description());
   if (requireOpenIn && !app.supportsOpenInPlace) {

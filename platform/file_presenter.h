@@ -22,7 +22,7 @@ class FilePresenter {
   virtual void presentedItemDidMoveToURL(const URL& url) = 0;
   /// The item is about to go; call the completion when ready for it.
   virtual void accommodatePresentedItemDeletionWithCompletionHandler(Completion completion) = 0;
-  virtual void accommodatePresentedSubitemDeletionAtURL(const URL& url, Completion completion) = 0;
+  virtual void accommodatePresentedSubitemDeletionAtURLCompletionHandler(const URL& url, Completion completion) = 0;
 };
 
 }  // namespace vaelo

@@ -79,18 +79,18 @@ URL GlimpseItemController::previewControllerPreviewItemAtIndex(PreviewController
   return arrayOfDocuments_->at(index);
 }
 
-bool GlimpseItemController::glPreviewItemIsPDFKind(const URL& item) {
+bool GlimpseItemController::_glPreviewItemIsPDFKind(const URL& item) {
   TypeIdentifiers& types = Platform::current().types;
   const std::optional<std::string> type = types.preferredIdentifierForExtension(item.pathExtension());
   return type && types.conformsTo(*type, "com.adobe.pdf");
 }
 
 bool GlimpseItemController::previewControllerCanEditItem(PreviewController&, const URL& item) {
-  return glPreviewItemIsPDFKind(item);
+  return _glPreviewItemIsPDFKind(item);
 }
 
 bool GlimpseItemController::previewControllerShouldSaveEditedItem(PreviewController&, const URL& item) {
-  return glPreviewItemIsPDFKind(item);
+  return _glPreviewItemIsPDFKind(item);
 }
 
 }  // namespace vaelo

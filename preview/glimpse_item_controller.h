@@ -45,7 +45,7 @@ class GlimpseItemController : public PreviewController,
 
  private:
   static std::shared_ptr<GlimpseItemController> make();
-  static bool glPreviewItemIsPDFKind(const URL& item);
+  static bool _glPreviewItemIsPDFKind(const URL& item);
   void takeDocumentsOf(const std::shared_ptr<PreviewItemManager>& manager);
 
   std::weak_ptr<PreviewItemManager> itemManager_;

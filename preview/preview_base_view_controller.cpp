@@ -188,9 +188,8 @@ void PreviewBaseViewController::configureButtons() {
 void PreviewBaseViewController::openInDefaultApp() {
   VLO_USER_ACTION("Pressed Open in <app>");
   const std::optional<URL> url = urlOf(itemManager());
-  if (!url) return;
-  if (!LaunchUtils::openInDefaultAppViewControllerRequireOpenIn(*url, shared_from_this(), true)) {
-    VLO_WARNING("Failed to open document %@ in default app", *url);
+  if (!url || !LaunchUtils::openInDefaultAppViewControllerRequireOpenIn(*url, shared_from_this(), true)) {
+    VLO_WARNING("Failed to open document %@ in default app", url);
   }
 }
 

@@ -54,6 +54,8 @@ void PreviewDetailsViewController::viewWillTransitionToSize(const Size& size, Tr
 
 void PreviewDetailsViewController::refreshItem() {
   PreviewBaseViewController::refreshItem();
+  // The document may change or move before the screen is first shown, which reads it anyway.
+  if (!isViewLoaded()) return;
   const std::shared_ptr<DRItem> item = shownItem();
   fileInfoView_->setItem(item);
   originalFilename_ = item ? item->localizedName() : std::nullopt;

@@ -94,7 +94,7 @@ class PreviewItemManager : public FilePresenter,
   void presentedItemDidChange() override;
   void presentedItemDidMoveToURL(const URL& url) override;
   void accommodatePresentedItemDeletionWithCompletionHandler(Completion completion) override;
-  void accommodatePresentedSubitemDeletionAtURL(const URL& url, Completion completion) override;
+  void accommodatePresentedSubitemDeletionAtURLCompletionHandler(const URL& url, Completion completion) override;
 
  private:
   PreviewItemManager();
@@ -104,7 +104,7 @@ class PreviewItemManager : public FilePresenter,
   void refreshItem(const URL& url);
   void endRefresh();
   void movedTo(const URL& url);
-  void batonBookmarkArrived(const Result<std::string>& bookmark);
+  static void batonBookmarkArrived(const std::weak_ptr<PreviewItemManager>& weakSelf, const Result<std::string>& bookmark);
   void storeItem(const std::shared_ptr<DRItem>& item);
   std::optional<URL> itemURL();
 

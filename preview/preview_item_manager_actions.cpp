@@ -13,13 +13,17 @@ void PreviewItemManager::showWarningAndDeleteDocumentBarButton(const ViewControl
   const std::optional<URL> url = itemURL();
   std::vector<URL> urls;
   if (url) urls.push_back(*url);
-  const auto answered = [url, presenter](const AlertActionRef&, bool cancelled) {
+  // Held, since the screens may drop the manager before the user has answered. It follows the document meanwhile, so what
+  // goes is the document that was asked about, wherever it is by then, and not another one that took its place.
+  const auto answered = [self = shared_from_this(), presenter](const AlertActionRef&, bool cancelled) {
     if (cancelled) {
       VLO_USER_ACTION("Delete was Cancelled (itemMgr)");
       return;
     }
     VLO_USER_ACTION("Delete was Confirmed (itemMgr)");
-    if (const std::optional<Error> error = FileUtils::remove(*url)) UIUtils::showErrorParentViewController(error, presenter);
+    const std::optional<URL> document = self->itemURL();
+    const std::optional<Error> error = document ? FileUtils::remove(*document) : std::nullopt;
+    if (error) UIUtils::showErrorParentViewController(error, presenter);
   };
   UIUtils::showDeleteWarningAlertHasContainerViewControllerUsingViewUsingButtonCompletion(urls, false, presenter, nullptr,
                                                                                           button, answered);

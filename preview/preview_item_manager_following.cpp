@@ -65,13 +65,14 @@ void PreviewItemManager::registerBatonActivity() {
   const std::optional<URL> url = itemURL();
   if (!url) return;
   const std::weak_ptr<PreviewItemManager> weakSelf = weak_from_this();
-  const auto answered = [weakSelf](Result<std::string> bookmark) {
-    if (const auto self = weakSelf.lock()) self->batonBookmarkArrived(bookmark);
-  };
+  const auto answered = [weakSelf](const Result<std::string>& bookmark) { batonBookmarkArrived(weakSelf, bookmark); };
   Platform::current().fileProvider.BookmarkableStringFromDocumentURL(vlo_URLByResolvingAlias(*url), answered);
 }
 
-void PreviewItemManager::batonBookmarkArrived(const Result<std::string>& bookmark) {
+// On any thread, which must not come to own the manager: it and its screens end on the main thread.
+void PreviewItemManager::batonBookmarkArrived(const std::weak_ptr<PreviewItemManager>& weakSelf,
+                                              const Result<std::string>& bookmark) {
+  if (weakSelf.expired()) return;
   if (bookmark.error) {
     if (bookmark.error->domain == CloudDocumentsErrorDomain && bookmark.error->code == NotInDriveCode) {
       VLO_INFO("BookmarkableStringFromDocumentURL returned %{public}@", *bookmark.error);
@@ -84,7 +85,6 @@ void PreviewItemManager::batonBookmarkArrived(const Result<std::string>& bookmar
     VLO_ERROR("BookmarkableStringFromDocumentURL returned empty bookmark");
     return;
   }
-  const std::weak_ptr<PreviewItemManager> weakSelf = weak_from_this();
   Platform::current().queues.main().async([weakSelf, text = *bookmark.value] {
     if (const auto self = weakSelf.lock()) self->registerBatonActivityForBookmark(text);
   });
@@ -190,14 +190,15 @@ void PreviewItemManager::accommodatePresentedItemDeletionWithCompletionHandler(C
   VLO_INFO("Accommodate deletion: %@", itemURL());
   completion(std::nullopt);
   unregisterAsFilePresenter();
-  const std::shared_ptr<PreviewItemManager> self = weak_from_this().lock();
+  std::shared_ptr<PreviewItemManager> self = weak_from_this().lock();
   if (!self) return;
-  Platform::current().queues.main().async([self] {
+  // Moved, so that the last owner goes on the main thread, and not on this one, which the manager's end waits for.
+  Platform::current().queues.main().async([self = std::move(self)] {
     if (const auto navigation = self->navigationController_.lock()) navigation->popViewControllerAnimated(true);
   });
 }
 
-void PreviewItemManager::accommodatePresentedSubitemDeletionAtURL(const URL& url, Completion completion) {
+void PreviewItemManager::accommodatePresentedSubitemDeletionAtURLCompletionHandler(const URL& url, Completion completion) {
   VLO_INFO("%@ accommodate subitem deletion at %@", itemURL(), url);
   completion(std::nullopt);
   unregisterAsFilePresenter();

@@ -78,7 +78,7 @@ void PresenterList::tellNews(const std::shared_ptr<Registration>& registration, 
   if (news.changed) tell(registration, [](FilePresenter& presenter) { presenter.presentedItemDidChange(); });
   for (const std::string& path : news.deletedInside) {
     tell(registration, [nobodyWaits, place = URL(path)](FilePresenter& presenter) {
-      presenter.accommodatePresentedSubitemDeletionAtURL(place, nobodyWaits);
+      presenter.accommodatePresentedSubitemDeletionAtURLCompletionHandler(place, nobodyWaits);
     });
   }
 }
@@ -148,13 +148,10 @@ std::vector<PresenterList::Shown> PresenterList::shown() {
 }
 
 void PresenterList::tell(const std::shared_ptr<Registration>& registration, std::function<void(FilePresenter&)> call) {
-  std::shared_ptr<OperationQueue> queue;
-  {
-    const std::lock_guard lock(registration->mutex);
-    queue = registration->queue;
-  }
-  if (!queue) return;
-  queue->addOperation([registration, call = std::move(call)] {
+  // Under the lock, so that nobody but the presenter can be the last to hold its queue: the queue's end waits for callbacks.
+  const std::lock_guard whileGiven(registration->mutex);
+  if (!registration->queue) return;
+  registration->queue->addOperation([registration, call = std::move(call)] {
     FilePresenter* presenter = nullptr;
     {
       const std::lock_guard lock(registration->mutex);
@@ -207,7 +204,7 @@ void PresenterList::itemWillBeDeleted(const URL& url, const FilePresenter* but) 
     tell(each.registration, [pending, holdsIt, url](FilePresenter& presenter) {
       const FilePresenter::Completion done = [pending](const std::optional<Error>&) { pending->reset(); };
       if (holdsIt) {
-        presenter.accommodatePresentedSubitemDeletionAtURL(url, done);
+        presenter.accommodatePresentedSubitemDeletionAtURLCompletionHandler(url, done);
       } else {
         presenter.accommodatePresentedItemDeletionWithCompletionHandler(done);
       }

@@ -34,7 +34,7 @@ class RecordingPresenter : public FilePresenter {
     note("deleted");
     completion(std::nullopt);
   }
-  void accommodatePresentedSubitemDeletionAtURL(const URL& url, Completion completion) override {
+  void accommodatePresentedSubitemDeletionAtURLCompletionHandler(const URL& url, Completion completion) override {
     note("deleted below " + url.path());
     completion(std::nullopt);
   }

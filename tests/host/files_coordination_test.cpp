@@ -33,7 +33,7 @@ class RecordingPresenter : public FilePresenter {
     answered = true;
     if (answers) completion(std::nullopt);
   }
-  void accommodatePresentedSubitemDeletionAtURL(const URL& url, Completion completion) override {
+  void accommodatePresentedSubitemDeletionAtURLCompletionHandler(const URL& url, Completion completion) override {
     told.push_back("deletion of " + url.path());
     completion(std::nullopt);
   }

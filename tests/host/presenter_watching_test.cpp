@@ -34,7 +34,7 @@ class WaitingPresenter : public FilePresenter {
     hear("deletion");
     completion(std::nullopt);
   }
-  void accommodatePresentedSubitemDeletionAtURL(const URL& url, Completion completion) override {
+  void accommodatePresentedSubitemDeletionAtURLCompletionHandler(const URL& url, Completion completion) override {
     hear("deletion of " + url.path());
     completion(std::nullopt);
   }

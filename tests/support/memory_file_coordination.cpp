@@ -106,7 +106,7 @@ void MemoryFileCoordination::tellOfDeletion(const URL& url, const FilePresenter*
     if (!holdsIt && !shownURL.isInside(url)) continue;
     const Told call = [holdsIt, url, answered](FilePresenter& presenter) {
       if (holdsIt) {
-        presenter.accommodatePresentedSubitemDeletionAtURL(url, answered);
+        presenter.accommodatePresentedSubitemDeletionAtURLCompletionHandler(url, answered);
       } else {
         presenter.accommodatePresentedItemDeletionWithCompletionHandler(answered);
       }
@@ -122,9 +122,14 @@ void MemoryFileCoordination::tell(const std::shared_ptr<Registration>& registrat
     if (registration->presenter) queue = registration->presenter->presentedItemOperationQueue();
   }
   if (!queue) return;
+  // Not called under the lock: a presenter that leaves holds a lock of its own, which its callbacks take too.
   queue->addOperation([registration, call = std::move(call)] {
-    const std::lock_guard lock(registration->mutex);
-    if (registration->presenter) call(*registration->presenter);
+    FilePresenter* presenter = nullptr;
+    {
+      const std::lock_guard lock(registration->mutex);
+      presenter = registration->presenter;
+    }
+    if (presenter) call(*presenter);
   });
   // The one who waits for an answer is not the one who runs the queue, on a real platform.
   if (auto* memoryQueue = waits ? dynamic_cast<MemoryOperationQueue*>(queue.get()) : nullptr) memoryQueue->finishNow();

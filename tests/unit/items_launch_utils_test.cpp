@@ -101,6 +101,7 @@ TEST_F(LaunchUtilsTest, theDocumentOfABookmarkIsJudged) {
   world.bookmarks.insert_or_assign(InDrive.path(), letter);
   EXPECT_EQ(chosen(InDrive), "first");
   EXPECT_TRUE(world.called("record " + letter.path()));
+  EXPECT_TRUE(messages().back().starts_with("DEBUG App for " + InDrive.absoluteString() + ": "));
   world.bookmarks.insert_or_assign(InDrive.path(), fileError(FileErrorCode::NoSuchFile));
   EXPECT_FALSE(chosen(InDrive));
 }

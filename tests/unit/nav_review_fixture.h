@@ -8,26 +8,10 @@
 #include <vector>
 
 #include "app/app_delegate.h"
+#include "tests/unit/animation_recorder.h"
 #include "tests/unit/app_fixture.h"
 
 namespace vaelo {
-
-/// Shows everything at once and keeps what was to be animated.
-class AnimationRecorder : public NavigationHost, public PresentationHost {
- public:
-  void stackChanged(const Stack&, const Stack&, bool animated, std::function<void()> done) override {
-    stacks.push_back(animated);
-    done();
-  }
-  void toolbarHiddenChanged(bool, bool) override {}
-  void present(const ViewControllerRef&, const ViewControllerRef&, bool, std::function<void()> done) override { done(); }
-  void dismiss(const ViewControllerRef&, bool animated, std::function<void()> done) override {
-    dismissals.push_back(animated);
-    done();
-  }
-  std::vector<bool> stacks;
-  std::vector<bool> dismissals;
-};
 
 /// The corners of navigation, with bookmarks decoded on the spot.
 class NavReviewTest : public AppFixture {

@@ -48,6 +48,29 @@ TEST_F(PreviewActionsTest, AManagerWithoutAnItemShowsNoDocument) {
   EXPECT_EQ(glimpse()->arrayOfDocuments(), std::nullopt);
 }
 
+TEST_F(PreviewActionsTest, EachManagerMakesTheScreenAskForDocumentsAnew) {
+  const auto manager = show();
+  std::vector<std::size_t> counts;
+  const auto token = glimpse()->previewChanged().connect([&counts](PreviewController& controller, PreviewChange change) {
+    if (change == PreviewChange::AllItems) counts.push_back(controller.itemCount());
+  });
+  glimpse()->glimpseNewItem(makeManager());
+  glimpse()->glimpseNewItem(manager);
+  EXPECT_THAT(counts, ElementsAre(0u, 1u)) << "with the documents already changed";
+  EXPECT_EQ(glimpse()->itemManager(), manager);
+}
+
+TEST_F(PreviewActionsTest, TheScreenDoesNotKeepItsManager) {
+  auto manager = show();
+  const std::weak_ptr<PreviewItemManager> weak = manager;
+  manager = nullptr;
+  EXPECT_TRUE(weak.expired());
+  EXPECT_EQ(glimpse()->itemManager(), nullptr);
+  organize()->press();
+  trash()->press();
+  EXPECT_EQ(nav->presentedViewController(), nullptr);
+}
+
 TEST_F(PreviewActionsTest, AScreenOfItsOwnTakesTheItemWithoutLoading) {
   const auto manager = show();
   log().clear();
@@ -73,6 +96,11 @@ TEST_F(PreviewActionsTest, MarkupIsForNamesOfPortableDocuments) {
   EXPECT_FALSE(edits("report.dat"));
   EXPECT_FALSE(edits("report"));
   EXPECT_FALSE(edits("report.txt"));
+  memory.types.typeOfExtension["signed"] = "org.example.signed-document";
+  memory.types.conformances["org.example.signed-document"] = {"com.adobe.pdf", "public.data"};
+  EXPECT_TRUE(edits("report.signed")) << "a kind of portable document";
+  memory.types.makesTypes = false;
+  EXPECT_FALSE(edits("report.dat")) << "no type at all";
   EXPECT_TRUE(glimpse()->shouldSaveEditedItem(URL("/report.pdf")));
   EXPECT_FALSE(glimpse()->shouldSaveEditedItem(URL("/report.txt")));
 }
@@ -105,6 +133,26 @@ TEST_F(PreviewActionsTest, DeleteAsksAtItsButtonAndRemovesTheDocument) {
   EXPECT_NE(top(), glimpse());
 }
 
+TEST_F(PreviewActionsTest, DeleteGoesToTheDocumentWhereverItIsByThen) {
+  auto manager = show();
+  trash()->press();
+  const URL moved = addFolder("Archive").appendingPathComponent("Report.pdf");
+  memory.disk.move(document.path(), moved.path());
+  memory.coordination.othersMoved(document, moved);
+  runAllQueues();
+  addFile("Plans/Report.pdf");  // another document in its place
+  manager = nullptr;            // the question holds it
+  answer(0);
+  EXPECT_NE(memory.disk.logicalItem(document.path()), nullptr);
+  EXPECT_EQ(memory.disk.logicalItem(moved.path()), nullptr);
+}
+
+TEST_F(PreviewActionsTest, WithoutADocumentThereIsNothingToDelete) {
+  makeManager()->showWarningAndDeleteDocumentBarButton(topList(), trash());
+  EXPECT_EQ(sheet(), nullptr);
+  pressed("Delete was Cancelled (itemMgr)");
+}
+
 TEST_F(PreviewActionsTest, ACancelledDeleteLeavesTheDocument) {
   const auto manager = show();
   trash()->press();
@@ -120,6 +168,7 @@ TEST_F(PreviewActionsTest, ADeleteThatFailsIsToldAndThePreviewStays) {
   answer(0);
   ASSERT_NE(sheet(), nullptr);
   EXPECT_THAT(sheet()->actions(), SizeIs(1)) << "an alert with OK";
+  EXPECT_TRUE(loggedStarting("ERROR", "failed to delete item:"));
   EXPECT_EQ(top(), glimpse());
 }
 
@@ -129,9 +178,23 @@ TEST_F(PreviewActionsTest, MoveOffersFoldersOverThePreview) {
   ASSERT_NE(picker(), nullptr);
   EXPECT_EQ(picker()->modalPresentationStyle(), PresentationStyle::OverCurrentContext);
   EXPECT_EQ(picker()->delegate(), manager);
-  EXPECT_EQ(picker()->allowsCrossContainer(), vlo_canCrossZoneMoveURLs({document}));
+  EXPECT_FALSE(picker()->allowsCrossContainer()) << "there is no other container";
   EXPECT_TRUE(logged("INFO", "Pressed Move (itemMgr)"));
   EXPECT_TRUE(logged("DEBUG", "Presented moveTarget"));
+}
+
+TEST_F(PreviewActionsTest, MoveOffersOtherContainersWhenTheyCanTakeTheDocument) {
+  memory.cloud.addContainer("org~example~Sketchbook", "Sketchbook");
+  const auto manager = show();
+  manager->showMoveTarget(glimpse());
+  EXPECT_TRUE(picker()->allowsCrossContainer());
+}
+
+TEST_F(PreviewActionsTest, AScreenOutsideTheStackOffersNoFolders) {
+  const auto manager = show();
+  manager->showMoveTarget(std::make_shared<PreviewBaseViewController>());
+  EXPECT_EQ(picker(), nullptr);
+  EXPECT_FALSE(logged("DEBUG", "Presented moveTarget"));
 }
 
 TEST_F(PreviewActionsTest, WithoutADocumentThereIsNothingToMove) {
@@ -161,6 +224,28 @@ TEST_F(PreviewActionsTest, AMoveOntoAnItemOfThatNameIsTold) {
   picker()->userSelected(folder);
   ASSERT_NE(sheet(), nullptr);
   EXPECT_EQ(sheet()->title(), "An item named “Report.pdf” already exists in the new location.");
+  EXPECT_NE(memory.disk.logicalItem(document.path()), nullptr);
+}
+
+TEST_F(PreviewActionsTest, AFailedMoveDoesNotStopTheOthers) {
+  const auto manager = show();
+  const URL folder = addFolder("Archive");
+  const URL moving = addFolder("Plans/Album.sketchbundle");
+  addFile("Archive/Report.pdf");
+  const auto several = std::make_shared<DocumentTargetSelectionController>(std::vector<URL>{document, moving}, false);
+  manager->documentTargetSelectionControllerDidSelectItemAtURL(several, folder);
+  ASSERT_NE(sheet(), nullptr);
+  EXPECT_NE(memory.disk.logicalItem(folder.appendingPathComponent("Album.sketchbundle").path()), nullptr);
+  EXPECT_TRUE(logged("DEBUG", "Moving dest1: '" + text(folder.appendingPathComponent("Album.sketchbundle", false)) + "'"));
+}
+
+TEST_F(PreviewActionsTest, WithoutANavigationControllerAFailedMoveIsNotTold) {
+  const URL folder = addFolder("Archive");
+  addFile("Archive/Report.pdf");
+  const auto orphan = PreviewItemManager::newItemManagerWithModeNavController(0, nullptr);
+  const auto picked = std::make_shared<DocumentTargetSelectionController>(std::vector<URL>{document}, false);
+  orphan->documentTargetSelectionControllerDidSelectItemAtURL(picked, folder);
+  EXPECT_EQ(sheet(), nullptr);
   EXPECT_NE(memory.disk.logicalItem(document.path()), nullptr);
 }
 

@@ -15,7 +15,12 @@ class BaseScreen : public PreviewBaseViewController {
  public:
   std::shared_ptr<Button> openInAppNavControllerButton() override { return openButton; }
   void updateProgress(const std::shared_ptr<Progress>&) override { ++updates; }
+  void refreshItem() override {
+    refreshes.push_back(barButtonActionItem() && (!navigationController() || parentTopConstraint()));
+    PreviewBaseViewController::refreshItem();
+  }
   std::shared_ptr<Button> openButton;
+  std::vector<bool> refreshes;  ///< whether buttons and constraints were there already
   int updates = 0;
 };
 
@@ -77,6 +82,26 @@ TEST_F(PreviewBaseTest, ConstraintsComeWithANavigationController) {
   EXPECT_THAT(screen->view()->constraints(), SizeIs(4)) << "appearing again adds none";
 }
 
+TEST_F(PreviewBaseTest, EachAppearanceMakesTheButtonsAndConstraintsThenRefreshes) {
+  push();
+  EXPECT_THAT(screen->refreshes, ElementsAre(true));
+  const auto button = screen->barButtonActionItem();
+  const auto edge = screen->parentTopConstraint();
+  screen->viewWillAppear(false);
+  EXPECT_THAT(screen->refreshes, ElementsAre(true, true));
+  EXPECT_NE(screen->barButtonActionItem(), button);
+  EXPECT_NE(screen->parentTopConstraint(), edge);
+  EXPECT_FALSE(edge->active());
+}
+
+TEST_F(PreviewBaseTest, OutsideANavigationControllerTheStatusBarAloneIsLeftFree) {
+  memory.screens.deviceShown.statusBar = {0, 0, 360, 24};
+  EXPECT_EQ(screen->scrollViewDefaultEdgeInsets(), (EdgeInsets{24, 0, 0, 0}));
+  screen->view();
+  screen->configureMargins();
+  EXPECT_EQ(screen->parentBottomConstraint(), nullptr);
+}
+
 TEST_F(PreviewBaseTest, InsetsAreThoseOfTheBars) {
   push();
   memory.screens.deviceShown.statusBar = {0, 0, 360, 24};
@@ -95,6 +120,15 @@ TEST_F(PreviewBaseTest, TheContentFillsWhatTheBarsLeave) {
   const Rect expected = {0, 0, 400, 900 - insets.top - insets.bottom};
   EXPECT_EQ(screen->contentView()->frame(), expected);
   EXPECT_EQ(screen->scrollView()->contentSize(), expected.size());
+  TraitCollection traits;
+  traits.horizontalSizeClass = traits.verticalSizeClass = SizeClass::Regular;
+  window->setTraitCollection(traits);
+  memory.screens.deviceShown.orientation = InterfaceOrientation::Portrait;
+  screen->view()->applyLayoutFrame({0, 0, 900, 901});
+  EXPECT_EQ(screen->parentBottomConstraint()->constant(), -17);
+  memory.screens.deviceShown.orientation = InterfaceOrientation::LandscapeRight;
+  screen->view()->applyLayoutFrame({0, 0, 900, 400});
+  EXPECT_EQ(screen->parentBottomConstraint()->constant(), 0) << "with each layout";
 }
 
 TEST_F(PreviewBaseTest, TheBottomMarginIsForPortrait) {
@@ -108,6 +142,10 @@ TEST_F(PreviewBaseTest, TheBottomMarginIsForPortrait) {
       << "narrow and high, whatever the device says";
   screen->configureMargins();
   EXPECT_EQ(screen->parentBottomConstraint()->constant(), -17);
+  traits.verticalSizeClass = SizeClass::Compact;
+  window->setTraitCollection(traits);
+  EXPECT_EQ(screen->currentPseudoOrientation(), InterfaceOrientation::LandscapeLeft) << "narrow alone is not enough";
+  traits.verticalSizeClass = SizeClass::Regular;
   traits.horizontalSizeClass = SizeClass::Regular;
   window->setTraitCollection(traits);
   EXPECT_EQ(screen->currentPseudoOrientation(), InterfaceOrientation::LandscapeLeft);
@@ -151,6 +189,26 @@ TEST_F(PreviewBaseTest, TheOpenButtonIsInTheBarOfDetailsOnAPhone) {
   quick->openButton = std::make_shared<Button>();
   nav->pushViewController(quick, false);
   EXPECT_EQ(quick->navigationItem().rightBarButtonItem(), nullptr) << "mode 0";
+  const auto other = std::make_shared<BaseScreen>();
+  other->setItemManager(manager);
+  other->setMode(2);
+  other->openButton = std::make_shared<Button>();
+  nav->pushViewController(other, false);
+  EXPECT_EQ(other->navigationItem().rightBarButtonItem(), nullptr) << "mode 1 and no other";
+}
+
+TEST_F(PreviewBaseTest, TheOpenButtonOpensTheDocumentOnce) {
+  const URL notes = addFile("Plans/Notes.txt");
+  giveOwningApplication(notes);
+  manager->setItemUpdatePreview(DRItem::initWithURL(notes), false);
+  screen->openButton = std::make_shared<Button>();
+  push();
+  screen->viewWillAppear(false);
+  screen->openButton->sendActions(ControlEvent::EditingChanged);
+  EXPECT_EQ(times("INFO", "================= Pressed Open in <app>"), 0u);
+  screen->openButton->sendActions(ControlEvent::TouchUpInside);
+  EXPECT_EQ(times("INFO", "================= Pressed Open in <app>"), 1u) << "although it appeared twice";
+  EXPECT_EQ(openingPresenter(), screen);
 }
 
 TEST_F(PreviewBaseTest, ButtonsAreEnabledForAnItemWithAPlace) {
@@ -162,8 +220,14 @@ TEST_F(PreviewBaseTest, ButtonsAreEnabledForAnItemWithAPlace) {
        {screen->barButtonActionItem(), screen->barButtonDeleteItem(), screen->barButtonMoveItem()}) {
     EXPECT_FALSE(button->enabled());
   }
+  screen->configureButtons();
+  for (const BarButtonItemRef& button :
+       {screen->barButtonActionItem(), screen->barButtonDeleteItem(), screen->barButtonMoveItem()}) {
+    EXPECT_FALSE(button->enabled()) << "new ones";
+  }
   manager->setItemUpdatePreview(DRItem::initWithURL(document), false);
   screen->refreshItem();
+  EXPECT_TRUE(screen->barButtonActionItem()->enabled());
   EXPECT_TRUE(screen->barButtonDeleteItem()->enabled());
   EXPECT_TRUE(screen->barButtonMoveItem()->enabled());
 }
@@ -189,6 +253,17 @@ TEST_F(PreviewBaseTest, ShareShowsTheSheetAtItsButton) {
   EXPECT_EQ(sheet->url(), document);
   EXPECT_EQ(sheet->fromButton, screen->barButtonActionItem());
   EXPECT_EQ(manager->documentInteractionController(), sheet);
+  EXPECT_FALSE(loggedStarting("INFO", "URL resolved to "));
+}
+
+TEST_F(PreviewBaseTest, ShareOfABookmarkOfNothingShowsNoSheet) {
+  push();
+  const auto item = DRItem::initWithURL(document);
+  item->setResolvedURL(addFile("Plans/Gone.vaelobookmark"));
+  manager->setItemUpdatePreview(item, false);
+  screen->showDocumentActivities();
+  EXPECT_TRUE(logged("INFO", "URL resolved to (null)"));
+  EXPECT_THAT(memory.screens.interactions, IsEmpty());
 }
 
 TEST_F(PreviewBaseTest, ShareOfABookmarkIsForItsDocument) {
@@ -212,7 +287,8 @@ TEST_F(PreviewBaseTest, ShareWithoutADocumentDoesNothing) {
   item->setResolvedURL(std::nullopt);
   manager->setItemUpdatePreview(item, false);
   screen->showDocumentActivities();
-  EXPECT_TRUE(loggedStarting("WARNING", "showDocumentActivities: url is wrong class: "));
+  EXPECT_TRUE(logged("WARNING", "showDocumentActivities: url is wrong class: (null)"));
+  EXPECT_FALSE(loggedStarting("INFO", "showDocumentActivities: "));
   screen->setItemManager({});
   screen->showDocumentActivities();
   EXPECT_THAT(memory.screens.interactions, IsEmpty());
@@ -230,6 +306,9 @@ TEST_F(PreviewBaseTest, ADocumentThatNothingOpensIsLogged) {
   screen->openInDefaultApp();
   EXPECT_TRUE(logged("INFO", "Opening document " + text.absoluteString() + " in default app"));
   EXPECT_FALSE(loggedStarting("WARNING", "Failed to open document"));
+  manager->setItemUpdatePreview(nullptr, false);
+  screen->openInDefaultApp();
+  EXPECT_TRUE(logged("WARNING", "Failed to open document (null) in default app"));
 }
 
 TEST_F(PreviewBaseTest, DisappearingEndsTheProgressAndTellsTheManager) {
@@ -241,6 +320,18 @@ TEST_F(PreviewBaseTest, DisappearingEndsTheProgressAndTellsTheManager) {
   EXPECT_EQ(memory.fileProgress.subscriberCount(document), 0u);
   EXPECT_EQ(details->subscriber(), nullptr);
   EXPECT_EQ(shown->detailsViewController(), nullptr);
+}
+
+TEST_F(PreviewBaseTest, ProgressIsThatOfTheDocumentBehindTheItem) {
+  const URL far = addFile("Plans/Far.pdf");
+  const auto item = DRItem::initWithURL(document);
+  item->setResolvedURL(far);
+  manager->setItemUpdatePreview(item, false);
+  screen->registerForProgress();
+  EXPECT_EQ(memory.fileProgress.subscriberCount(far), 1u);
+  EXPECT_EQ(memory.fileProgress.subscriberCount(document), 0u);
+  screen->unregisterProgress();
+  EXPECT_EQ(memory.fileProgress.subscriberCount(far), 0u);
 }
 
 TEST_F(PreviewBaseTest, ProgressIsToldInStepsOfFivePercent) {

@@ -49,7 +49,10 @@ TEST_F(PreviewFollowingTest, ALaterDateReloadsTheVisibleQuickPreview) {
 TEST_F(PreviewFollowingTest, TheSameDateChangesTheTitleAlone) {
   setModified(document, seconds(10));
   const auto manager = show();
+  const auto stack = nav->viewControllers();
   glimpse()->setTitle("old");
+  int others = 0;
+  const auto otherToken = glimpse()->previewChanged().connect([&others](PreviewController&, PreviewChange) { ++others; });
   int reloads = 0;
   const auto token = countReloads(reloads);
   const auto before = manager->item();
@@ -58,6 +61,55 @@ TEST_F(PreviewFollowingTest, TheSameDateChangesTheTitleAlone) {
   EXPECT_EQ(reloads, 0);
   EXPECT_EQ(glimpse()->title(), *manager->item()->localizedName());
   EXPECT_NE(manager->item(), before) << "the fresh record is the item";
+  EXPECT_EQ(others, 0) << "and nothing was prepared anew";
+  EXPECT_EQ(nav->viewControllers(), stack);
+}
+
+TEST_F(PreviewFollowingTest, TheTitleIsKeptUpAlsoBehindTheDetails) {
+  setModified(document, seconds(10));
+  const auto manager = show(1);
+  glimpse()->setTitle("old");
+  int reloads = 0;
+  const auto token = countReloads(reloads);
+  setModified(document, seconds(20));
+  memory.coordination.othersChanged(document);
+  advance(seconds(1));
+  EXPECT_EQ(glimpse()->title(), "Report.pdf");
+  EXPECT_EQ(reloads, 0) << "it is not visible";
+  EXPECT_FALSE(logged("DEBUG", "GLPreviewController: refreshCurrentPreviewItem"));
+}
+
+TEST_F(PreviewFollowingTest, TheDatesAreLoggedFormerFirst) {
+  setModified(document, seconds(10));
+  const auto manager = show();
+  setModified(document, seconds(20));
+  memory.coordination.othersChanged(document);
+  advance(seconds(1));
+  EXPECT_TRUE(logged("DEBUG", text(document) + ": modDate " + Value(Date(seconds(10))).description() + " vs " +
+                                  Value(Date(seconds(20))).description()));
+  forgetModified(document);
+  memory.coordination.othersChanged(document);
+  advance(seconds(1));
+  EXPECT_EQ(manager->modifiedDate(), std::nullopt) << "always that of the fresh record";
+}
+
+TEST_F(PreviewFollowingTest, AnotherPathAtARefreshIsSaidAndShown) {
+  const auto manager = show(1);
+  const auto former = manager->detailsViewController();
+  const auto other = DRItem::initWithURL(addFile("Plans/Other.pdf"));
+  memory.coordination.othersChanged(document);
+  advance(milliseconds(999));
+  bool changed = false;
+  memory.coordination.beforeAccessor = [&] {
+    if (!std::exchange(changed, true)) manager->setItemUpdatePreview(other, false);
+  };
+  advance(milliseconds(1));
+  memory.coordination.beforeAccessor = nullptr;
+  EXPECT_TRUE(logged("ERROR", "UNEXPECTED: path changed but we only got a presentedItemDidChange: " + other->url()->path() +
+                                  " to " + document.path()));
+  EXPECT_EQ(manager->item()->url(), document);
+  EXPECT_NE(manager->detailsViewController(), former) << "prepared anew";
+  EXPECT_EQ(top(), manager->detailsViewController());
 }
 
 TEST_F(PreviewFollowingTest, AnEarlierDateIsTakenButReloadsNothing) {
@@ -143,6 +195,61 @@ TEST_F(PreviewFollowingTest, AMoveReTargetsTheDetails) {
   EXPECT_EQ(manager->detailsViewController()->filenameTextField()->text(), *manager->item()->localizedName());
 }
 
+TEST_F(PreviewFollowingTest, AMoveIsFollowedToTheRealPlace) {
+  const auto manager = show();
+  const URL archive = addFolder("Archive");
+  const URL moved = archive.appendingPathComponent("Report.pdf");
+  const URL link = addLink("Link", archive);
+  memory.disk.move(document.path(), moved.path());
+  manager->presentedItemDidMoveToURL(link.appendingPathComponent("Report.pdf"));
+  runAllQueues();
+  EXPECT_EQ(manager->item()->url()->path(), moved.path());
+  EXPECT_TRUE(logged("INFO", "presentedItemDidMoveToURL: " + text(document) + " changed to " + text(moved)));
+}
+
+TEST_F(PreviewFollowingTest, AMoveShowsOnTheMainQueueNotBefore) {
+  const auto manager = show();
+  const URL moved = addFolder("Archive").appendingPathComponent("Report.pdf");
+  memory.disk.move(document.path(), moved.path());
+  manager->presentedItemDidMoveToURL(moved);
+  EXPECT_EQ(manager->item()->url(), document);
+  runAllQueues();
+  EXPECT_EQ(manager->item()->url(), moved);
+  EXPECT_THAT(memory.coordination.presenters(), ::testing::ElementsAre(manager.get()));
+}
+
+TEST_F(PreviewFollowingTest, AManagerThatIsGoneFollowsNoMove) {
+  auto manager = show();
+  const URL moved = addFolder("Archive").appendingPathComponent("Report.pdf");
+  memory.disk.move(document.path(), moved.path());
+  manager->presentedItemDidMoveToURL(moved);
+  const std::weak_ptr<PreviewItemManager> weak = manager;
+  manager = nullptr;
+  EXPECT_TRUE(weak.expired());
+  log().clear();
+  runAllQueues();
+  EXPECT_FALSE(logged("DEBUG", "Previewing " + text(moved)));
+}
+
+TEST_F(PreviewFollowingTest, AMoveOfWhatIsGoneByThenLeavesNoItem) {
+  const auto manager = show();
+  manager->presentedItemDidMoveToURL(addFolder("Archive").appendingPathComponent("Report.pdf"));
+  runAllQueues();
+  EXPECT_EQ(manager->item(), nullptr);
+  EXPECT_TRUE(logged("DEBUG", "Previewing (null)"));
+}
+
+TEST_F(PreviewFollowingTest, DetailsThatWereNeverShownAreNotRefreshed) {
+  const auto manager = PreviewItemManager::newItemManagerWithModeNavController(1, nullptr);
+  manager->previewItem(DRItem::initWithURL(document));
+  const URL moved = addFolder("Archive").appendingPathComponent("Report.pdf");
+  memory.disk.move(document.path(), moved.path());
+  manager->presentedItemDidMoveToURL(moved);
+  runAllQueues();
+  EXPECT_EQ(manager->item()->url(), moved);
+  EXPECT_FALSE(manager->detailsViewController()->isViewLoaded());
+}
+
 TEST_F(PreviewFollowingTest, TheSameMoveTwiceIsSaidAndChangesNothing) {
   const auto manager = show();
   const URL moved = addFolder("Archive").appendingPathComponent("Report.pdf");
@@ -195,7 +302,7 @@ TEST_F(PreviewFollowingTest, ADeletedPartOfAPackageRefreshesThePreviewLater) {
   manager->presentedItemDidChange();
   const URL part = document.appendingPathComponent("page.txt");
   int answers = 0;
-  manager->accommodatePresentedSubitemDeletionAtURL(part, [&](std::optional<Error> error) {
+  manager->accommodatePresentedSubitemDeletionAtURLCompletionHandler(part, [&](std::optional<Error> error) {
     EXPECT_EQ(error, std::nullopt);
     ++answers;
   });
@@ -205,10 +312,46 @@ TEST_F(PreviewFollowingTest, ADeletedPartOfAPackageRefreshesThePreviewLater) {
   EXPECT_EQ(reloads, 0);
   advance(seconds(1));
   EXPECT_EQ(reloads, 1);
+  EXPECT_EQ(times("INFO", "Refreshing " + text(document)), 2u);
   EXPECT_FALSE(manager->refreshPending());
   EXPECT_FALSE(manager->filePresenterRegistered()) << "until the next activation";
   becomeActive();
   EXPECT_TRUE(manager->filePresenterRegistered());
+}
+
+TEST_F(PreviewFollowingTest, ADeletedPartIsAnsweredBeforeTheManagerLeaves) {
+  const auto manager = show();
+  bool answered = false;
+  manager->accommodatePresentedSubitemDeletionAtURLCompletionHandler(document, [&](std::optional<Error>) {
+    EXPECT_TRUE(manager->filePresenterRegistered());
+    answered = true;
+  });
+  EXPECT_TRUE(answered);
+}
+
+TEST_F(PreviewFollowingTest, TheRefreshAfterADeletedPartEndsAWaitingOne) {
+  const auto manager = show();
+  manager->accommodatePresentedSubitemDeletionAtURLCompletionHandler(document, [](std::optional<Error>) {});
+  advance(milliseconds(500));
+  manager->presentedItemDidChange();
+  advance(milliseconds(499));
+  EXPECT_TRUE(manager->refreshPending());
+  advance(milliseconds(1));
+  EXPECT_FALSE(manager->refreshPending());
+}
+
+TEST_F(PreviewFollowingTest, ADeletedPartReloadsAVisiblePreviewAlone) {
+  auto manager = show(1);
+  int reloads = 0;
+  const auto token = countReloads(reloads);
+  manager->accommodatePresentedSubitemDeletionAtURLCompletionHandler(document, [](std::optional<Error>) {});
+  advance(seconds(1));
+  EXPECT_EQ(reloads, 0);
+  EXPECT_EQ(times("INFO", "Refreshing " + text(document)), 1u);
+  manager->accommodatePresentedSubitemDeletionAtURLCompletionHandler(document, [](std::optional<Error>) {});
+  manager = nullptr;
+  advance(seconds(1));
+  EXPECT_EQ(times("INFO", "Refreshing " + text(document)), 1u) << "the manager is gone";
 }
 
 TEST_F(PreviewFollowingTest, FollowsOnlyWhileTheApplicationIsInFront) {
@@ -238,12 +381,25 @@ TEST_F(PreviewFollowingTest, OtherDevicesAreToldOfTheDocument) {
   EXPECT_EQ(manager->batonActivity(), activities().front());
 }
 
+TEST_F(PreviewFollowingTest, OfABookmarkOtherDevicesAreToldTheDocument) {
+  const URL far = addFile("Plans/Far.pdf");
+  const URL bookmark = addFile("Plans/Far.vaelobookmark");
+  memory.disk.items.at(bookmark.path()).bookmarkTarget = far;
+  const auto manager = makeManager();
+  manager->previewItem(DRItem::initWithURL(bookmark));
+  runAllQueues();
+  const Dictionary expected = {{UserActivityDocumentURLKey, bookmarkableString(far)}};
+  EXPECT_EQ(activities().back()->userInfo(), expected);
+}
+
 TEST_F(PreviewFollowingTest, EachActivationGivesANewActivity) {
   const auto manager = show();
   runAllQueues();
   becomeActive();
   runAllQueues();
   EXPECT_THAT(activities(), SizeIs(2)) << "also when the document was followed already";
+  EXPECT_THAT(memory.coordination.presenters(), SizeIs(1));
+  EXPECT_TRUE(activities().front()->isCurrent()) << "the new one takes its place without its resigning";
   resignActive();
   becomeActive();
   runAllQueues();
@@ -280,6 +436,21 @@ TEST_F(PreviewFollowingTest, AnAnswerAfterTheManagerIsGoneIsNobodys) {
   for (const Block& answer : memory.provider.held) answer();
   runAllQueues();
   EXPECT_TRUE(activities().empty());
+}
+
+TEST_F(PreviewFollowingTest, AnAnswerDoesNotKeepTheManager) {
+  auto manager = show();
+  const std::weak_ptr<PreviewItemManager> weak = manager;
+  manager = nullptr;  // the answer is there, but not yet on the main queue
+  EXPECT_TRUE(weak.expired());
+  memory.provider.strings.insert_or_assign(document.path(), Result<std::string>());
+  memory.provider.holdsAnswers = true;
+  manager = show();
+  manager = nullptr;
+  for (const Block& answer : memory.provider.held) answer();
+  runAllQueues();
+  EXPECT_TRUE(activities().empty());
+  EXPECT_FALSE(loggedStarting("ERROR", "BookmarkableStringFromDocumentURL")) << "nobody asks any more";
 }
 
 TEST_F(PreviewFollowingTest, AManagerThatGoesNoLongerFollowsNorOffers) {

@@ -74,6 +74,23 @@ TEST_F(PreviewManagerTest, NothingToShowLeavesTheStackAlone) {
   EXPECT_FALSE(manager->filePresenterRegistered());
 }
 
+TEST_F(PreviewManagerTest, ADocumentThatLostItsPlaceStaysWatchedAsItWas) {
+  setModified(document, std::chrono::seconds(500));
+  const auto manager = show(1);
+  const auto details = manager->detailsViewController();
+  setModified(document, std::chrono::seconds(600));
+  const auto item = DRItem::initWithURL(document);
+  item->setResolvedURL(std::nullopt);
+  EXPECT_EQ(manager->prepareToPreviewItem(item), nullptr);
+  EXPECT_EQ(manager->item(), item);
+  EXPECT_TRUE(manager->filePresenterRegistered());
+  EXPECT_EQ(manager->modifiedDate(), Date(std::chrono::seconds(500)));
+  EXPECT_EQ(manager->detailsViewController(), details);
+  EXPECT_EQ(manager->prepareToPreviewItem(nullptr), nullptr);
+  EXPECT_EQ(manager->item(), nullptr);
+  EXPECT_FALSE(manager->filePresenterRegistered());
+}
+
 TEST_F(PreviewManagerTest, ALinkThatLeadsNowhereIsShownNevertheless) {
   const auto item = DRItem::initWithURL(addLink("Plans/Link", URL("/drive/mirror/com~marrow~Kestrel/gone")));
   ASSERT_NE(item, nullptr);
@@ -104,7 +121,8 @@ TEST_F(PreviewManagerTest, AnotherDocumentIsFollowedInThePlaceOfTheFormerOne) {
   manager->previewItem(DRItem::initWithURL(document));
   EXPECT_TRUE(former->isCurrent()) << "the same document stays watched";
   manager->previewItem(DRItem::initWithURL(addFile("Plans/Other.pdf")));
-  EXPECT_FALSE(former->isCurrent() && manager->batonActivity() == former);
+  EXPECT_FALSE(former->isCurrent());
+  EXPECT_EQ(manager->batonActivity(), nullptr) << "until the bookmark is there";
   EXPECT_TRUE(manager->filePresenterRegistered());
   EXPECT_THAT(memory.coordination.presenters(), ElementsAre(manager.get()));
 }
@@ -181,11 +199,14 @@ TEST_F(PreviewManagerTest, AWarpBuildsTheListsDownToTheDocumentWithItsPreviewOnT
   EXPECT_EQ(top(), glimpse());
   EXPECT_EQ(manager->item()->url(), other);
   EXPECT_TRUE(manager->filePresenterRegistered());
+  EXPECT_EQ(times("DEBUG", "Preview: Using GlimpseItemController, File Exists"), 2u) << "not prepared twice";
+  EXPECT_TRUE(logged("DEBUG", "Previewing " + text(other)));
   const auto above =
       std::dynamic_pointer_cast<DocumentListController>(nav->viewControllers().at(nav->viewControllers().size() - 2));
   ASSERT_NE(above, nullptr);
   EXPECT_EQ(above->presentedURL()->path(), other.deletingLastPathComponent().path());
-  EXPECT_TRUE(loggedStarting("DEBUG", "New VC stack of DLCs: ("));
+  EXPECT_TRUE(
+      logged("DEBUG", "New VC stack of DLCs: (DocumentListController, DocumentListController, DocumentListController)"));
 }
 
 TEST_F(PreviewManagerTest, AWarpToAFolderEndsInItsList) {
@@ -217,7 +238,7 @@ TEST_F(PreviewManagerTest, TheListsOfADocumentAreThoseOfItsFolder) {
   EXPECT_TRUE(logged("ERROR", "Can't build DLC stack, can't get directory: " + text(gone)));
   makeNoHierarchies();
   EXPECT_FALSE(PreviewItemManager::dlcStackForURL(document));
-  EXPECT_TRUE(loggedStarting("ERROR", ": Couldn't build DLC stack for "));
+  EXPECT_TRUE(logged("ERROR", ": Couldn't build DLC stack for " + text(document.deletingLastPathComponent()) + "."));
 }
 
 }  // namespace

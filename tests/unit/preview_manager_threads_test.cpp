@@ -34,7 +34,8 @@ TEST_F(PreviewManagerThreadsTest, CallbacksOfTheirOwnThreadAgreeWithTheMainThrea
       if (i % 10 == 3) manager->presentedItemDidMoveToURL(i % 20 == 3 ? other : document);
       if (i % 50 == 7) manager->presentedItemDidMoveToURL(trash);
       if (i % 10 == 5) {
-        manager->accommodatePresentedSubitemDeletionAtURL(document, [&](std::optional<Error>) { ++answers; });
+        manager->accommodatePresentedSubitemDeletionAtURLCompletionHandler(document,
+                                                                           [&](std::optional<Error>) { ++answers; });
       }
       if (i % 25 == 9) {
         manager->accommodatePresentedItemDeletionWithCompletionHandler([&](std::optional<Error>) { ++answers; });
@@ -66,6 +67,35 @@ TEST_F(PreviewManagerThreadsTest, NoticesFromManyThreadsMakeOneRefresh) {
   for (std::thread& thread : threads) thread.join();
   advance(seconds(1));
   EXPECT_EQ(times("INFO", "Refreshing " + text(document)), 1u);
+}
+
+TEST_F(PreviewManagerThreadsTest, NoticesComeWhileTheManagerRegistersAndLeaves) {
+  const auto manager = show();
+  for (int i = 0; i < 50; ++i) {
+    std::thread other([this] {
+      for (int j = 0; j < 20; ++j) memory.coordination.othersChanged(document);
+    });
+    for (int j = 0; j < 20; ++j) {
+      manager->unregisterAsFilePresenter();
+      manager->registerAsFilePresenter();
+    }
+    other.join();
+  }
+  std::static_pointer_cast<ThreadOperationQueue>(manager->fcQueue())->waitUntilAllFinished();
+  advance(seconds(1));
+  EXPECT_FALSE(manager->refreshPending());
+}
+
+// The thread of the notices must not come to be the last to hold the manager: its end waits for that thread.
+TEST_F(PreviewManagerThreadsTest, AManagerThatIsDroppedDuringADeletionEndsOnTheMainThread) {
+  for (int i = 0; i < 200; ++i) {
+    auto manager = show();
+    const std::weak_ptr<PreviewItemManager> weak = manager;
+    memory.coordination.othersDelete(document);
+    manager = nullptr;
+    while (!weak.expired()) advance({});
+  }
+  EXPECT_TRUE(memory.coordination.presenters().empty());
 }
 
 TEST_F(PreviewManagerThreadsTest, RegistrationFromManyThreadsIsOne) {
