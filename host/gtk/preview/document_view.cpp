@@ -4,6 +4,10 @@
 #include <algorithm>
 #include <array>
 
+#include "host/gtk/preview/archive_view.h"
+#include "host/gtk/preview/markdown_view.h"
+#include "host/gtk/preview/media_view.h"
+#include "host/gtk/preview/office_view.h"
 #include "host/gtk/preview/picture_view.h"
 #include "host/gtk/preview/portable_document_view.h"
 #include "host/gtk/preview/text_view.h"
@@ -19,7 +23,12 @@ struct Kind {
 
 // The first that shows a type has it.
 constexpr std::array Kinds = {
-    Kind{showsPortableDocument, makePortableDocumentView}, Kind{showsPicture, makePictureView},
+    Kind{showsPortableDocument, makePortableDocumentView},
+    Kind{showsPicture, makePictureView},
+    Kind{showsMedia, makeMediaView},
+    Kind{showsArchive, makeArchiveView},
+    Kind{showsMarkdown, makeMarkdownView},
+    Kind{showsOffice, makeOfficeView},
     Kind{showsText, makeTextView},  // last, since much else is text too
 };
 

@@ -1,0 +1,16 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#pragma once
+
+#include <gtk/gtk.h>
+
+#include <memory>
+
+#include "host/gtk/preview/archive_listing.h"
+
+namespace vaelo {
+
+/// The rows of an archive's list: a model of folders that open in their place, and the widgets for it. Main thread.
+GtkTreeListModel* makeArchiveRows(std::shared_ptr<const ArchiveListing> listing);
+GtkListItemFactory* makeArchiveRowFactory();
+
+}  // namespace vaelo

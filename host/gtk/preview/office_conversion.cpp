@@ -1,0 +1,140 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/gtk/preview/office_conversion.h"
+
+#include <gio/gio.h>
+#include <sys/prctl.h>
+#include <sys/resource.h>
+#include <unistd.h>
+
+#include <csignal>
+#include <cstdlib>
+#include <filesystem>
+#include <thread>
+#include <utility>
+
+#include "host/support/glib_ptr.h"
+
+namespace vaelo {
+
+namespace {
+
+namespace fs = std::filesystem;
+
+constexpr rlim_t MostWritten = 512 * 1024 * 1024;  // bytes of a file
+
+std::string program() {
+  for (const char* name : {"soffice", "libreoffice"}) {
+    const std::string found = takeString(g_find_program_in_path(name));
+    if (!found.empty()) return found;
+  }
+  return "";
+}
+
+// In the child, before it becomes the office suite, whose processes all belong to one group then.
+void prepareChild(gpointer) {
+  ::setpgid(0, 0);
+  ::prctl(PR_SET_PDEATHSIG, SIGKILL);
+  const rlimit written = {MostWritten, MostWritten};
+  ::setrlimit(RLIMIT_FSIZE, &written);
+}
+
+std::string portableDocumentIn(const std::string& folder) {
+  std::error_code problem;
+  for (const fs::directory_entry& entry : fs::directory_iterator(folder, problem)) {
+    if (entry.path().extension() == ".pdf" && entry.is_regular_file(problem)) return entry.path();
+  }
+  return "";
+}
+
+}  // namespace
+
+/// Lives as long as the process or the object, whichever is longer, since the folder can't go before.
+struct OfficeConversion::State {
+  std::string folder;
+  GRef<GSubprocess> process;
+  pid_t group = 0;                         // zero when the process has ended
+  OfficeConversion* conversion = nullptr;  // null when it is gone, or has its result
+
+  State() {
+    std::string pattern = takeString(g_build_filename(g_get_tmp_dir(), "vaelo-office-XXXXXX", nullptr));
+    if (::mkdtemp(pattern.data())) folder = pattern;
+  }
+
+  // A profile is hundreds of files.
+  ~State() {
+    if (folder.empty()) return;
+    std::thread([gone = std::move(folder)] {
+      std::error_code ignored;
+      fs::remove_all(gone, ignored);
+    }).detach();
+  }
+
+  State(const State&) = delete;
+  State& operator=(const State&) = delete;
+
+  bool start(const std::string& path) {
+    if (folder.empty()) return false;
+    const GRef<GSubprocessLauncher> launcher(g_subprocess_launcher_new(
+        static_cast<GSubprocessFlags>(G_SUBPROCESS_FLAGS_STDOUT_SILENCE | G_SUBPROCESS_FLAGS_STDERR_SILENCE)));
+    g_subprocess_launcher_set_child_setup(launcher.get(), prepareChild, nullptr, nullptr);
+    g_subprocess_launcher_set_cwd(launcher.get(), folder.c_str());
+    g_subprocess_launcher_setenv(launcher.get(), "TMPDIR", folder.c_str(), TRUE);
+    const std::string profile = "-env:UserInstallation=file://" + folder + "/profile";
+    const std::string out = folder + "/out";
+    process.reset(g_subprocess_launcher_spawn(launcher.get(), nullptr, program().c_str(), profile.c_str(), "--headless",
+                                              "--norestore", "--nolockcheck", "--convert-to", "pdf", "--outdir", out.c_str(),
+                                              path.c_str(), nullptr));
+    if (!process) return false;
+    group = static_cast<pid_t>(std::atoi(g_subprocess_get_identifier(process.get())));
+    return true;
+  }
+
+  void stop() {
+    if (group > 0) ::kill(-group, SIGKILL);
+  }
+};
+
+OfficeConversion::OfficeConversion(const std::string& path, Done done, std::chrono::milliseconds limit)
+    : state_(std::make_shared<State>()), done_(std::move(done)) {
+  state_->conversion = this;
+  const bool started = state_->start(path);
+  timer_ = g_timeout_add(
+      started ? static_cast<guint>(limit.count()) : 0,
+      +[](gpointer data) -> gboolean {
+        auto* self = static_cast<OfficeConversion*>(data);
+        self->timer_ = 0;
+        self->finish(self->state_->process ? Problem::TooSlow : Problem::Failed);
+        return G_SOURCE_REMOVE;
+      },
+      this);
+  if (!started) return;
+  g_subprocess_wait_async(
+      state_->process.get(), nullptr,
+      +[](GObject* process, GAsyncResult* result, gpointer data) {
+        const std::unique_ptr<std::shared_ptr<State>> kept(static_cast<std::shared_ptr<State>*>(data));
+        State& state = **kept;
+        g_subprocess_wait_finish(G_SUBPROCESS(process), result, nullptr);
+        state.group = 0;
+        if (state.conversion) state.conversion->finish(Problem::None);
+      },
+      new std::shared_ptr<State>(state_));
+}
+
+OfficeConversion::~OfficeConversion() {
+  g_clear_handle_id(&timer_, g_source_remove);
+  state_->conversion = nullptr;
+  state_->stop();
+}
+
+void OfficeConversion::finish(Problem problem) {
+  g_clear_handle_id(&timer_, g_source_remove);
+  state_->conversion = nullptr;
+  state_->stop();
+  const std::string document = problem == Problem::None ? portableDocumentIn(state_->folder + "/out") : "";
+  const Done done = std::move(done_);
+  done(document, document.empty() && problem == Problem::None ? Problem::Failed : problem);
+}
+
+bool OfficeConversion::isAvailable() { return !program().empty(); }
+
+}  // namespace vaelo
