@@ -22,8 +22,8 @@ void NavController::beginEditMode(const BarButtonItemRef&) {
 void NavController::endEditMode(const BarButtonItemRef&) {
   VLO_USER_ACTION("Pressed Cancel (end edit)");
   const DocumentListControllerRef list = getTopDocumentListController();
-  const std::vector<URL> selected = list ? list->selectedItems() : std::vector<URL>();
-  VLO_DEBUG("EndEditMode.  Selected %d items: %@", selected.size(), selected);
+  VLO_DEBUG("EndEditMode.  Selected %d items: %@", list ? list->selectedItemCount() : 0,
+            list ? list->selectedItems() : std::vector<URL>());
   setEditModeAndUpdateUIForViewController(false, list);
 }
 
@@ -32,10 +32,9 @@ void NavController::selectAllItems(const BarButtonItemRef&) {
   VLO_INFO("Pressed SelectAll");
   const DocumentListControllerRef list = getTopDocumentListController();
   if (!list) return;
-  const std::vector<URL> all = list->containedItems().all();
-  VLO_DEBUG("DLC has %d contained items", all.size());
-  list->setSelectedItems(all);
-  VLO_DEBUG("Selected all %d: %@", all.size(), all);
+  VLO_DEBUG("DLC has %d contained items", list->containedItems().size());
+  list->selectAllItems();
+  VLO_DEBUG("Selected all %d: %@", list->selectedItemCount(), list->selectedItems());
 }
 
 void NavController::setEditModeAndUpdateUIForViewController(bool edit, const DocumentListControllerRef& list) {

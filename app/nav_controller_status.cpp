@@ -46,7 +46,7 @@ void NavController::documentListControllerItemsChanged(const DocumentListControl
   pickerIsAlive_ = true;
   if (list != getTopDocumentListController()) return;
   if (editMode_) {
-    VLO_DEBUG("DLC selected item count is %{public}@", list->selectedItems().size());
+    VLO_DEBUG("DLC selected item count is %{public}@", list->selectedItemCount());
   } else if (list->containedItems().size() != lastLoggedCount) {
     lastLoggedCount = list->containedItems().size();
     VLO_DEBUG("DLC items changed, count is %{public}@", lastLoggedCount);
@@ -64,7 +64,7 @@ void NavController::updateStatusUI(DocumentListControllerRef list) {
   }
   if (!editMode_) return;
   Formatting& formatting = Platform::current().formatting;
-  const std::size_t selected = list->selectedItems().size();
+  const std::size_t selected = list->selectedItemCount();
   list->navigationItem().setTitle(
       selected > 0 ? formatting.localizedCount(".DICT.ITEMS_SELECTED.%d", static_cast<std::int64_t>(selected))
                    : formatting.localizedString("Select Items"));

@@ -66,9 +66,9 @@ void FolderListScreen::build() {
   events.itemsChanged = [this] { reportItems(); };
   events.folderRemoved = [this] { folderWasRemoved(); };
   events.selectionChanged = [this] {
-    std::vector<URL> urls;
-    for (const std::string& name : view_->selection()) urls.push_back(urlOf(name));
-    setSelectedItems(urls);
+    // Rows that went took their selection along before they were reported.
+    if (reportedRevision_ != view_->model().revision()) reportItems();
+    userSelected(view_->model().selectedRows());
   };
   events.contextRequested = [this](const std::string& name, GtkWidget* over, const GdkRectangle& at) {
     offerActions(urlOf(name), over, at);
@@ -82,10 +82,8 @@ void FolderListScreen::build() {
 
 void FolderListScreen::followEditing(DocumentListChange change) {
   if (change == DocumentListChange::Editing) view_->setEditing(editing());
-  if (change != DocumentListChange::Selection || !editing()) return;
-  std::vector<std::string> names;
-  for (const URL& url : selectedItems()) names.push_back(nameOf(url));
-  if (names != view_->selection()) view_->setSelection(names);
+  if (change != DocumentListChange::Selection && change != DocumentListChange::Items) return;
+  if (editing() && reportedRevision_ == view_->model().revision()) view_->setSelectedRows(selection());
 }
 
 void FolderListScreen::offerActions(const URL& url, GtkWidget* over, const GdkRectangle& at) {
@@ -108,15 +106,47 @@ URL FolderListScreen::urlOf(const std::string& name) const { return presentedURL
 
 std::vector<std::string> FolderListScreen::searchedFolders() const { return {presentedURL()->path()}; }
 
-void FolderListScreen::reportItems() { itemsLoaded(shownItems()); }
+void FolderListScreen::reportItems() {
+  reportedRevision_ = view_->model().revision();
+  itemsLoaded(shownItems());
+}
+
+ItemHint FolderListScreen::hintFor(EntryKind kind, std::string_view name) {
+  switch (kind) {
+    case EntryKind::Folder:
+      return name == "Desktop" || name == "Documents" ? ItemHint::Unknown : ItemHint::Folder;
+    case EntryKind::Package:
+    case EntryKind::Document:
+    case EntryKind::Promise:
+    case EntryKind::PromisedPackage:
+      return ItemHint::Document;
+    case EntryKind::FolderLink:
+    case EntryKind::Symlink:
+    case EntryKind::Alias:
+    case EntryKind::Bookmark:
+      break;
+  }
+  return ItemHint::Unknown;
+}
 
 URLList FolderListScreen::shownItems() {
   const auto snapshot = view_->model().snapshot();
   const URL folder = *presentedURL();
+  const auto indexOf = [snapshot, start = folder.path() + "/"](const URL& url,
+                                                               std::size_t guess) -> std::optional<std::size_t> {
+    const std::string_view path = url.path();
+    if (!path.starts_with(start)) return std::nullopt;
+    const std::string_view name = path.substr(start.size());
+    if (guess < snapshot->size() && snapshot->name(guess) == name) return guess;
+    return name.find('/') == std::string_view::npos ? snapshot->indexOf(name) : std::nullopt;
+  };
+  URLList::Hint hint;
+  // Outside of a library the folder may be the one that holds them.
+  if (drive_.containerForURL(folder).value) {
+    hint = [snapshot](std::size_t i) { return hintFor(snapshot->kind(i), snapshot->name(i)); };
+  }
   return {snapshot->size(), [snapshot, folder](std::size_t i) { return folder.appendingPathComponent(snapshot->name(i)); },
-          [snapshot, folder](const URL& url) {
-            return url.deletingLastPathComponent() == folder ? snapshot->indexOf(url.lastPathComponent()) : std::nullopt;
-          }};
+          indexOf, hint};
 }
 
 void FolderListScreen::activated(FolderView& view, const std::string& name, const URL& url) {

@@ -33,13 +33,13 @@ class FolderListScreen : public DocumentListController, public HostScreen {
   virtual void fill();
   /// The URL that a row's name stands for.
   virtual URL urlOf(const std::string& name) const;
-  /// The name of the row that stands for an item of this list.
-  virtual std::string nameOf(const URL& url) const { return url.lastPathComponent(); }
   /// The items of all rows, in their order.
   virtual URLList shownItems();
   /// Where a search looks.
   virtual std::vector<std::string> searchedFolders() const;
   void reportItems();
+  /// What the list knows of an entry of a folder within a library.
+  static ItemHint hintFor(EntryKind kind, std::string_view name);
   CloudDocuments& drive() const { return drive_; }
 
  private:
@@ -61,6 +61,7 @@ class FolderListScreen : public DocumentListController, public HostScreen {
   GtkWidget* searchEntry_ = nullptr;
   GtkWidget* stack_ = nullptr;
   std::vector<FolderEntry> found_;
+  unsigned reportedRevision_ = 0;  ///< of the rows that reportItems() told last
   FolderSearch folderSearch_;
   std::shared_ptr<SearchController> search_;
   std::shared_ptr<void> queryToken_;

@@ -62,9 +62,18 @@ std::vector<FolderEntry> RootListScreen::libraries() const {
 }
 
 URLList RootListScreen::shownItems() {
-  std::vector<URL> items;
-  for (std::size_t i = 0; i < folderView().itemCount(); ++i) items.push_back(URL(folderView().nameAt(i)));
-  return items;
+  const std::shared_ptr<const FolderEntries> entries = folderView().model().entries();
+  if (!entries) return {};
+  const auto indexOf = [entries](const URL& url, std::size_t guess) -> std::optional<std::size_t> {
+    if (guess < entries->size() && (*entries)[guess].path == url.path()) return guess;
+    return entries->indexOf(url.path());
+  };
+  const auto hint = [entries, start = presentedURL()->path() + "/"](std::size_t i) {
+    const FolderEntry& entry = (*entries)[i];
+    if (!entry.path.starts_with(start)) return ItemHint::Unknown;  // the top of a library
+    return hintFor(entry.kind, std::string_view(entry.path).substr(start.size()));
+  };
+  return {entries->size(), [entries](std::size_t i) { return URL((*entries)[i].path); }, indexOf, hint};
 }
 
 std::vector<std::string> RootListScreen::searchedFolders() const {

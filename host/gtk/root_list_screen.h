@@ -17,7 +17,6 @@ class RootListScreen : public FolderListScreen {
  protected:
   void fill() override;
   URL urlOf(const std::string& name) const override { return URL(name); }
-  std::string nameOf(const URL& url) const override { return url.path(); }
   URLList shownItems() override;
   std::vector<std::string> searchedFolders() const override;
 

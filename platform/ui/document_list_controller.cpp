@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "platform/ui/document_list_controller.h"
 
+#include <numeric>
 #include <utility>
 
 #include "platform/ui/search_controller.h"
@@ -14,10 +15,45 @@ DocumentListController::~DocumentListController() = default;
 
 DocumentListControllerRef DocumentListController::self() { return sharedSelf(this); }
 
-void DocumentListController::setSelectedItems(const std::vector<URL>& items) {
-  std::vector<URL> selected = containedItems_.thoseOf(items);
-  if (selected == selectedItems_) return;
-  selectedItems_ = std::move(selected);
+const std::vector<URL>& DocumentListController::selectedItems() const {
+  if (!selectedItems_) {
+    selectedItems_.emplace();
+    selectedItems_->reserve(selection_.size());
+    for (const std::size_t place : selection_) selectedItems_->push_back(containedItems_[place]);
+  }
+  return *selectedItems_;
+}
+
+std::vector<URL> DocumentListController::selectedItemsUnless(const std::function<bool(ItemHint)>& isKnown) const {
+  std::vector<URL> items;
+  for (const std::size_t place : selection_) {
+    if (!isKnown(containedItems_.hint(place))) items.push_back(containedItems_[place]);
+  }
+  return items;
+}
+
+std::vector<URL> DocumentListController::selectedItemsThatMayBeFolders() const {
+  return selectedItemsUnless([](ItemHint hint) { return hint == ItemHint::Document; });
+}
+
+std::vector<URL> DocumentListController::selectedItemsThatMayBeSpecial() const {
+  return selectedItemsUnless([](ItemHint hint) { return hint != ItemHint::Unknown; });
+}
+
+void DocumentListController::setSelectedItems(const std::vector<URL>& items) { select(containedItems_.placesOf(items)); }
+
+void DocumentListController::selectAllItems() {
+  std::vector<std::size_t> places(containedItems_.size());
+  std::iota(places.begin(), places.end(), std::size_t{0});
+  select(std::move(places));
+}
+
+void DocumentListController::userSelected(std::vector<std::size_t> places) { select(std::move(places)); }
+
+void DocumentListController::select(std::vector<std::size_t> places) {
+  if (places == selection_) return;
+  selection_ = std::move(places);
+  selectedItems_.reset();
   listChanged_.emit(*this, DocumentListChange::Selection);
   if (const auto told = delegate()) told->documentListControllerItemsChanged(self());
 }
@@ -25,8 +61,9 @@ void DocumentListController::setSelectedItems(const std::vector<URL>& items) {
 void DocumentListController::setEditingAnimated(bool editing, bool) {
   if (editing_ == editing) return;
   editing_ = editing;
-  if (!editing && !selectedItems_.empty()) {
-    selectedItems_.clear();
+  if (!editing && !selection_.empty()) {
+    selection_.clear();
+    selectedItems_.reset();
     listChanged_.emit(*this, DocumentListChange::Selection);
   }
   listChanged_.emit(*this, DocumentListChange::Editing);
@@ -66,8 +103,10 @@ std::shared_ptr<void> DocumentListController::attachment(const std::string& key)
 }
 
 void DocumentListController::itemsLoaded(URLList items) {
+  const std::vector<URL> selected = selectedItems();
   containedItems_ = std::move(items);
-  selectedItems_ = containedItems_.thoseOf(selectedItems_);
+  selection_ = containedItems_.placesOf(selected);
+  selectedItems_.reset();
   listChanged_.emit(*this, DocumentListChange::Items);
   if (const auto told = delegate()) told->documentListControllerItemsChanged(self());
 }

@@ -52,6 +52,22 @@ TEST_F(MenuEnableChecksTest, NothingSelectedAllowsNothing) {
   EXPECT_FALSE(mayDelete(Drive, {}));
 }
 
+// Selecting all of 100,000 items asked the disk about each of them, four times.
+TEST_F(MenuEnableChecksTest, ItemsThatTheListKnowsAreNotLookedAt) {
+  const URL desktop = addFolder("Desktop");
+  const auto list = std::make_shared<DocumentListController>(Drive);
+  ItemHint hint = ItemHint::Document;
+  list->itemsLoaded(URLList(
+      1, [&desktop](std::size_t) { return desktop; }, [](const URL&, std::size_t) { return std::optional<std::size_t>(0); },
+      [&hint](std::size_t) { return hint; }));
+  list->selectAllItems();
+  EXPECT_TRUE(MenuEnableChecks::canShowMoveForSelectedItems(*list)) << "it was told that this is a document";
+  EXPECT_TRUE(MenuEnableChecks::canShowDeleteForSelectedItems(*list));
+  hint = ItemHint::Unknown;
+  EXPECT_FALSE(MenuEnableChecks::canShowMoveForSelectedItems(*list));
+  EXPECT_FALSE(MenuEnableChecks::canShowDeleteForSelectedItems(*list));
+}
+
 TEST_F(MenuEnableChecksTest, TheDesktopAndDocumentsFoldersStay) {
   const URL desktop = addFolder("Desktop");
   const URL file = addFile("a.txt");

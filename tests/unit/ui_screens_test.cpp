@@ -337,6 +337,32 @@ TEST_F(DocumentListTest, SelectionFollowsTheItems) {
   EXPECT_EQ(told->itemsChanged, 3);
 }
 
+TEST_F(DocumentListTest, AllIsSelectedByPlacesAndReportedOnce) {
+  list->itemsLoaded({a, b});
+  told->itemsChanged = 0;
+  list->selectAllItems();
+  list->userSelected({0, 1});
+  EXPECT_EQ(told->itemsChanged, 1);
+  EXPECT_EQ(list->selectedItemCount(), 2u);
+  EXPECT_THAT(list->selectedItems(), ElementsAre(a, b));
+  list->userSelected({1});
+  EXPECT_THAT(list->selectedItems(), ElementsAre(b));
+  EXPECT_THAT(list->selection(), ElementsAre(1u));
+}
+
+TEST_F(DocumentListTest, SelectedItemsOfWhichEnoughIsKnownNeedNoLook) {
+  const std::vector<URL> items{a, b, URL("/drive/c")};
+  constexpr ItemHint hints[] = {ItemHint::Document, ItemHint::Folder, ItemHint::Unknown};
+  list->itemsLoaded(URLList(
+      3, [items](std::size_t i) { return items[i]; }, [](const URL&, std::size_t guess) { return std::optional(guess); },
+      [&hints](std::size_t i) { return hints[i]; }));
+  list->selectAllItems();
+  EXPECT_THAT(list->selectedItemsThatMayBeFolders(), ElementsAre(b, items[2]));
+  EXPECT_THAT(list->selectedItemsThatMayBeSpecial(), ElementsAre(items[2]));
+  list->userSelected({0});
+  EXPECT_TRUE(list->selectedItemsThatMayBeFolders().empty());
+}
+
 TEST_F(DocumentListTest, LeavingEditingClearsTheSelectionWithoutAReport) {
   list->itemsLoaded({a});
   list->setEditingAnimated(true, true);

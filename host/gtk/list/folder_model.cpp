@@ -140,6 +140,7 @@ FolderModel::~FolderModel() {
 }
 
 void FolderModel::replaceAll(std::size_t before) {
+  ++revision_;
   gtk_bitset_remove_all(selection_);
   // Names of folders and paths of entries are not to be taken for one another.
   live_.clear();
@@ -156,13 +157,14 @@ void FolderModel::setSnapshot(std::shared_ptr<const FolderSnapshot> snapshot) {
 void FolderModel::setEntries(std::vector<FolderEntry> entries) {
   const std::size_t before = itemCount();
   snapshot_ = std::make_shared<FolderSnapshot>();
-  entries_ = std::move(entries);
+  entries_ = std::make_shared<FolderEntries>(std::move(entries));
   replaceAll(before);
 }
 
 void FolderModel::applyChanges(std::shared_ptr<const FolderSnapshot> next, const std::vector<Splice>& splices) {
   GtkBitset* selection = carried(selection_, splices);
   const bool selectionLost = gtk_bitset_get_size(selection) != gtk_bitset_get_size(selection_);
+  ++revision_;
   transition_ = Transition{std::exchange(snapshot_, std::move(next)), std::exchange(selection_, selection), 0, 0};
   for (const auto& [name, object] : live_) {
     if (const auto i = snapshot_->indexOf(name)) folderItemOf(object).kind = snapshot_->kind(*i);
@@ -189,10 +191,7 @@ std::string FolderModel::displayNameAt(std::size_t i) const {
 }
 
 std::optional<std::size_t> FolderModel::indexOf(std::string_view name) const {
-  if (!entries_) return snapshot_->indexOf(name);
-  const auto found = std::find_if(entries_->begin(), entries_->end(), [&](const FolderEntry& e) { return e.path == name; });
-  if (found == entries_->end()) return std::nullopt;
-  return static_cast<std::size_t>(found - entries_->begin());
+  return entries_ ? entries_->indexOf(name) : snapshot_->indexOf(name);
 }
 
 FolderItem* FolderModel::liveItem(std::string_view name) const {
@@ -258,6 +257,20 @@ void FolderModel::select(const std::vector<std::string>& names) {
   for (const std::string& name : names) {
     if (const auto i = indexOf(name)) gtk_bitset_add(wanted, static_cast<guint>(*i));
   }
+  replaceSelection(wanted);
+}
+
+void FolderModel::selectRows(const std::vector<std::size_t>& rows) {
+  GtkBitset* wanted = gtk_bitset_new_empty();
+  for (std::size_t i = 0; i < rows.size() && rows[i] < itemCount();) {
+    const std::size_t first = i++;
+    while (i < rows.size() && rows[i] == rows[i - 1] + 1) ++i;
+    gtk_bitset_add_range(wanted, static_cast<guint>(rows[first]), static_cast<guint>(i - first));
+  }
+  replaceSelection(wanted);
+}
+
+void FolderModel::replaceSelection(GtkBitset* wanted) {
   const bool same = gtk_bitset_equals(wanted, selection_);
   gtk_bitset_unref(std::exchange(selection_, wanted));
   if (!same) tellSelection(0, itemCount());
@@ -265,13 +278,24 @@ void FolderModel::select(const std::vector<std::string>& names) {
 
 std::vector<std::string> FolderModel::selectedNames() const {
   std::vector<std::string> names;
+  forEachSelected([&](guint position) { names.emplace_back(nameAt(position)); });
+  return names;
+}
+
+std::vector<std::size_t> FolderModel::selectedRows() const {
+  std::vector<std::size_t> rows;
+  rows.reserve(gtk_bitset_get_size(selection_));
+  forEachSelected([&](guint position) { rows.push_back(position); });
+  return rows;
+}
+
+void FolderModel::forEachSelected(const std::function<void(guint)>& visit) const {
   GtkBitsetIter iter;
   guint position = 0;
   for (bool more = gtk_bitset_iter_init_first(&iter, selection_, &position); more;
        more = gtk_bitset_iter_next(&iter, &position)) {
-    names.emplace_back(nameAt(position));
+    visit(position);
   }
-  return names;
 }
 
 bool FolderModel::selectRange(guint position, guint count, bool only) {

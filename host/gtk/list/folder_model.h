@@ -11,18 +11,11 @@
 #include <unordered_map>
 #include <vector>
 
+#include "host/gtk/list/folder_entries.h"
 #include "host/gtk/list/folder_item.h"
 #include "host/gtk/list/folder_snapshot.h"
 
 namespace vaelo {
-
-/// An entry that a caller supplies instead of a folder.
-struct FolderEntry {
-  std::string displayName;  ///< UTF-8, shown as it is
-  std::string path;         ///< absolute, bytes; names the entry in all calls
-  EntryKind kind = EntryKind::Document;
-  std::string icon;  ///< the name of an icon; empty for that of the kind
-};
 
 /// The rows of a list and which of them are selected: a snapshot, and objects made of it on demand. Main thread.
 ///
@@ -49,6 +42,10 @@ class FolderModel {
   void applyChanges(std::shared_ptr<const FolderSnapshot> next, const std::vector<Splice>& splices);
 
   const std::shared_ptr<const FolderSnapshot>& snapshot() const { return snapshot_; }
+  /// What setEntries() gave; null for a folder.
+  const std::shared_ptr<const FolderEntries>& entries() const { return entries_; }
+  /// Another number whenever the rows are others, or stand elsewhere.
+  unsigned revision() const { return revision_; }
   std::size_t itemCount() const;
   /// Valid until the next change.
   std::string_view nameAt(std::size_t i) const;
@@ -63,8 +60,11 @@ class FolderModel {
   void setSelected(std::size_t i, bool selected);
   /// Replaces the selection; names that are not listed are ignored.
   void select(const std::vector<std::string>& names);
+  /// The same for rows, ascending.
+  void selectRows(const std::vector<std::size_t>& rows);
   /// In the order of the list.
   std::vector<std::string> selectedNames() const;
+  std::vector<std::size_t> selectedRows() const;
   void setSelectable(bool selectable) { selectable_ = selectable; }
   /// Called after the selection changed, whoever changed it.
   void onSelectionChanged(std::function<void()> handler) { selectionChanged_ = std::move(handler); }
@@ -87,12 +87,15 @@ class FolderModel {
   };
 
   void replaceAll(std::size_t before);
+  void replaceSelection(GtkBitset* wanted);
+  void forEachSelected(const std::function<void(guint)>& visit) const;
   void tellSelection(std::size_t first, std::size_t count);
   std::size_t inOld(guint position) const { return transition_->oldStart + (position - transition_->newEnd); }
 
   GObject* object_;
   std::shared_ptr<const FolderSnapshot> snapshot_;
-  std::optional<std::vector<FolderEntry>> entries_;
+  std::shared_ptr<const FolderEntries> entries_;
+  unsigned revision_ = 0;
   std::unordered_map<std::string_view, GObject*> live_;  // keys are the items' own names
   GtkBitset* selection_;
   bool selectable_ = false;

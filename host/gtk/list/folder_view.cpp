@@ -168,6 +168,12 @@ void FolderView::setSelection(const std::vector<std::string>& names) {
   settingSelection_ = false;
 }
 
+void FolderView::setSelectedRows(const std::vector<std::size_t>& rows) {
+  settingSelection_ = true;
+  model_.selectRows(rows);
+  settingSelection_ = false;
+}
+
 void FolderView::redrawRows() {
   for (GtkWidget* row : context_.rows) gtk_widget_queue_draw(row);
 }

@@ -81,6 +81,8 @@ class FolderView {
   bool loaded() const { return loaded_; }
   std::vector<std::string> selection() const { return model_.selectedNames(); }
   void setSelection(const std::vector<std::string>& names);
+  /// The same for rows, ascending.
+  void setSelectedRows(const std::vector<std::size_t>& rows);
 
   /// Brings the row on screen; false when it isn't listed.
   bool scrollTo(const std::string& name);
