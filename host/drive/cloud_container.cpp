@@ -1,11 +1,11 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/drive/cloud_container.h"
 
-#include <fts.h>
+#include <dirent.h>
 #include <sys/stat.h>
+#include <unistd.h>
 
 #include <cerrno>
-#include <cstdio>
 #include <memory>
 
 #include "host/drive/small_file.h"
@@ -35,11 +35,12 @@ std::string displayName(const std::string& identifier) {
 
 }  // namespace
 
-CloudContainerRef LocalContainer::read(const DriveLayout& layout, const std::string& identifier, LogSink& log) {
+CloudContainerRef LocalContainer::read(const DriveLayout& layout, const std::string& identifier, LogSink& log,
+                                       TreeRemovals& removals) {
   if (!isIdentifier(identifier)) return nullptr;
   const std::string folder = layout.containerFolder(identifier);
   if (!isFolder(folder)) return nullptr;
-  std::shared_ptr<LocalContainer> container(new LocalContainer);
+  std::shared_ptr<LocalContainer> container(new LocalContainer(removals));
   container->identifier_ = identifier;
   container->folder_ = folder;
   container->localizedName_ = displayName(identifier);
@@ -74,19 +75,24 @@ void LocalContainer::readManifest(const std::string& path, LogSink& log) {
 }
 
 std::optional<Error> LocalContainer::deleteAllContents() {
-  std::string root = folder_;
-  char* const roots[] = {root.data(), nullptr};
-  const std::unique_ptr<FTS, int (*)(FTS*)> walk(::fts_open(roots, FTS_PHYSICAL | FTS_NOCHDIR | FTS_NOSTAT, nullptr),
-                                                 ::fts_close);
-  if (!walk) return errorFromErrno(errno, folder_, FileAccess::Write);
-  const std::string manifest = folder_ + "/" + ContainerManifestName;
+  std::optional<Error> first = removeEntriesOf(folder_);
+  if (!documentsFolder_ || documentsFolder_->path() == folder_) return first;
+  std::optional<Error> second = removeEntriesOf(documentsFolder_->path());
+  return first ? first : second;
+}
+
+std::optional<Error> LocalContainer::removeEntriesOf(const std::string& folder) {
+  const std::unique_ptr<DIR, int (*)(DIR*)> stream(::opendir(folder.c_str()), ::closedir);
+  if (!stream) return errorFromErrno(errno, folder, FileAccess::Write);
+  std::vector<std::string> paths;
+  while (const dirent* entry = ::readdir(stream.get())) {
+    const std::string name = entry->d_name;
+    if (name != "." && name != "..") paths.push_back(folder + "/" + name);
+  }
   std::optional<Error> first;
-  while (const FTSENT* entry = ::fts_read(walk.get())) {
-    const std::string path = entry->fts_path;
-    if (entry->fts_info == FTS_D || entry->fts_level == FTS_ROOTLEVEL) continue;
-    if (path == manifest || (documentsFolder_ && path == documentsFolder_->path())) continue;
-    const bool unreadable = entry->fts_info == FTS_ERR || entry->fts_info == FTS_DNR;
-    const int number = unreadable ? entry->fts_errno : ::remove(path.c_str()) == 0 ? 0 : errno;
+  for (const std::string& path : paths) {
+    if (path == folder_ + "/" + ContainerManifestName || (documentsFolder_ && path == documentsFolder_->path())) continue;
+    const int number = isFolder(path) ? removals_.remove(path) : ::unlink(path.c_str()) == 0 ? 0 : errno;
     if (number != 0 && number != ENOENT && !first) first = errorFromErrno(number, path, FileAccess::Write);
   }
   return first;

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "host/drive/drive_layout.h"
+#include "host/files/tree_removals.h"
 #include "platform/cloud_documents.h"
 #include "platform/logging.h"
 
@@ -14,7 +15,9 @@ class LocalContainer : public CloudContainer {
  public:
   /// Reads a container; null when there is no folder of that name (a link is none). One whose manifest is absent is called
   /// by its identifier, and so is one whose manifest is broken, which the log tells.
-  static CloudContainerRef read(const DriveLayout& layout, const std::string& identifier, LogSink& log);
+  /// `removals` outlives it.
+  static CloudContainerRef read(const DriveLayout& layout, const std::string& identifier, LogSink& log,
+                                TreeRemovals& removals);
 
   std::string identifier() const override { return identifier_; }
   std::string localizedName() const override { return localizedName_; }
@@ -26,9 +29,12 @@ class LocalContainer : public CloudContainer {
   std::optional<Error> deleteAllContents() override;
 
  private:
-  LocalContainer() = default;
+  explicit LocalContainer(TreeRemovals& removals) : removals_(removals) {}
   void readManifest(const std::string& path, LogSink& log);
 
+  std::optional<Error> removeEntriesOf(const std::string& folder);
+
+  TreeRemovals& removals_;
   std::string identifier_;
   std::string folder_;
   std::string localizedName_;

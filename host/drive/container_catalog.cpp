@@ -65,7 +65,7 @@ CloudContainerRef ContainerCatalog::containerLocked(const std::string& identifie
       isUnchanged(known->second.manifest, manifestNow)) {
     return known->second.container;
   }
-  CloudContainerRef read = LocalContainer::read(layout_, identifier, log_);
+  CloudContainerRef read = LocalContainer::read(layout_, identifier, log_, removals_);
   if (read) {
     entries_[identifier] = {read, folderNow, manifestNow};
   } else {

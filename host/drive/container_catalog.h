@@ -15,7 +15,9 @@ namespace vaelo {
 /// mirror, a container or its manifest changes, so a call costs three of them for each container. Safe from any thread.
 class ContainerCatalog {
  public:
-  ContainerCatalog(const DriveLayout& layout, LogSink& log) : layout_(layout), log_(log) {}
+  /// All outlive it and the containers.
+  ContainerCatalog(const DriveLayout& layout, LogSink& log, TreeRemovals& removals)
+      : layout_(layout), log_(log), removals_(removals) {}
 
   /// Null when there is none.
   CloudContainerRef container(const std::string& identifier);
@@ -40,6 +42,7 @@ class ContainerCatalog {
 
   const DriveLayout& layout_;
   LogSink& log_;
+  TreeRemovals& removals_;
   std::mutex mutex_;
   std::map<std::string, Entry> entries_;  // guarded by mutex_
   std::vector<std::string> identifiers_;  // guarded by mutex_

@@ -62,7 +62,8 @@ LocalCloudDocuments::LocalCloudDocuments(const std::string& dataFolder, LogSink&
     : layout_(dataFolder),
       setUpFailure_(setUp(layout_, log)),
       account_(layout_, log, queues, notifications),
-      containers_(layout_, log),
+      removals_(layout_.mirrorRoot() + "/.vaelo/removing", log, queues),
+      containers_(layout_, log, removals_),
       index_(layout_, log,
              [&queues, &notifications] {
                queues.main().async([&notifications] { notifications.post({DocumentIndexRebuiltNotification, {}}); });

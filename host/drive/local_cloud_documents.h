@@ -40,6 +40,7 @@ class LocalCloudDocuments : public CloudDocuments {
   /// Why the first start could not make the account, if so.
   const std::optional<Error>& setUpFailure() const { return setUpFailure_; }
   DocumentIndex& index() { return index_; }
+  TreeRemovals& removals() { return removals_; }
 
   std::optional<UbiquityIdentityToken> ubiquityIdentityToken() override;
   std::string defaultContainerIdentifier() override;
@@ -72,6 +73,7 @@ class LocalCloudDocuments : public CloudDocuments {
   DriveLayout layout_;
   std::optional<Error> setUpFailure_;
   Account account_;
+  TreeRemovals removals_;
   ContainerCatalog containers_;
   DocumentIndex index_;
   std::shared_ptr<OperationQueue> workers_;  // last, so that it ends before what its operations use

@@ -71,7 +71,10 @@ std::optional<Error> LocalFileManager::createDirectoryAtURL(const URL& url) {
 std::optional<Error> LocalFileManager::removeItemAtURL(const URL& url) {
   const std::optional<std::string> physical = physicalPathOf(url.path());
   if (!physical) return describedError(ENOENT, url.path(), FileAccess::Write);
-  return removeTree(*physical);
+  struct stat info {};
+  if (!removals_ || lstat(physical->c_str(), &info) != 0 || !S_ISDIR(info.st_mode)) return removeTree(*physical);
+  if (const int number = removals_->remove(*physical)) return describedError(number, url.path(), FileAccess::Write);
+  return std::nullopt;
 }
 
 std::optional<Error> LocalFileManager::moveItemAtURL(const URL& source, const URL& destination) {
@@ -85,7 +88,7 @@ std::optional<Error> LocalFileManager::moveItemAtURL(const URL& source, const UR
     if (rename(from->c_str(), taken->c_str()) != 0) return moveError(errno, source.path(), to);
     return std::nullopt;
   }
-  return isPromiseName(URL(*from).lastPathComponent()) ? movePromise(*from, to) : moveFile(*from, to);
+  return isPromiseName(URL(*from).lastPathComponent()) ? movePromise(*from, to) : moveFile(*from, to, removals_);
 }
 
 void LocalFileManager::enumerate(const URL& url, const std::vector<ResourceKey>&, unsigned options,

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include "host/files/tree_removals.h"
 #include "platform/file_manager.h"
 
 namespace vaelo {
@@ -8,6 +9,8 @@ namespace vaelo {
 /// The file system of this machine. An item that is not downloaded is moved and removed with its promise.
 class LocalFileManager : public FileManager {
  public:
+  /// Folders that are removed go through `removals`, which outlives it; without, they are removed on the spot.
+  explicit LocalFileManager(TreeRemovals* removals = nullptr) : removals_(removals) {}
   bool fileExistsAtPath(const std::string& path, bool* isDirectory = nullptr) override;
   Result<FileAttributes> attributesOfItemAtPath(const std::string& path) override;
   Result<std::string> destinationOfSymbolicLinkAtPath(const std::string& path) override;
@@ -19,6 +22,9 @@ class LocalFileManager : public FileManager {
                  const std::function<bool(const URL&, const Error&)>& onError) override;
   std::vector<std::string> userDocumentsDirectories() override;
   std::string expandingTilde(const std::string& path) override;
+
+ private:
+  TreeRemovals* removals_;
 };
 
 }  // namespace vaelo

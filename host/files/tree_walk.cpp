@@ -100,26 +100,59 @@ class Walk {
   const std::function<bool(const URL&, const Error&)>& onError_;
 };
 
+/// Opens a folder to empty it. One of ours may lack the permission, which its owner can give.
+UniqueFd openToEmpty(int parent, const std::string& name) {
+  UniqueFd folder(openat(parent, name.c_str(), FolderFlags));
+  if (!folder && errno == EACCES) {
+    if (fchmodat(parent, name.c_str(), S_IRWXU, 0) == 0) {
+      folder = UniqueFd(openat(parent, name.c_str(), FolderFlags));
+    } else {
+      errno = EACCES;
+    }
+  }
+  return folder;
+}
+
+/// 0 or errno.
+int removeEntry(int parent, const std::string& name, int flags) {
+  if (unlinkat(parent, name.c_str(), flags) == 0) return 0;
+  if (errno != EACCES || fchmod(parent, S_IRWXU) != 0) return errno;
+  return unlinkat(parent, name.c_str(), flags) == 0 ? 0 : errno;
+}
+
 /// Empties the open folder; answers 0 or errno.
-int emptyFolder(UniqueFd folder) {
+int emptyFolder(UniqueFd folder, const std::function<bool()>& goOn) {
   const UniqueFd keeper(dup(folder.get()));
   if (!keeper) return errno;
   const auto entries = readEntries(std::move(folder));
   if (!entries) return errno;
   for (const Entry& entry : *entries) {
+    if (!goOn()) return ECANCELED;
     if (entry.isFolder) {
-      UniqueFd child(openat(keeper.get(), entry.name.c_str(), FolderFlags));
+      UniqueFd child = openToEmpty(keeper.get(), entry.name);
       if (child) {
-        if (const int failure = emptyFolder(std::move(child))) return failure;
+        if (const int failure = emptyFolder(std::move(child), goOn)) return failure;
       } else if (errno != ELOOP && errno != ENOTDIR) {
         return errno;
       }
     }
-    if (unlinkat(keeper.get(), entry.name.c_str(), entry.isFolder ? AT_REMOVEDIR : 0) == 0 || errno == ENOENT) continue;
+    int number = removeEntry(keeper.get(), entry.name, entry.isFolder ? AT_REMOVEDIR : 0);
     // Somebody put a file or a link in the folder's place.
-    if (errno != ENOTDIR || unlinkat(keeper.get(), entry.name.c_str(), 0) != 0) return errno;
+    if (number == ENOTDIR) number = removeEntry(keeper.get(), entry.name, 0);
+    if (number != 0 && number != ENOENT) return number;
   }
   return 0;
+}
+
+void countBelow(UniqueFd folder, const std::function<bool()>& goOn, std::size_t& count) {
+  const UniqueFd keeper(dup(folder.get()));
+  const auto entries = keeper ? readEntries(std::move(folder)) : std::nullopt;
+  if (!entries) return;
+  for (const Entry& entry : *entries) {
+    if (!goOn()) return;
+    ++count;
+    if (entry.isFolder) countBelow(UniqueFd(openat(keeper.get(), entry.name.c_str(), FolderFlags)), goOn, count);
+  }
 }
 
 }  // namespace
@@ -131,18 +164,26 @@ void enumerateTree(const URL& url, unsigned options, const std::function<bool(co
 }
 
 std::optional<Error> removeTree(const std::string& path) {
-  struct stat info {};
-  const auto failed = [&path](int number) { return describedError(number, path, FileAccess::Write); };
-  if (lstat(path.c_str(), &info) != 0) return failed(errno);
-  if (!S_ISDIR(info.st_mode)) {
-    if (unlink(path.c_str()) != 0) return failed(errno);
-    return std::nullopt;
-  }
-  UniqueFd folder(open(path.c_str(), FolderFlags));
-  if (!folder) return failed(errno);
-  if (const int number = emptyFolder(std::move(folder))) return failed(number);
-  if (rmdir(path.c_str()) != 0) return failed(errno);
+  const int number = removeTreeWhile(path, [] { return true; });
+  if (number != 0) return describedError(number, path, FileAccess::Write);
   return std::nullopt;
+}
+
+int removeTreeWhile(const std::string& path, const std::function<bool()>& goOn) {
+  struct stat info {};
+  if (lstat(path.c_str(), &info) != 0) return errno;
+  if (!goOn()) return ECANCELED;
+  if (!S_ISDIR(info.st_mode)) return unlink(path.c_str()) == 0 ? 0 : errno;
+  UniqueFd folder = openToEmpty(AT_FDCWD, path);
+  if (!folder) return errno;
+  if (const int number = emptyFolder(std::move(folder), goOn)) return number;
+  return rmdir(path.c_str()) == 0 ? 0 : errno;
+}
+
+std::size_t countTree(const std::string& path, const std::function<bool()>& goOn) {
+  std::size_t count = 1;
+  countBelow(UniqueFd(open(path.c_str(), FolderFlags)), goOn, count);
+  return count;
 }
 
 }  // namespace vaelo
