@@ -12,6 +12,7 @@
 #include "host/drive/promise_file.h"
 #include "host/files/system_error.h"
 #include "host/files/tree_copy.h"
+#include "host/files/tree_removals.h"
 #include "host/files/tree_walk.h"
 #include "host/support/unique_fd.h"
 #include "platform/url.h"
@@ -40,7 +41,8 @@ int renameItem(const std::string& from, const std::string& to) {
   return rename(from.c_str(), to.c_str()) == 0 ? 0 : errno;
 }
 
-int copyThenRemove(const std::string& from, const std::string& to) {
+int copyThenRemove(const std::string& from, const std::string& to, TreeRemovals* removals) {
+  if (const int number = whyNotMovable(from, folderOf(to))) return number;
   char name[48];
   std::snprintf(name, sizeof name, "/.vaelo-move-%08x%08x", g_random_int(), g_random_int());
   const std::string temporary = folderOf(to) + name;
@@ -55,7 +57,7 @@ int copyThenRemove(const std::string& from, const std::string& to) {
   }
   flushFolder(folderOf(to));
   // The item is at its new place, whole; what is left of the old one is not a failure of the move.
-  removeTree(from);
+  if (!removals || !copy.isFolder() || removals->remove(from, true) != 0) removeTree(from);
   return 0;
 }
 
@@ -68,11 +70,11 @@ Error moveError(int number, const std::string& from, const std::string& to) {
   return error;
 }
 
-std::optional<Error> moveFile(const std::string& from, const std::string& to) {
+std::optional<Error> moveFile(const std::string& from, const std::string& to, TreeRemovals* removals) {
   // A mount below the folder would otherwise make it a copy of itself without end.
   if (URL(to).isInside(URL(from))) return moveError(EINVAL, from, to);
   int number = renameItem(from, to);
-  if (number == EXDEV) number = copyThenRemove(from, to);
+  if (number == EXDEV) number = copyThenRemove(from, to, removals);
   if (number != 0) return moveError(number, from, to);
   return std::nullopt;
 }

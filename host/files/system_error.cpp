@@ -4,6 +4,7 @@
 #include <libintl.h>
 
 #include <cerrno>
+#include <climits>
 
 #include "host/support/glib_ptr.h"
 
@@ -24,7 +25,7 @@ const char* wordsFor(int number) {
     case ENOTEMPTY:
       return gettext("An item named “%s” already exists.");
     case ENAMETOOLONG:
-      return gettext("The name “%s” is too long.");
+      return gettext("“%s” lies too deep in its folders.");
     case EILSEQ:
       return gettext("The disk can’t keep the name “%s”.");
     case ENOSPC:
@@ -41,12 +42,33 @@ const char* wordsFor(int number) {
   }
 }
 
+/// For a name of more bytes than a disk keeps; people count characters.
+std::string wordsForLongName(const std::string& name) {
+  std::size_t excess = 0;
+  for (std::size_t length = name.size(); length > NAME_MAX; ++excess) {
+    do --length;
+    while (length > 0 && (static_cast<unsigned char>(name[length]) & 0xC0) == 0x80);
+  }
+  std::string words = ngettext("The name is too long by %s character.", "The name is too long by %s characters.", excess);
+  if (const std::size_t at = words.find("%s"); at != std::string::npos) words.replace(at, 2, std::to_string(excess));
+  return words;
+}
+
 }  // namespace
 
 Error describedError(int number, const std::string& path, FileAccess access) {
   Error error = errorFromErrno(number, path, access);
   if (number == ENOTEMPTY) error.code = FileErrorCode::WriteFileExists;
   if (number == EILSEQ && access == FileAccess::Write) error.code = FileErrorCode::WriteInvalidFileName;
+  if (number == ENAMETOOLONG && access == FileAccess::Write) {
+    // No character of it is wrong, as the words for the other code would have it.
+    error.code = FileErrorCode::WriteUnknown;
+    const std::string bytes = path.substr(path.rfind('/') + 1);
+    if (bytes.size() > NAME_MAX) {
+      error.localizedDescription = wordsForLongName(bytes);
+      return error;
+    }
+  }
   std::string words = wordsFor(number);
   const std::string name = takeString(g_filename_display_basename(path.c_str()));
   // Not printf: a translation must not be able to ask for more than the name.

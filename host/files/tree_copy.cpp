@@ -3,12 +3,15 @@
 
 #include <fcntl.h>
 #include <sys/sendfile.h>
+#include <sys/statvfs.h>
 #include <sys/xattr.h>
 #include <unistd.h>
 
 #include <algorithm>
 #include <cerrno>
 #include <climits>
+#include <cstdint>
+#include <cstring>
 #include <filesystem>
 
 #include "host/support/unique_fd.h"
@@ -44,7 +47,68 @@ int copyLink(const std::string& from, const std::string& to) {
   return symlink(target, to.c_str()) == 0 ? 0 : errno;
 }
 
+/// 0 when both have the same bytes, else EIO or the error number.
+int compareContent(int one, int other) {
+  constexpr std::size_t block = 1 << 18;
+  std::vector<char> first(block);
+  std::vector<char> second(block);
+  off_t at = 0;
+  for (;;) {
+    const ssize_t length = pread(one, first.data(), block, at);
+    if (length < 0) return errno;
+    std::size_t have = 0;
+    while (have < static_cast<std::size_t>(std::max<ssize_t>(length, 1))) {
+      const ssize_t more = pread(other, second.data() + have, block - have, at + static_cast<off_t>(have));
+      if (more < 0) return errno;
+      if (more == 0) break;
+      have += static_cast<std::size_t>(more);
+    }
+    if (have < static_cast<std::size_t>(length) || (length == 0 && have > 0)) return EIO;
+    if (length == 0) return 0;
+    if (std::memcmp(first.data(), second.data(), static_cast<std::size_t>(length)) != 0) return EIO;
+    at += length;
+  }
+}
+
+/// What an item and all below it ask of the disk that they are to go to.
+struct Needs {
+  std::uint64_t block;
+  std::uint64_t bytes = 0;
+  std::uint64_t entries = 0;
+
+  /// 0, or why an item can't be read or removed.
+  int add(const std::string& path) {
+    struct stat info {};
+    if (lstat(path.c_str(), &info) != 0) return errno;
+    ++entries;
+    const auto size = S_ISREG(info.st_mode) ? static_cast<std::uint64_t>(info.st_size) : 1;
+    bytes += (size + block - 1) / block * block;
+    if (S_ISREG(info.st_mode)) return faccessat(AT_FDCWD, path.c_str(), R_OK, AT_EACCESS) == 0 ? 0 : errno;
+    if (!S_ISDIR(info.st_mode)) return 0;
+    if (faccessat(AT_FDCWD, path.c_str(), R_OK | W_OK | X_OK, AT_EACCESS) != 0) return errno;
+    std::error_code failure;
+    for (std::filesystem::directory_iterator entry(path, failure), end; !failure && entry != end; entry.increment(failure)) {
+      if (const int number = add(entry->path())) return number;
+    }
+    return failure.value();
+  }
+};
+
 }  // namespace
+
+int whyNotMovable(const std::string& from, const std::string& into) {
+  const std::string source = from.substr(0, std::max<std::size_t>(from.rfind('/'), 1));
+  for (const std::string& folder : {into, source}) {
+    if (faccessat(AT_FDCWD, folder.c_str(), W_OK | X_OK, AT_EACCESS) != 0) return errno;
+  }
+  struct statvfs disk {};
+  if (statvfs(into.c_str(), &disk) != 0) return errno;
+  Needs needs{std::max<std::uint64_t>(disk.f_frsize, 1)};
+  if (const int number = needs.add(from)) return number;
+  // Some file systems have no fixed number of entries, and say 0.
+  const bool tooMany = disk.f_files > 0 && disk.f_favail < needs.entries;
+  return tooMany || needs.bytes / needs.block > disk.f_bavail ? ENOSPC : 0;
+}
 
 int TreeCopy::copy(const std::string& from, const std::string& to) {
   struct stat info {};
@@ -60,7 +124,7 @@ int TreeCopy::copy(const std::string& from, const std::string& to) {
 int TreeCopy::copyFile(const std::string& from, const std::string& to, const struct stat& info) {
   const UniqueFd in(open(from.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC));
   if (!in) return errno;
-  const UniqueFd out(open(to.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600));
+  const UniqueFd out(open(to.c_str(), O_RDWR | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600));
   if (!out) return errno;
   for (;;) {
     constexpr std::size_t most = 0x7ffff000;  // what one call transfers on Linux
@@ -76,7 +140,9 @@ int TreeCopy::copyFile(const std::string& from, const std::string& to, const str
   copyAttributes(from, to);
   const struct timespec times[2] = {info.st_atim, info.st_mtim};
   if (fchmod(out.get(), info.st_mode & 07777) != 0 || futimens(out.get(), times) != 0 || fsync(out.get()) != 0) return errno;
-  return 0;
+  // What the disk has now, and not what memory has of it.
+  posix_fadvise(out.get(), 0, 0, POSIX_FADV_DONTNEED);
+  return compareContent(in.get(), out.get());
 }
 
 int TreeCopy::copyFolder(const std::string& from, const std::string& to, const struct stat& info) {

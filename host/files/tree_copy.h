@@ -8,14 +8,20 @@
 
 namespace vaelo {
 
+/// Why `from` can't be copied into the folder `into` and then be removed, as far as that can be told before: 0 or EACCES,
+/// EROFS, ENOSPC, or another error number. Looks at every item; blocks.
+int whyNotMovable(const std::string& from, const std::string& into);
+
 /// Copies an item and all below it with attributes, modes and times; links are copied as links. Every file and folder is
-/// flushed. Blocks; one thread.
+/// flushed, and what a file's copy has on the disk is compared with the file. Blocks; one thread.
 class TreeCopy {
  public:
   /// Nothing may stand at `to`.
   TreeCopy(std::string from, std::string to) : from_(std::move(from)), to_(std::move(to)) {}
-  /// 0 or the error number, after which a part of the copy may be there. EBUSY: the source changed meanwhile.
+  /// 0 or the error number, after which a part of the copy may be there. EBUSY: the source changed meanwhile; EIO: the
+  /// disk gave back something else than it was given.
   int run() { return copy(from_, to_); }
+  bool isFolder() const { return !copied_.empty() && S_ISDIR(copied_.front().info.st_mode); }
   /// True while everything that run() copied is still as it was.
   bool sourceIsUnchanged() const;
 

@@ -83,10 +83,10 @@ TEST_F(FilesManagerTest, FailuresHaveACodeAPathAndWords) {
   EXPECT_EQ(files.attributesOfItemAtPath(drive + "/file/below").error->code, FileErrorCode::ReadNoSuchFile);
   EXPECT_EQ(files.attributesOfItemAtPath(drive + "/a/below").error->code, FileErrorCode::ReadUnknown);
   EXPECT_EQ(files.removeItemAtURL(URL(drive + "/missing"))->code, FileErrorCode::NoSuchFile);
-  EXPECT_EQ(files.createDirectoryAtURL(URL(longName))->code, FileErrorCode::WriteInvalidFileName);
+  EXPECT_EQ(files.createDirectoryAtURL(URL(longName))->code, FileErrorCode::WriteUnknown);
   EXPECT_EQ(files.createDirectoryAtURL(URL(drive + "/file"))->code, FileErrorCode::WriteFileExists);
   EXPECT_EQ(files.createDirectoryAtURL(URL("/sys/vaelo-test"))->code, FileErrorCode::WriteNoPermission);
-  EXPECT_EQ(move(drive + "/file", longName)->code, FileErrorCode::WriteInvalidFileName);
+  EXPECT_EQ(move(drive + "/file", longName)->code, FileErrorCode::WriteUnknown);
   EXPECT_EQ(move(drive + "/file", drive + "/missing/file")->code, FileErrorCode::NoSuchFile);
   EXPECT_EQ(read(drive + "/file"), "content");
 }

@@ -49,7 +49,7 @@ std::optional<Error> MemoryFileManager::createDirectoryAtURL(const URL& url) {
   for (URL above = url.deletingLastPathComponent(); above.path() != "/"; above = above.deletingLastPathComponent()) {
     if (isThere(above.path()) && !disk_.hasFolder(above.path())) return noSuchItem(url.path());
   }
-  if (url.lastPathComponent().size() > NameLimit) return memoryError(FileErrorCode::WriteInvalidFileName, url.path());
+  if (url.lastPathComponent().size() > NameLimit) return memoryError(FileErrorCode::WriteUnknown, url.path());
   if (disk_.isLocked(url.path())) return memoryError(FileErrorCode::WriteNoPermission, url.path());
   disk_.addFolder(disk_.place(url.path()));
   return std::nullopt;
@@ -77,7 +77,7 @@ std::optional<Error> MemoryFileManager::moveItemAtURL(const URL& source, const U
   if (URL(to).isInside(URL(from))) return moveFailure(memoryError(FileErrorCode::WriteUnknown, from), destination);
   if (!disk_.hasFolder(URL(to).deletingLastPathComponent().path())) return moveFailure(noSuchItem(from), destination);
   if (destination.lastPathComponent().size() > NameLimit) {
-    return moveFailure(memoryError(FileErrorCode::WriteInvalidFileName, to), destination);
+    return moveFailure(memoryError(FileErrorCode::WriteUnknown, to), destination);
   }
   if (disk_.isLocked(from) || disk_.isLocked(to)) {
     return moveFailure(memoryError(FileErrorCode::WriteNoPermission, from), destination);
