@@ -19,7 +19,9 @@ HostPlatform::HostPlatform(const HostFolders& folders)
       userActivities_(drive_.layout(), log_, queues_),
       syncedStore_(drive_.layout(), log_, notifications_),
       coordination_(folders.data + "/coordination.lock"),
-      preferences_(folders.preferencesFile, log_) {}
+      preferences_(folders.preferencesFile, log_) {
+  coordination_.setMoveObserver([this](const URL& from, const URL& to) { moves_.moved(from, to); });
+}
 
 HostPlatform::~HostPlatform() {
   if (platform_) Platform::install(nullptr);

@@ -20,6 +20,7 @@
 #include "host/files/local_file_coordination.h"
 #include "host/files/local_file_manager.h"
 #include "host/files/local_resource_values.h"
+#include "host/files/move_history.h"
 #include "platform/platform.h"
 
 namespace vaelo {
@@ -52,6 +53,7 @@ class HostPlatform {
   FileCoordination& fileCoordination() { return coordination_; }
   DocumentStore& documentStore() { return documentStore_; }
   FileProvider& fileProvider() { return fileProvider_; }
+  MoveHistory& moves() { return moves_; }
   DriveUserActivities& userActivities() { return userActivities_; }
 
  private:
@@ -62,14 +64,15 @@ class HostPlatform {
   GTypes types_;
   IcuCharacterClasses characterClasses_;
   IcuFormatting formatting_;
-  LocalFileManager fileManager_;
   LocalCloudDocuments drive_;
+  LocalFileManager fileManager_{&drive_.removals()};
   LocalDocumentStore documentStore_;
   LocalFileProvider fileProvider_;
   LocalResourceValues resourceValues_;
   DriveFileProgress fileProgress_;
   DriveUserActivities userActivities_;
   DriveSyncedStore syncedStore_;
+  MoveHistory moves_{queues_};
   LocalFileCoordination coordination_;
   GioLaunchServices launchServices_;
   NoOffers offers_;

@@ -6,6 +6,7 @@
 #include <clocale>
 
 #include "host/desktop/restoration_store.h"
+#include "host/gtk/change_toasts.h"
 #include "host/gtk/gtk_application_loop.h"
 #include "host/gtk/gtk_screens.h"
 #include "host/host_platform.h"
@@ -22,5 +23,6 @@ int main(int argc, char** argv) {
   vaelo::GtkApplicationLoop loop(screens, platform.drive(), platform.notifications(), platform.userActivities(),
                                  vaelo::RestorationStore(folders.restorationFile));
   platform.install(loop, screens);
+  const vaelo::ChangeToasts toasts(screens, platform.drive(), platform.moves());
   return vaelo::vaeloMain(argc, argv);
 }

@@ -12,8 +12,8 @@ constexpr const char* Domain = "vaelo-drive";
 }
 
 GLibLog::GLibLog() {
-  // In one stream, so that lines stand in the order in which they were written.
-  g_log_writer_default_set_use_stderr(TRUE);
+  // In one stream, so that lines stand in the order in which they were written. GLib takes it once, before any thread.
+  [[maybe_unused]] static const bool set = (g_log_writer_default_set_use_stderr(TRUE), true);
 }
 
 void GLibLog::write(LogType type, const std::string& line) {

@@ -111,7 +111,10 @@ class LocalFileCoordinator : public FileCoordinator {
 
   /// Nothing to do: who presents the item is asked when it has moved, and none of them moves it meanwhile.
   void itemWillMove(const URL&, const URL&) override {}
-  void itemDidMove(const URL& from, const URL& to) override { owner_.presenters_.itemMoved(from, to, presenter_); }
+  void itemDidMove(const URL& from, const URL& to) override {
+    owner_.presenters_.itemMoved(from, to, presenter_);
+    if (owner_.moved_) owner_.moved_(from, to);
+  }
 
  private:
   using Turn = LocalFileCoordination::Turn;

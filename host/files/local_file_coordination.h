@@ -2,6 +2,7 @@
 #pragma once
 
 #include <condition_variable>
+#include <functional>
 #include <map>
 #include <memory>
 #include <mutex>
@@ -28,6 +29,8 @@ class LocalFileCoordination : public FileCoordination {
   std::unique_ptr<FileCoordinator> makeCoordinator(FilePresenter* presenter = nullptr) override;
   void addFilePresenter(FilePresenter& presenter) override;
   void removeFilePresenter(FilePresenter& presenter) override;
+  /// Told of every item that this program has moved, on the thread that moved it. Set before anything moves.
+  void setMoveObserver(std::function<void(const URL& from, const URL& to)> observer) { moved_ = std::move(observer); }
 
  private:
   friend class LocalFileCoordinator;
@@ -39,6 +42,7 @@ class LocalFileCoordination : public FileCoordination {
   std::vector<const Access*> obstaclesOf(const Access& access) const;
 
   const std::string lockFile_;
+  std::function<void(const URL&, const URL&)> moved_;
   std::mutex mutex_;  // guards the two below
   std::condition_variable changed_;
   std::vector<const Access*> accesses_;  // waiting and under way, in the order in which they came

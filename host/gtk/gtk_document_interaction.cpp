@@ -13,19 +13,6 @@ namespace {
 
 constexpr int HeightLeftFree = 120;  // what a sheet lies over stays in sight, and a tap beside it possible
 
-/// The rectangle in the coordinates of the window's content, where the view is in a window.
-std::optional<graphene_rect_t> areaOf(const Rect& rect, const ViewRef& view) {
-  if (!view || !view->isInWindow()) return std::nullopt;
-  View* root = view.get();
-  while (root->superview()) root = root->superview();
-  const Rect there = view->convertRectTo(rect, *root);
-  if (there.width <= 0) return std::nullopt;  // no view was given, so the rectangle is nowhere
-  graphene_rect_t area;
-  graphene_rect_init(&area, static_cast<float>(there.x), static_cast<float>(there.y), static_cast<float>(there.width),
-                     static_cast<float>(there.height));
-  return area;
-}
-
 }  // namespace
 
 GtkDocumentInteraction::GtkDocumentInteraction(URL url, CloudDocuments& drive, std::weak_ptr<GtkWindowHost> window)

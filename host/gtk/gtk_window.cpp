@@ -3,6 +3,7 @@
 
 #include <algorithm>
 
+#include "host/gtk/action_sheet.h"
 #include "host/gtk/alert_dialog.h"
 #include "host/gtk/folder_picker.h"
 #include "host/gtk/host_screen.h"
@@ -41,6 +42,7 @@ GtkWindowHost::~GtkWindowHost() {
   setPresentationHost(nullptr);
   if (const auto controller = navigation()) controller->setHost(nullptr);
   g_signal_handlers_disconnect_by_data(window_, this);
+  sheets_.clear();
   stack_.setPages({}, false, nullptr);
   pages_.clear();
   g_object_unref(menu_);
@@ -151,7 +153,12 @@ void GtkWindowHost::toolbarHiddenChanged(bool hidden, bool) {
 }
 
 void GtkWindowHost::present(const ViewControllerRef&, const ViewControllerRef& presented, bool, std::function<void()> done) {
-  if (const auto alert = std::dynamic_pointer_cast<AlertController>(presented)) {
+  const auto alert = std::dynamic_pointer_cast<AlertController>(presented);
+  if (alert && alert->style() == AlertStyle::ActionSheet) {
+    const auto self = std::static_pointer_cast<GtkWindowHost>(shared_from_this());
+    sheets_[presented.get()] =
+        std::make_unique<ActionSheet>(alert, self, [this, key = presented.get()] { sheets_.erase(key); });
+  } else if (alert) {
     dialogs_[presented.get()] = showAlertDialog(alert, widget(), std::move(done));
     return;
   }
@@ -171,6 +178,7 @@ void GtkWindowHost::dismiss(const ViewControllerRef& presented, bool, std::funct
     g_idle_add_once([](gpointer held) { delete static_cast<std::shared_ptr<FolderPicker>*>(held); },
                     new std::shared_ptr<FolderPicker>(std::move(folderPicker_)));
   }
+  if (const auto sheet = sheets_.find(presented.get()); sheet != sheets_.end()) sheet->second->close();
   const auto dialog = dialogs_.find(presented.get());
   if (dialog != dialogs_.end()) {
     gtk_window_destroy(dialog->second);
@@ -193,7 +201,9 @@ void GtkWindowHost::escape() {
   goBack();
 }
 
-void GtkWindowHost::showToast(const std::string& text, bool stays) {
+namespace {
+
+AdwToast* makeToast(const std::string& text) {
   // A toast's own title is one line of markup: too short for a phone, and a name with "&" shows nothing.
   GtkWidget* label = gtk_label_new(text.c_str());
   gtk_label_set_wrap(GTK_LABEL(label), TRUE);
@@ -203,8 +213,30 @@ void GtkWindowHost::showToast(const std::string& text, bool stays) {
   gtk_widget_add_css_class(label, "heading");
   AdwToast* toast = adw_toast_new("");
   adw_toast_set_custom_title(toast, label);
+  return toast;
+}
+
+}  // namespace
+
+void GtkWindowHost::showToast(const std::string& text, bool stays) {
+  AdwToast* toast = makeToast(text);
   if (stays) adw_toast_set_timeout(toast, 0);
   adw_toast_overlay_add_toast(ADW_TOAST_OVERLAY(toasts_), toast);
+}
+
+AdwToast* GtkWindowHost::showToast(const std::string& text, const char* button, std::function<void()> pressed,
+                                   unsigned seconds) {
+  using Pressed = std::function<void()>;
+  AdwToast* toast = makeToast(text);
+  adw_toast_set_timeout(toast, seconds);
+  adw_toast_set_priority(toast, ADW_TOAST_PRIORITY_HIGH);
+  adw_toast_set_button_label(toast, button);
+  g_signal_connect_data(
+      toast, "button-clicked", G_CALLBACK(+[](AdwToast*, gpointer held) { (*static_cast<Pressed*>(held))(); }),
+      new Pressed(std::move(pressed)), [](gpointer held, GClosure*) { delete static_cast<Pressed*>(held); },
+      GConnectFlags(0));
+  adw_toast_overlay_add_toast(ADW_TOAST_OVERLAY(toasts_), toast);
+  return toast;
 }
 
 void GtkWindowHost::setPageBanner(std::function<GtkWidget*()> make) {

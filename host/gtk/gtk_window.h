@@ -14,6 +14,7 @@
 
 namespace vaelo {
 
+class ActionSheet;
 class FolderPicker;
 
 /// The application's window on the display: one page for each screen of the root navigation controller's stack, alerts over
@@ -29,6 +30,9 @@ class GtkWindowHost : public Window, private NavigationHost, private Presentatio
   GtkOverlay* overlay() const { return GTK_OVERLAY(overlay_); }
   /// A short message at the bottom of the window. One that stays goes when the user closes it.
   void showToast(const std::string& text, bool stays = false);
+  /// One at once, with a button that calls `pressed`; it goes after `seconds`, or with 0 when it is dismissed. Its custom
+  /// title is a GtkLabel. Owned by the window.
+  AdwToast* showToast(const std::string& text, const char* button, std::function<void()> pressed, unsigned seconds);
   /// Puts what `make` makes between header and content of each page, of those that are shown and those to come.
   void setPageBanner(std::function<GtkWidget*()> make);
 
@@ -57,6 +61,7 @@ class GtkWindowHost : public Window, private NavigationHost, private Presentatio
   std::function<GtkWidget*()> makeBanner_;
   std::map<ViewController*, std::unique_ptr<ScreenPage>> pages_;
   std::map<ViewController*, GtkWindow*> dialogs_;
+  std::map<ViewController*, std::unique_ptr<ActionSheet>> sheets_;
 };
 
 }  // namespace vaelo

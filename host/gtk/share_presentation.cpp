@@ -13,6 +13,19 @@ GtkWidget* kept(GtkWidget* widget) { return GTK_WIDGET(g_object_ref_sink(widget)
 
 }  // namespace
 
+std::optional<graphene_rect_t> areaOf(const Rect& rect, const ViewRef& view) {
+  if (!view) return std::nullopt;
+  View* root = view.get();
+  while (root->superview()) root = root->superview();
+  Rect there = view->convertRectTo(rect, *root);
+  if (!view->isInWindow()) there = there.offsetBy(root->frame().x, root->frame().y);
+  if (there.width <= 0) return std::nullopt;  // no view was given, so the rectangle is nowhere
+  graphene_rect_t area;
+  graphene_rect_init(&area, static_cast<float>(there.x), static_cast<float>(there.y), static_cast<float>(there.width),
+                     static_cast<float>(there.height));
+  return area;
+}
+
 SharePresentation::SharePresentation(const std::shared_ptr<GtkWindowHost>& window, GtkWidget* content,
                                      const ShareAnchor& anchor, std::function<void()> dismissed)
     : window_(window), dismissed_(std::move(dismissed)), overlay_(GTK_WIDGET(g_object_ref(window->overlay()))) {

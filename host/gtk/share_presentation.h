@@ -7,6 +7,8 @@
 #include <memory>
 #include <optional>
 
+#include "platform/ui/view.h"
+
 namespace vaelo {
 
 class GtkWindowHost;
@@ -16,6 +18,10 @@ struct ShareAnchor {
   GtkWidget* widget = nullptr;          ///< the button that was pressed; null for none
   std::optional<graphene_rect_t> area;  ///< else a rectangle of the window's content
 };
+
+/// Where the rectangle of a view is in the window's content. A view that stands in no window has a frame there itself.
+/// Nothing for an empty one.
+std::optional<graphene_rect_t> areaOf(const Rect& rect, const ViewRef& view);
 
 /// Shows a sheet over the window: on a narrow one it rises from the bottom edge, on a wide one it is a popover at its
 /// anchor. Escape, a tap beside it, and on a narrow window a swipe down, take it away. Main thread.

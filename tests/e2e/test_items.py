@@ -2,50 +2,11 @@
 """What people do with items: create, rename, move, delete, look at the details; each seen on the disk."""
 import unittest
 
-from harness import App, wait_for
+from harness import wait_for
+from items_window import ItemsWindow
 
 
-class Items(unittest.TestCase):
-    def setUp(self):
-        def prepare(app):
-            app.drive.mkdir(parents=True)
-            (app.data / "account.ini").write_text("[Account]\nName=x\nToken=ab\nSignedIn=true\n")
-            for folder in ("Desktop", "Documents", "Plans"):
-                (app.drive / folder).mkdir()
-            for name in ("Report.txt", "Second.txt", "Third.txt"):
-                (app.drive / name).write_text(name)
-        self.app = App(prepare=prepare)
-        self.addCleanup(self.app.close)
-        self.app.wait("Report.txt", "list item")
-        self.drive = self.app.drive
-
-    def on_disk(self, path, there=True):
-        wait_for(f"{path} {'to be' if there else 'to go'}", lambda: (self.drive / path).exists() == there)
-
-    def menu(self, item, key):
-        """Opens the item's menu by the pointer and chooses from it by the letter that stands for the action."""
-        self.app.click(item, "list item", button=3)
-        self.app.wait("Rename…", "menu item")
-        self.app.key(key)
-
-    def press(self, name):
-        """A button of the dialog that is in front, whose places are told within its own window."""
-        app = self.app
-        rows = wait_for(f"“{name}” in the dialog",
-                        lambda: [row for row in app.accessibility.showing() if row[1].startswith(name) and row[0] == "push button"])
-        geometry = dict(line.split("=") for line in
-                        app.desktop.tool("xdotool", "getwindowfocus", "getwindowgeometry", "--shell").splitlines()
-                        if "=" in line)
-        row = rows[-1]
-        app.mouse("mousemove", "--sync", str(int(geometry["X"]) + row[2] + row[4] // 2),
-                  str(int(geometry["Y"]) + row[3] + row[5] // 2), "click", "1")
-
-    def choose(self, *items):
-        self.app.click("Select", "push button")
-        self.app.wait_title("Select Items")
-        for item in items:
-            self.app.click(item, "list item")
-
+class Items(ItemsWindow):
     def test_a_folder_is_made(self):
         app = self.app
         app.click("Select", "push button")
@@ -97,12 +58,12 @@ class Items(unittest.TestCase):
         app = self.app
         self.menu("Report.txt", "d")
         app.wait("\"Report.txt\" will be permanently deleted")
-        self.press("Cancel")
+        self.answer("Return")
         app.wait_gone("\"Report.txt\" will be permanently deleted")
         self.on_disk("Report.txt")
         self.choose("Report.txt", "Second.txt")
         app.click("Delete", "push button")
-        self.press("Delete from Vaelo Drive")
+        self.delete_for_good()
         self.on_disk("Report.txt", False)
         self.on_disk("Second.txt", False)
         self.on_disk("Third.txt")
