@@ -140,12 +140,22 @@ void NavController::orbPopToURL(const URL& url) {
   }
   if (openInDefaultApp(item)) {
     VLO_DEBUG("openInDefaultApp returned YES, app launched");
+    // What the peek prepared is not shown now. It must not follow the document, whose deletion would take the list away.
+    if (itemManager_ && getTopDocumentListController()) {
+      itemManager_->unregisterAsFilePresenter();
+      itemManager_ = nullptr;
+    }
     return;
   }
   VLO_DEBUG("openInDefaultApp returned NO, showing cached Glimpse from Orb");
-  const auto glimpse = itemManager_ ? itemManager_->currentGlimpseController() : nullptr;
+  const std::shared_ptr<PreviewItemManager> peeked = itemManager_;
   if (searching) warpToFolderForURL(url);
-  if (glimpse) pushViewController(glimpse, true);
+  if (!peeked) return;
+  pushViewController(peeked->currentGlimpseController(), true);
+  if (itemManager_ == peeked) return;
+  // The list that the warp showed dropped it, but the preview is nothing without it.
+  itemManager_ = peeked;
+  itemManager_->registerAsFilePresenter();
 }
 
 }  // namespace vaelo

@@ -96,6 +96,8 @@ void FolderListScreen::offerActions(const URL& url, GtkWidget* over, const GdkRe
     if (!window || !gtk_widget_compute_point(over, window, &corner, &place)) return;
     self->anchor_ = std::make_shared<View>(Rect{static_cast<double>(place.x), static_cast<double>(place.y),
                                                 static_cast<double>(at.width), static_cast<double>(at.height)});
+    // What is opened is what a peek has prepared; what can't be peeked at, as a link, is opened as by a tap.
+    if (action == ItemAction::FirmpressPop && !self->viewControllerForPreviewing(url)) return self->userSelectedItem(url);
     self->userChoseAction(action, url, self->anchor_, [] {});
   });
 }

@@ -74,6 +74,17 @@ class Items(ItemsWindow):
         self.app.wait("This can’t be done with this item.")
         self.on_disk("Documents")
 
+    def test_the_menu_opens_what_a_tap_opens(self):
+        # No other application opens pictures.
+        (self.drive / "Photo.png").write_bytes(b"no picture")
+        (self.drive / "Link.png").symlink_to(self.drive / "Photo.png")
+        self.app.wait("Photo.png", "list item")
+        for item, shown in (("Photo.png", "Photo.png"), ("Link.png", "Photo.png"), ("Plans", "Plans")):
+            self.menu(item, "o")
+            self.app.wait_title(shown)
+            self.app.key("alt+Left")
+            self.app.wait_title("Vaelo Drive")
+
     def test_the_details_show_facts(self):
         self.menu("Report.txt", "i")
         self.app.wait_log("Using PreviewDetailsViewController")

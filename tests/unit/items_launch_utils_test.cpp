@@ -125,6 +125,17 @@ TEST_F(LaunchUtilsTest, inALibraryItsOwnerOpensWhatItOwns) {
   EXPECT_EQ(messages().back(), "DEBUG Container Sketchbook: Default app (main) supports open in place");
 }
 
+TEST_F(LaunchUtilsTest, inALibraryTheDocumentOfABookmarkIsJudged) {
+  const URL letter("/home/somebody/b.txt");
+  world.bookmarks.insert_or_assign(InLibrary.path(), letter);
+  world.appLibrary->owners = {"main"};
+  install(app("main"));
+  own({app("main")});
+  EXPECT_EQ(chosen(InLibrary), "main");
+  EXPECT_TRUE(world.called("record " + letter.path()));
+  EXPECT_FALSE(world.called("record " + InLibrary.path()));
+}
+
 TEST_F(LaunchUtilsTest, inALibraryPicturesOpenInTheOwnerToo) {
   const URL picture = LibraryDocuments.appendingPathComponent("a.png");
   world.addFile(picture);

@@ -220,6 +220,10 @@ TEST_F(NavSelectionTest, PoppingASearchResultGoesToItsFolderFirst) {
   EXPECT_EQ(nav->presentedViewController(), nullptr);
   ASSERT_GT(nav->viewControllers().size(), 2u);
   EXPECT_EQ(nav->topViewController(), GlimpseItemController::defaultController());
+  ASSERT_NE(nav->itemManager(), nullptr) << "the folder's list, which was shown on the way, ended nothing";
+  EXPECT_EQ(GlimpseItemController::defaultController()->itemManager(), nav->itemManager());
+  EXPECT_EQ(nav->itemManager()->item()->url(), document);
+  EXPECT_TRUE(nav->itemManager()->filePresenterRegistered());
 }
 
 TEST_F(NavSelectionTest, PoppingADocumentOfAnotherApplicationOpensItThere) {
@@ -229,6 +233,21 @@ TEST_F(NavSelectionTest, PoppingADocumentOfAnotherApplicationOpensItThere) {
   nav->documentListControllerPerformActionURL(topList(), ItemAction::FirmpressPop, document);
   EXPECT_EQ(nav->viewControllers().size(), 1u);
   EXPECT_TRUE(logged("DEBUG", "openInDefaultApp returned YES, app launched"));
+}
+
+TEST_F(NavSelectionTest, TheListStaysWhenADocumentThatWasPoppedIntoAnotherApplicationIsDeleted) {
+  const URL document = addFile("Plans/a.txt");
+  giveOwningApplication(document);
+  loadNav();
+  nav->warpToFolderForURL(document);
+  topList()->viewControllerForPreviewing(document);
+  EXPECT_FALSE(memory.coordination.presenters().empty());
+  nav->orbPopToURL(document);
+  EXPECT_TRUE(memory.coordination.presenters().empty());
+  EXPECT_EQ(nav->itemManager(), nullptr);
+  memory.coordination.othersDelete(document);
+  runAllQueues();
+  EXPECT_EQ(*topList()->presentedURL(), document.deletingLastPathComponent());
 }
 
 TEST_F(NavSelectionTest, AnUnknownActionIsLoggedAndCompleted) {

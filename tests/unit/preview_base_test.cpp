@@ -140,6 +140,8 @@ TEST_F(PreviewBaseTest, TheBottomMarginIsForPortrait) {
   memory.screens.deviceShown.orientation = InterfaceOrientation::LandscapeLeft;
   EXPECT_EQ(screen->currentPseudoOrientation(), InterfaceOrientation::Portrait)
       << "narrow and high, whatever the device says";
+  screen->setupConstraints();
+  EXPECT_EQ(screen->parentBottomConstraint()->constant(), -17) << "from the beginning";
   screen->configureMargins();
   EXPECT_EQ(screen->parentBottomConstraint()->constant(), -17);
   traits.verticalSizeClass = SizeClass::Compact;
@@ -158,6 +160,7 @@ TEST_F(PreviewBaseTest, TheBottomMarginIsForPortrait) {
 
 TEST_F(PreviewBaseTest, OnAPhoneTheButtonsAreInTheToolbar) {
   using enum SystemItem;
+  nav->setToolbarHidden(true);
   push();
   EXPECT_THAT(kinds(screen->toolbarItems()), ElementsAre(Action, FlexibleSpace, Trash, FlexibleSpace, Organize));
   EXPECT_FALSE(nav->toolbarHidden());
@@ -358,6 +361,7 @@ TEST_F(PreviewBaseTest, ProgressIsToldInStepsOfFivePercent) {
   EXPECT_EQ(screen->lastProgressChunk(), 20);
   EXPECT_EQ(screen->updates, 6);
   progress->tell("paused");
+  screen->observeValueForKeyPathOfObjectChangeContext("paused", progress);
   EXPECT_EQ(screen->updates, 6) << "only the fraction counts";
   withdraw();
   EXPECT_EQ(screen->subscriber(), nullptr);
