@@ -100,6 +100,7 @@ std::shared_ptr<PreviewDetailsViewController> PreviewItemManager::createDetailsV
 
 std::shared_ptr<GlimpseItemController> PreviewItemManager::createGlimpseController() {
   std::shared_ptr<GlimpseItemController> screen = GlimpseItemController::defaultController();
+  // The shared screen still has the title of the document before.
   screen->setTitle(item_ ? item_->localizedName().value_or("") : "");
   screen->glimpseNewItem(shared_from_this());
   return screen;

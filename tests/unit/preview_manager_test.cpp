@@ -29,8 +29,10 @@ TEST_F(PreviewManagerTest, BeginsWithItsQueuesItsModeAndNothingToShow) {
 
 TEST_F(PreviewManagerTest, ModeZeroShowsTheSharedQuickPreviewOfTheDocument) {
   setModified(document, std::chrono::seconds(500));
+  glimpse()->setTitle("Former.pdf");
   const auto manager = show();
   EXPECT_EQ(top(), glimpse());
+  EXPECT_EQ(glimpse()->title(), "Report.pdf");
   EXPECT_EQ(glimpse()->itemManager(), manager);
   EXPECT_THAT(*glimpse()->arrayOfDocuments(), ElementsAre(document));
   EXPECT_EQ(manager->modifiedDate(), Date(std::chrono::seconds(500)));
