@@ -5,6 +5,11 @@ import unittest
 from harness import App, wait_for
 
 
+def content(folder):
+    """Every file below a folder with its bytes, and every folder."""
+    return {str(path.relative_to(folder)): path.read_bytes() if path.is_file() else None for path in folder.rglob("*")}
+
+
 class ItemsWindow(unittest.TestCase):
     size = (800, 640)
 

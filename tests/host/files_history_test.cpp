@@ -1,25 +1,15 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "host/desktop/restoration_store.h"
-#include "host/files/move_history.h"
-#include "host/gtk/gtk_application_loop.h"
-#include "host/gtk/gtk_screens.h"
-#include "host/host_platform.h"
 #include "items/file_utils.h"
-#include "tests/host/drive_test_support.h"
+#include "tests/host/platform_fixture.h"
 
 namespace vaelo {
 
 namespace {
 
-/// The whole platform on a folder, since moves come from all over the application.
-class FilesHistoryTest : public drive_test::DriveTest {
+/// On the whole platform, since moves come from all over the application.
+class FilesHistoryTest : public drive_test::PlatformTest {
  protected:
-  FilesHistoryTest()
-      : platform({data, root + "/preferences.ini", root + "/restoration.ini"}),
-        screens(platform.drive()),
-        loop(screens, platform.drive(), platform.notifications(), platform.userActivities(),
-             RestorationStore(root + "/restoration.ini")) {
-    platform.install(loop, screens);
+  FilesHistoryTest() {
     platform.moves().setOffer([this](const auto& batch) { offers.push_back(batch); });
     write(drive + "/a", "a");
     write(drive + "/b", "b");
@@ -28,14 +18,7 @@ class FilesHistoryTest : public drive_test::DriveTest {
   void move(const std::string& from, const std::string& to) {
     EXPECT_FALSE(FileUtils::moveTo(URL(drive + from), URL(drive + to)));
   }
-  void runMainLoop() {
-    while (g_main_context_iteration(nullptr, FALSE)) {
-    }
-  }
 
-  HostPlatform platform;
-  GtkScreens screens;
-  GtkApplicationLoop loop;
   std::vector<std::shared_ptr<const MoveHistory::Batch>> offers;
 };
 

@@ -123,6 +123,20 @@ TEST_F(FolderViewTest, PressOpensAndSelectsWhileEditing) {
   EXPECT_EQ(selectionChanges_, 2);
 }
 
+TEST_F(FolderViewTest, RowsAreSelectedByPlaceAndAllAtOnce) {
+  for (int i = 0; i < 20; ++i) folder_.write("file " + std::to_string(i));
+  open();
+  GtkSelectionModel* model = view_->model().selectionModel();
+  EXPECT_FALSE(gtk_selection_model_select_all(model));
+  view_->setEditing(true);
+  EXPECT_TRUE(gtk_selection_model_select_all(model));
+  EXPECT_EQ(view_->model().selectedRows().size(), 20u);
+  EXPECT_EQ(selectionChanges_, 1);
+  view_->setSelectedRows({1, 2, 3, 7, 99});
+  EXPECT_EQ(view_->selection(), (std::vector<std::string>{"file 1", "file 2", "file 3", "file 7"}));
+  EXPECT_EQ(selectionChanges_, 1) << "not by the user";
+}
+
 TEST_F(FolderViewTest, EmptyUnreadableAndRemovedFoldersAreSaid) {
   open();
   EXPECT_TRUE(ADW_IS_STATUS_PAGE(shownPage()));

@@ -157,6 +157,7 @@ void FolderView::setMode(Mode mode) {
 void FolderView::setEditing(bool editing) {
   if (editing == context_.editing) return;
   context_.editing = editing;
+  lastPressed_.clear();
   model_.setSelectable(editing);
   if (!editing) setSelection({});
   redrawRows();
@@ -333,6 +334,14 @@ void FolderView::showPage() {
 void FolderView::pressed(guint position) {
   if (position >= model_.itemCount()) return;
   if (context_.editing) {
+    const auto begin = std::exchange(extends_, false) ? model_.indexOf(lastPressed_) : std::nullopt;
+    if (begin) {
+      const guint first = std::min(position, static_cast<guint>(*begin));
+      const guint last = std::max(position, static_cast<guint>(*begin));
+      model_.selectRange(first, last - first + 1, false);
+      return;
+    }
+    lastPressed_ = nameAt(position);
     model_.setSelected(position, !model_.isSelected(position));
   } else if (events_.activated) {
     events_.activated(nameAt(position));

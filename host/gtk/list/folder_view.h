@@ -124,6 +124,8 @@ class FolderView {
   std::string revealed_;  // what scrollTo() is on the way to
   int framesToWait_ = 0;
   bool focusRevealed_ = false;
+  std::string lastPressed_;  // where a range begins
+  bool extends_ = false;     // the press that is under way has Shift
   int errorNumber_ = 0;
   FolderChanges pending_;
   bool updating_ = false;

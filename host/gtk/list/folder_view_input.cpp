@@ -73,6 +73,16 @@ bool FolderView::keyPressed(guint key, GdkModifierType modifiers) {
 }
 
 void FolderView::connectContextGestures() {
+  // The list tells of presses without their modifiers.
+  GtkGesture* any = gtk_gesture_click_new();
+  gtk_event_controller_set_propagation_phase(GTK_EVENT_CONTROLLER(any), GTK_PHASE_CAPTURE);
+  const auto note = [](GtkGesture* gesture, int, double, double, FolderView* self) {
+    const GdkModifierType held = gtk_event_controller_get_current_event_state(GTK_EVENT_CONTROLLER(gesture));
+    self->extends_ = held & GDK_SHIFT_MASK;
+  };
+  g_signal_connect(any, "pressed", G_CALLBACK(+note), this);
+  gtk_widget_add_controller(scroller_, GTK_EVENT_CONTROLLER(any));
+
   GtkGesture* click = gtk_gesture_click_new();
   gtk_gesture_single_set_button(GTK_GESTURE_SINGLE(click), GDK_BUTTON_SECONDARY);
   g_signal_connect_swapped(click, "pressed",
