@@ -1,9 +1,11 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <gio/gio.h>
+#include <gst/gst.h>
 
 #include <fstream>
 
 #include "host/gtk/preview/media_controls.h"
+#include "host/gtk/preview/media_framework.h"
 #include "tests/host/preview_view_test.h"
 
 namespace vaelo {
@@ -159,6 +161,22 @@ TEST_F(PreviewMediaTest, WhatCannotBePlayedSaysSo) {
   EXPECT_EQ(failure_, sentence);
   open("gone.webm", "video/webm");
   EXPECT_EQ(failure_, "This document is no longer there.");
+}
+
+TEST(MediaFrameworkTest, NothingButFilesCanBeReached) {
+  ASSERT_TRUE(prepareMediaFramework());
+  const auto sourceOf = [](const char* address) {
+    return GRef<GstElement>(gst_element_make_from_uri(GST_URI_SRC, address, nullptr, nullptr));
+  };
+  EXPECT_NE(sourceOf("file:///tmp/film"), nullptr);
+  for (const char* address :
+       {"http://127.0.0.1/", "https://127.0.0.1/", "rtsp://127.0.0.1/", "udp://127.0.0.1:9", "tcp://127.0.0.1:9",
+        "smb://127.0.0.1/", "v4l2:///dev/video0", "cdda://1", "pushfile:///tmp/film"}) {
+    EXPECT_EQ(sourceOf(address), nullptr) << address;
+  }
+  for (const char* reader : {"hlsdemux2", "dashdemux2", "souphttpsrc", "giosrc", "udpsrc"}) {
+    EXPECT_EQ(GRef<GstElementFactory>(gst_element_factory_find(reader)), nullptr) << reader;
+  }
 }
 
 TEST_F(PreviewMediaTest, AListOfAddressesIsNotFollowed) {

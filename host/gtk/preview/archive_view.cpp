@@ -123,6 +123,7 @@ class ArchiveView : public DocumentView {
                        gtk_tree_list_row_set_expanded(row.get(), !gtk_tree_list_row_get_expanded(row.get()));
                      }),
                      nullptr);
+    g_signal_connect(list_, "map", G_CALLBACK(+[](GtkWidget* list, gpointer) { gtk_widget_grab_focus(list); }), nullptr);
     GtkWidget* empty = adw_status_page_new();
     adw_status_page_set_icon_name(ADW_STATUS_PAGE(empty), "package-x-generic-symbolic");
     adw_status_page_set_title(ADW_STATUS_PAGE(empty), "Nothing Inside");

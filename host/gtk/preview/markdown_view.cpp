@@ -48,6 +48,7 @@ class MarkdownView : public DocumentView {
     gtk_text_view_set_bottom_margin(text, LeastMargin);
     setMargins(0);
     gtk_accessible_update_property(GTK_ACCESSIBLE(view_), GTK_ACCESSIBLE_PROPERTY_LABEL, document_.name.c_str(), -1);
+    g_signal_connect(view_, "map", G_CALLBACK(+[](GtkWidget* view, gpointer) { gtk_widget_grab_focus(view); }), nullptr);
     gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scrolled_), view_);
     gtk_widget_set_vexpand(scrolled_, TRUE);
     for (GtkWidget* child : {find_.widget(), scrolled_, note_}) gtk_box_append(GTK_BOX(page_), child);

@@ -20,6 +20,8 @@ class MediaControls {
   MediaControls(const MediaControls&) = delete;
   MediaControls& operator=(const MediaControls&) = delete;
   GtkWidget* widget() const { return bar_; }
+  /// So that the space bar plays.
+  void takeFocus() { gtk_widget_grab_focus(play_); }
 
  private:
   void showPlaying();

@@ -51,6 +51,10 @@ class MediaView : public DocumentView {
         events_(std::move(events)),
         box_(GTK_WIDGET(g_object_ref_sink(gtk_box_new(GTK_ORIENTATION_VERTICAL, 0)))) {
     g_signal_connect_swapped(box_, "unmap", G_CALLBACK(+[](MediaView* self) { self->pause(); }), this);
+    g_signal_connect_swapped(box_, "map", G_CALLBACK(+[](MediaView* self) {
+                               if (self->controls_) self->controls_->takeFocus();
+                             }),
+                             this);
     addShortcuts();
     refresh();
   }
