@@ -4,6 +4,8 @@
 #include <algorithm>
 #include <iterator>
 
+#include "host/support/glib_ptr.h"
+
 namespace vaelo {
 
 namespace {
@@ -12,6 +14,14 @@ void setLabel(GtkWidget* button, const char* label, const char* hint) {
   gtk_widget_set_tooltip_text(button, hint);
   gtk_accessible_update_property(GTK_ACCESSIBLE(button), GTK_ACCESSIBLE_PROPERTY_LABEL, label,
                                  GTK_ACCESSIBLE_PROPERTY_DESCRIPTION, hint, -1);
+}
+
+// All of them stand side by side on a phone.
+void makeNarrow(GtkWidget* button) {
+  const GRef<GtkCssProvider> provider(gtk_css_provider_new());
+  gtk_css_provider_load_from_data(provider.get(), "button { padding-left: 9px; padding-right: 9px; }", -1);
+  gtk_style_context_add_provider(gtk_widget_get_style_context(button), GTK_STYLE_PROVIDER(provider.get()),
+                                 GTK_STYLE_PROVIDER_PRIORITY_APPLICATION);
 }
 
 const char* sentenceFor(PortableDocumentMarks::State state) {
@@ -51,6 +61,7 @@ MarkupBar::MarkupBar(Events events)
   gtk_box_append(GTK_BOX(box), state_);
   GtkWidget* done = gtk_button_new_with_label("Done");
   setLabel(done, "Done", "Leave Markup");
+  makeNarrow(done);
   gtk_box_append(GTK_BOX(box), done);
   gtk_revealer_set_child(GTK_REVEALER(revealer_), box);
   gtk_widget_set_visible(revealer_, FALSE);
@@ -74,6 +85,7 @@ MarkupBar::~MarkupBar() {
 GtkWidget* MarkupBar::makeTool(MarkTool tool, const char* label, const char* hint) {
   GtkWidget* button = gtk_toggle_button_new_with_label(label);
   setLabel(button, label, hint);
+  makeNarrow(button);
   g_signal_connect(button, "toggled",
                    G_CALLBACK(+[](GtkToggleButton* toggled, MarkupBar* self) { self->toolToggled(toggled); }), this);
   tools_[static_cast<std::size_t>(tool) - 1] = button;

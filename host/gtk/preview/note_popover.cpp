@@ -5,7 +5,8 @@
 
 namespace vaelo {
 
-NotePopover::NotePopover(GtkWidget* parent) : popover_(gtk_popover_new()), text_(gtk_text_view_new()) {
+NotePopover::NotePopover(GtkWidget* parent, GtkWidget* content)
+    : content_(content), popover_(gtk_popover_new()), text_(gtk_text_view_new()) {
   gtk_text_view_set_wrap_mode(GTK_TEXT_VIEW(text_), GTK_WRAP_WORD_CHAR);
   gtk_text_view_set_accepts_tab(GTK_TEXT_VIEW(text_), FALSE);
   for (const auto set : {gtk_text_view_set_left_margin, gtk_text_view_set_right_margin, gtk_text_view_set_top_margin,
@@ -74,6 +75,7 @@ void NotePopover::setText(const std::string& text) {
 }
 
 void NotePopover::closed() {
+  gtk_widget_grab_focus(content_);
   const std::function<void(const std::string&)> written = std::move(written_);
   written_ = nullptr;
   GtkTextBuffer* buffer = gtk_text_view_get_buffer(GTK_TEXT_VIEW(text_));

@@ -11,8 +11,9 @@ namespace vaelo {
 /// Asks for the text of a note. What was written is kept however it closes, unless the user gives it up. Main thread.
 class NotePopover {
  public:
-  /// `parent` outlives this object.
-  explicit NotePopover(GtkWidget* parent);
+  /// `parent` outlives this object. A stack, whose children are told to screen readers as pages, can't be one.
+  /// `content` takes the focus when it closes; it outlives this object too.
+  NotePopover(GtkWidget* parent, GtkWidget* content);
   ~NotePopover();
   NotePopover(const NotePopover&) = delete;
   NotePopover& operator=(const NotePopover&) = delete;
@@ -28,6 +29,7 @@ class NotePopover {
  private:
   void closed();
 
+  GtkWidget* content_;
   GtkWidget* popover_;
   GtkWidget* text_;
   std::function<void(const std::string&)> written_;

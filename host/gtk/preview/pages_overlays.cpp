@@ -29,7 +29,7 @@ void PageOverlay::fill(const std::vector<PageRect>& rects, const GdkRGBA& colour
 void PageOverlay::draw(const PageMark& mark, double width, double height) const {
   switch (mark.kind) {
     case PageMark::Kind::Highlight:
-      return fill(mark.lines, colourOf(mark, 0.5F));
+      return fill(mark.lines, colourOf(mark, 0.4F));
     case PageMark::Kind::Ink:
       return drawInk(mark, width, height);
     case PageMark::Kind::Note:

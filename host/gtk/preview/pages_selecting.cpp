@@ -43,9 +43,11 @@ PagesSelecting::PagesSelecting(PagesCanvas& canvas, GtkWidget* host, Events even
   gtk_popover_set_has_arrow(GTK_POPOVER(menu_), FALSE);
   gtk_widget_set_halign(menu_, GTK_ALIGN_START);
   gtk_widget_set_parent(menu_, host_);
+  g_signal_connect_swapped(menu_, "closed", G_CALLBACK(gtk_widget_grab_focus), canvas_.widget());
 }
 
 PagesSelecting::~PagesSelecting() {
+  g_signal_handlers_disconnect_by_data(menu_, canvas_.widget());
   gtk_widget_unparent(menu_);
   gtk_widget_insert_action_group(host_, "pages", nullptr);
 }

@@ -19,7 +19,7 @@ class PagesSelecting {
     std::function<void(int page, std::vector<PageRect> lines)> highlight;
   };
 
-  /// The menu belongs to `host`, which like the canvas outlives this object.
+  /// The menu belongs to `host`, no stack, which like the canvas outlives this object.
   PagesSelecting(PagesCanvas& canvas, GtkWidget* host, Events events);
   ~PagesSelecting();
   PagesSelecting(const PagesSelecting&) = delete;

@@ -22,7 +22,7 @@ PortableDocumentMarkup::PortableDocumentMarkup(PagesCanvas& canvas, GtkWidget* h
               if (marks_ && !open) marks_->save();
               if (!open) gtk_widget_grab_focus(canvas_.widget());
             }}),
-      note_(host) {}
+      note_(host, canvas.widget()) {}
 
 PortableDocumentMarkup::~PortableDocumentMarkup() { end(); }
 

@@ -25,7 +25,7 @@ class PortableDocumentMarkup {
     std::function<void()> settled;  ///< nothing is being saved any more
   };
 
-  /// Popovers belong to `host`, which like the canvas outlives this object.
+  /// Popovers belong to `host`, no stack, which like the canvas outlives this object.
   PortableDocumentMarkup(PagesCanvas& canvas, GtkWidget* host, Events events);
   ~PortableDocumentMarkup();
   PortableDocumentMarkup(const PortableDocumentMarkup&) = delete;

@@ -34,10 +34,10 @@ PortableDocumentScreen::PortableDocumentScreen(const PreviewedDocument& document
              [this](int page, const PageRect& place) {
                canvas_.reveal(page, place.left, place.top, place.right, place.bottom);
              }}),
-      selecting_(canvas_, stack_.get(),
+      selecting_(canvas_, pages_,
                  {[this](int page) { return texts_ ? texts_->of(page) : nullptr; }, [this] { return markup_.mayMark(); },
                   [this](int page, std::vector<PageRect> lines) { markup_.highlight(page, std::move(lines)); }}),
-      markup_(canvas_, stack_.get(),
+      markup_(canvas_, pages_,
               {[this] { return events_.shouldSave(); }, notice_.teller(), [this] { toolChosen(); },
                [this] {
                  if (std::exchange(refreshWhenSaved_, false)) refresh();
@@ -53,6 +53,7 @@ PortableDocumentScreen::PortableDocumentScreen(const PreviewedDocument& document
         gtk_widget_grab_focus(canvas_.widget());
       }),
       password_([this](const std::string& password) { load(password); }) {
+  gtk_stack_add_child(GTK_STACK(stack_.get()), pages_);
   gtk_accessible_update_property(GTK_ACCESSIBLE(canvas_.widget()), GTK_ACCESSIBLE_PROPERTY_LABEL, document_.name.c_str(),
                                  -1);
   gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scrolled_), canvas_.widget());
@@ -61,7 +62,6 @@ PortableDocumentScreen::PortableDocumentScreen(const PreviewedDocument& document
   gtk_overlay_add_overlay(GTK_OVERLAY(overlay), indicator_.widget());
   gtk_widget_set_vexpand(overlay, TRUE);
   for (GtkWidget* child : {findBar_.widget(), markup_.bar().widget(), overlay}) gtk_box_append(GTK_BOX(pages_), child);
-  gtk_stack_add_child(GTK_STACK(stack_.get()), pages_);
   gtk_stack_add_child(GTK_STACK(stack_.get()), password_.widget());
   GtkEventController* keys = gtk_event_controller_key_new();
   g_signal_connect(keys, "key-pressed",
@@ -195,11 +195,50 @@ void PortableDocumentScreen::beginMarkup(bool mayBeMarked) {
   markup_.begin({document_.path, document_.name, source_->password(), std::move(file), source_->version(), coordination_});
 }
 
+// Two buttons, or a menu with both where a phone's header bar has no room for one more.
 std::vector<GtkWidget*> PortableDocumentScreen::headerWidgets() {
-  std::vector<GtkWidget*> widgets = {
-      makeFindButton(G_CALLBACK(+[](PortableDocumentScreen* self) { self->toggleFind(); }), this)};
-  if (document_.mayBeEdited) widgets.push_back(markup_.bar().makeToggle());
-  return widgets;
+  GtkWidget* find = makeFindButton(G_CALLBACK(+[](PortableDocumentScreen* self) { self->toggleFind(); }), this);
+  if (!document_.mayBeEdited) return {find};
+  GtkWidget* both = gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 6);
+  for (GtkWidget* button : {markup_.bar().makeToggle(), find}) gtk_box_append(GTK_BOX(both), button);
+  GtkWidget* squeezer = adw_squeezer_new();
+  adw_squeezer_set_homogeneous(ADW_SQUEEZER(squeezer), FALSE);
+  for (GtkWidget* child : {both, makeMenuButton()}) adw_squeezer_add(ADW_SQUEEZER(squeezer), child);
+  return {squeezer};
+}
+
+GtkWidget* PortableDocumentScreen::makeMenuButton() {
+  const GActionEntry entries[] = {
+      {"find",
+       [](GSimpleAction*, GVariant*, gpointer self) { static_cast<PortableDocumentScreen*>(self)->toggleFind(); },
+       nullptr,
+       nullptr,
+       nullptr,
+       {0, 0, 0}},
+      {"markup",
+       [](GSimpleAction*, GVariant*, gpointer data) {
+         MarkupBar& bar = static_cast<PortableDocumentScreen*>(data)->markup_.bar();
+         bar.open(!bar.isOpen());
+       },
+       nullptr,
+       nullptr,
+       nullptr,
+       {0, 0, 0}}};
+  const GRef<GSimpleActionGroup> actions(g_simple_action_group_new());
+  g_action_map_add_action_entries(G_ACTION_MAP(actions.get()), entries, G_N_ELEMENTS(entries), this);
+  g_object_bind_property(markup_.bar().widget(), "visible",
+                         g_action_map_lookup_action(G_ACTION_MAP(actions.get()), "markup"), "enabled",
+                         G_BINDING_SYNC_CREATE);
+  const GRef<GMenu> items(g_menu_new());
+  g_menu_append(items.get(), "_Find in This Document", "document.find");
+  g_menu_append(items.get(), "_Markup", "document.markup");
+  GtkWidget* button = gtk_menu_button_new();
+  gtk_menu_button_set_icon_name(GTK_MENU_BUTTON(button), "view-more-symbolic");
+  gtk_menu_button_set_menu_model(GTK_MENU_BUTTON(button), G_MENU_MODEL(items.get()));
+  gtk_widget_insert_action_group(button, "document", G_ACTION_GROUP(actions.get()));
+  gtk_widget_set_tooltip_text(button, "Find and Markup");
+  gtk_accessible_update_property(GTK_ACCESSIBLE(button), GTK_ACCESSIBLE_PROPERTY_LABEL, "Find and Markup", -1);
+  return button;
 }
 
 bool PortableDocumentScreen::toggleFind() {

@@ -57,6 +57,7 @@ class PortableDocumentScreen {
   void toolChosen();
   void beginMarkup(bool mayBeMarked);
   void showFound();
+  GtkWidget* makeMenuButton();
   void load(const std::string& password);
   void opened(const PortableDocumentSource::Opened& opened, const std::string& password);
   void askForSizes(std::size_t known);
