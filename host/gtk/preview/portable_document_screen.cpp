@@ -42,6 +42,7 @@ PortableDocumentScreen::PortableDocumentScreen(const PreviewedDocument& document
                [this] {
                  if (std::exchange(refreshWhenSaved_, false)) refresh();
                }}),
+      buttons_(markup_.bar(), G_CALLBACK(+[](PortableDocumentScreen* self) { self->toggleFind(); }), this),
       pointer_(canvas_,
                {[this](bool finger) { return source_ && (!finger || markup_.tool() != MarkTool::None); },
                 [this](double x, double y, int presses) { press(x, y, presses); },
@@ -119,6 +120,7 @@ void PortableDocumentScreen::askForSizes(std::size_t known) {
 }
 
 void PortableDocumentScreen::moved() {
+  buttons_.fit(static_cast<int>(canvas_.width()));
   if (!pictures_) return;
   const PagesLayout& layout = canvas_.layout();
   const auto [first, last] = canvas_.visiblePages();
@@ -195,50 +197,9 @@ void PortableDocumentScreen::beginMarkup(bool mayBeMarked) {
   markup_.begin({document_.path, document_.name, source_->password(), std::move(file), source_->version(), coordination_});
 }
 
-// Two buttons, or a menu with both where a phone's header bar has no room for one more.
 std::vector<GtkWidget*> PortableDocumentScreen::headerWidgets() {
-  GtkWidget* find = makeFindButton(G_CALLBACK(+[](PortableDocumentScreen* self) { self->toggleFind(); }), this);
-  if (!document_.mayBeEdited) return {find};
-  GtkWidget* both = gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 6);
-  for (GtkWidget* button : {markup_.bar().makeToggle(), find}) gtk_box_append(GTK_BOX(both), button);
-  GtkWidget* squeezer = adw_squeezer_new();
-  adw_squeezer_set_homogeneous(ADW_SQUEEZER(squeezer), FALSE);
-  for (GtkWidget* child : {both, makeMenuButton()}) adw_squeezer_add(ADW_SQUEEZER(squeezer), child);
-  return {squeezer};
-}
-
-GtkWidget* PortableDocumentScreen::makeMenuButton() {
-  const GActionEntry entries[] = {
-      {"find",
-       [](GSimpleAction*, GVariant*, gpointer self) { static_cast<PortableDocumentScreen*>(self)->toggleFind(); },
-       nullptr,
-       nullptr,
-       nullptr,
-       {0, 0, 0}},
-      {"markup",
-       [](GSimpleAction*, GVariant*, gpointer data) {
-         MarkupBar& bar = static_cast<PortableDocumentScreen*>(data)->markup_.bar();
-         bar.open(!bar.isOpen());
-       },
-       nullptr,
-       nullptr,
-       nullptr,
-       {0, 0, 0}}};
-  const GRef<GSimpleActionGroup> actions(g_simple_action_group_new());
-  g_action_map_add_action_entries(G_ACTION_MAP(actions.get()), entries, G_N_ELEMENTS(entries), this);
-  g_object_bind_property(markup_.bar().widget(), "visible",
-                         g_action_map_lookup_action(G_ACTION_MAP(actions.get()), "markup"), "enabled",
-                         G_BINDING_SYNC_CREATE);
-  const GRef<GMenu> items(g_menu_new());
-  g_menu_append(items.get(), "_Find in This Document", "document.find");
-  g_menu_append(items.get(), "_Markup", "document.markup");
-  GtkWidget* button = gtk_menu_button_new();
-  gtk_menu_button_set_icon_name(GTK_MENU_BUTTON(button), "view-more-symbolic");
-  gtk_menu_button_set_menu_model(GTK_MENU_BUTTON(button), G_MENU_MODEL(items.get()));
-  gtk_widget_insert_action_group(button, "document", G_ACTION_GROUP(actions.get()));
-  gtk_widget_set_tooltip_text(button, "Find and Markup");
-  gtk_accessible_update_property(GTK_ACCESSIBLE(button), GTK_ACCESSIBLE_PROPERTY_LABEL, "Find and Markup", -1);
-  return button;
+  if (document_.mayBeEdited) return {buttons_.make()};
+  return {makeFindButton(G_CALLBACK(+[](PortableDocumentScreen* self) { self->toggleFind(); }), this)};
 }
 
 bool PortableDocumentScreen::toggleFind() {

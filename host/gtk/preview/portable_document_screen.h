@@ -7,6 +7,7 @@
 #include <string>
 #include <vector>
 
+#include "host/gtk/preview/document_buttons.h"
 #include "host/gtk/preview/document_view.h"
 #include "host/gtk/preview/find_bar.h"
 #include "host/gtk/preview/pages_canvas.h"
@@ -57,7 +58,6 @@ class PortableDocumentScreen {
   void toolChosen();
   void beginMarkup(bool mayBeMarked);
   void showFound();
-  GtkWidget* makeMenuButton();
   void load(const std::string& password);
   void opened(const PortableDocumentSource::Opened& opened, const std::string& password);
   void askForSizes(std::size_t known);
@@ -79,6 +79,7 @@ class PortableDocumentScreen {
   PortableDocumentFind find_;
   PagesSelecting selecting_;
   PortableDocumentMarkup markup_;
+  DocumentButtons buttons_;
   PagesPointer pointer_;
   PagesIndicator indicator_;
   PortableDocumentPassword password_;
