@@ -148,10 +148,13 @@ std::vector<PresenterList::Shown> PresenterList::shown() {
 }
 
 void PresenterList::tell(const std::shared_ptr<Registration>& registration, std::function<void(FilePresenter&)> call) {
-  // Under the lock, so that nobody but the presenter can be the last to hold its queue: the queue's end waits for callbacks.
-  const std::lock_guard whileGiven(registration->mutex);
-  if (!registration->queue) return;
-  registration->queue->addOperation([registration, call = std::move(call)] {
+  std::shared_ptr<OperationQueue> queue;
+  {
+    const std::lock_guard lock(registration->mutex);
+    queue = registration->queue;
+  }
+  if (!queue) return;
+  queue->addOperation([registration, call = std::move(call)] {
     FilePresenter* presenter = nullptr;
     {
       const std::lock_guard lock(registration->mutex);
