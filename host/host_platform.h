@@ -65,7 +65,7 @@ class HostPlatform {
   IcuCharacterClasses characterClasses_;
   IcuFormatting formatting_;
   LocalCloudDocuments drive_;
-  LocalFileManager fileManager_{&drive_.removals()};
+  LocalFileManager fileManager_{&drive_.removals(), readNameRules(drive_.layout().accountFile())};
   LocalDocumentStore documentStore_;
   LocalFileProvider fileProvider_;
   LocalResourceValues resourceValues_;

@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include "host/files/name_rules.h"
 #include "host/files/tree_removals.h"
 #include "platform/file_manager.h"
 
@@ -9,8 +10,9 @@ namespace vaelo {
 /// The file system of this machine. An item that is not downloaded is moved and removed with its promise.
 class LocalFileManager : public FileManager {
  public:
-  /// Folders that are removed go through `removals`, which outlives it; without, they are removed on the spot.
-  explicit LocalFileManager(TreeRemovals* removals = nullptr) : removals_(removals) {}
+  /// Folders that are removed go through `removals`, which outlives it; without, they are removed on the spot. What `rules`
+  /// take for one name is taken.
+  explicit LocalFileManager(TreeRemovals* removals = nullptr, NameRules rules = {}) : removals_(removals), rules_(rules) {}
   bool fileExistsAtPath(const std::string& path, bool* isDirectory = nullptr) override;
   Result<FileAttributes> attributesOfItemAtPath(const std::string& path) override;
   Result<std::string> destinationOfSymbolicLinkAtPath(const std::string& path) override;
@@ -25,6 +27,7 @@ class LocalFileManager : public FileManager {
 
  private:
   TreeRemovals* removals_;
+  const NameRules rules_;
 };
 
 }  // namespace vaelo

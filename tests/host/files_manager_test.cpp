@@ -155,6 +155,39 @@ TEST_F(FilesManagerTest, AMoveNeverReplaces) {
   EXPECT_EQ(read(drive + "/b"), "there");
 }
 
+// The disk tells the names apart, the store would keep one of the items only.
+TEST_F(FilesManagerTest, NamesThatTheStoreTakesForOneAreTaken) {
+  const std::string one = drive + "/Caf\u00E9";
+  const std::string two = drive + "/Cafe\u0301";
+  write(one);
+  promise(drive, "FAR");
+  write(drive + "/a");
+  const auto codeOf = [this](NameRules rules, const std::string& to) {
+    const auto error = LocalFileManager(nullptr, rules).moveItemAtURL(URL(drive + "/a"), URL(to));
+    return error ? error->code : 0;
+  };
+  EXPECT_EQ(codeOf({true, false}, drive + "/caf\u00E9"), FileErrorCode::WriteFileExists);
+  EXPECT_EQ(codeOf({true, false}, drive + "/far"), FileErrorCode::WriteFileExists);
+  EXPECT_EQ(codeOf({false, true}, two), FileErrorCode::WriteFileExists);
+  EXPECT_EQ(codeOf({true, true}, drive + "/CAFE\u0301"), FileErrorCode::WriteFileExists);
+  LocalFileManager folding(nullptr, {true, true});
+  EXPECT_EQ(folding.createDirectoryAtURL(URL(two))->code, FileErrorCode::WriteFileExists);
+  EXPECT_FALSE(folding.moveItemAtURL(URL(one), URL(two))) << "another spelling of its own name";
+  EXPECT_TRUE(exists(two));
+  EXPECT_FALSE(folding.moveItemAtURL(URL(drive + "/a"), URL(drive + "/A")));
+  EXPECT_EQ(codeOf({}, drive + "/a"), FileErrorCode::NoSuchFile) << "it has moved";
+  EXPECT_FALSE(move(drive + "/A", one)) << "where they are told apart, they may stand side by side";
+}
+
+TEST_F(FilesManagerTest, WhatTheStoreFoldsStandsInTheAccountsFile) {
+  write(root + "/account.ini", "[Account]\nName=x\n");
+  EXPECT_FALSE(readNameRules(root + "/account.ini").foldAny());
+  EXPECT_FALSE(readNameRules(root + "/none").foldAny());
+  write(root + "/account.ini", "[Account]\nName=x\n[Store]\nFoldsCase=true\n");
+  EXPECT_TRUE(readNameRules(root + "/account.ini").foldsCase);
+  EXPECT_FALSE(readNameRules(root + "/account.ini").foldsNormalization);
+}
+
 TEST_F(FilesManagerTest, AHardLinkIsAnotherItem) {
   write(drive + "/a");
   ASSERT_EQ(::link((drive + "/a").c_str(), (drive + "/b").c_str()), 0);
