@@ -120,14 +120,14 @@ void byKey(benchmark::State& state, bool folders) {
   World world(folders);
   measure(state, world, [&world] { gtk_selection_model_select_all(world.list->folderView().model().selectionModel()); });
 }
-BENCHMARK_CAPTURE(byKey, documents, false)->UseManualTime()->Unit(benchmark::kMillisecond);
-BENCHMARK_CAPTURE(byKey, folders, true)->UseManualTime()->Unit(benchmark::kMillisecond);
+BENCHMARK_CAPTURE(byKey, documents, false)->UseManualTime()->Iterations(20)->Unit(benchmark::kMillisecond);
+BENCHMARK_CAPTURE(byKey, folders, true)->UseManualTime()->Iterations(20)->Unit(benchmark::kMillisecond);
 
 void byCommand(benchmark::State& state) {
   World world(false);
   measure(state, world, [&world] { world.navigation->selectAllItems(nullptr); });
 }
-BENCHMARK(byCommand)->UseManualTime()->Unit(benchmark::kMillisecond);
+BENCHMARK(byCommand)->UseManualTime()->Iterations(20)->Unit(benchmark::kMillisecond);
 
 }  // namespace
 

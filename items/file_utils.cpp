@@ -8,9 +8,12 @@ namespace vaelo {
 
 namespace {
 
-bool existsAs(const URL& url, bool directory) {
+enum class ItemKind { None, File, Directory };
+
+ItemKind kindOf(const URL& url) {
   bool isDirectory = false;
-  return Platform::current().fileManager.fileExistsAtPath(url.path(), &isDirectory) && isDirectory == directory;
+  if (!Platform::current().fileManager.fileExistsAtPath(url.path(), &isDirectory)) return ItemKind::None;
+  return isDirectory ? ItemKind::Directory : ItemKind::File;
 }
 
 Error baseError(int code) { return Error{FileErrorDomain, code, {}, {}, {}}; }
@@ -63,9 +66,9 @@ std::optional<Error> moveWithNotices(FileCoordinator& coordinator, const URL& so
 
 bool FileUtils::exists(const URL& url) { return Platform::current().fileManager.fileExistsAtPath(url.path()); }
 
-bool FileUtils::isFile(const URL& url) { return existsAs(url, false); }
+bool FileUtils::isFile(const URL& url) { return kindOf(url) == ItemKind::File; }
 
-bool FileUtils::isDir(const URL& url) { return existsAs(url, true); }
+bool FileUtils::isDir(const URL& url) { return kindOf(url) == ItemKind::Directory; }
 
 std::optional<Error> FileUtils::mkdir(const URL& url) {
   VLO_DEBUG("Creating directory: '%@'", url);
@@ -95,12 +98,14 @@ std::optional<Error> FileUtils::moveTo(const URL& source, const URL& destination
     VLO_DEBUG("Move: src and dest are the same");
     return std::nullopt;
   }
-  if (!exists(source)) VLO_INFO("Move: source filename does not exist, must be a fault.");
-  if (isFile(source) && isDir(destination)) {
+  const ItemKind kind = kindOf(source);
+  if (kind == ItemKind::None) VLO_INFO("Move: source filename does not exist, must be a fault.");
+  const ItemKind kindThere = kindOf(destination);
+  if (kind == ItemKind::File && kindThere == ItemKind::Directory) {
     VLO_ERROR("Move: must move a file to a file (dest is a dir)");
     return baseError(FileErrorCode::FeatureUnsupported);
   }
-  if (isDir(source) && isFile(destination)) {
+  if (kind == ItemKind::Directory && kindThere == ItemKind::File) {
     VLO_ERROR("Move: must move a dir to a dir (dest is a file)");
     return baseError(FileErrorCode::FeatureUnsupported);
   }

@@ -3,6 +3,7 @@
 
 #include <fcntl.h>
 #include <sys/file.h>
+#include <sys/stat.h>
 
 #include <algorithm>
 #include <cerrno>
@@ -58,9 +59,11 @@ class LocalFileCoordination::Turn {
     access_.underWay = true;
   }
   ~Turn() {
+    if (lockFile_) flock(lockFile_.get(), LOCK_UN);
     {
       const std::lock_guard lock(owner_.mutex_);
       std::erase(owner_.accesses_, &access_);
+      if (lockFile_) owner_.spareLock_ = std::move(lockFile_);
     }
     owner_.changed_.notify_all();
   }
@@ -71,7 +74,14 @@ class LocalFileCoordination::Turn {
 
  private:
   void lockBetweenPrograms(int mode) {
-    lockFile_ = UniqueFd(open(owner_.lockFile_.c_str(), O_RDWR | O_CREAT | O_NOFOLLOW | O_CLOEXEC, 0600));
+    {
+      const std::lock_guard lock(owner_.mutex_);
+      lockFile_ = std::move(owner_.spareLock_);
+    }
+    // Somebody may have removed the file; then other programs lock the next one of its name.
+    struct stat info {};
+    if (lockFile_ && (fstat(lockFile_.get(), &info) != 0 || info.st_nlink == 0)) lockFile_ = UniqueFd();
+    if (!lockFile_) lockFile_ = UniqueFd(open(owner_.lockFile_.c_str(), O_RDWR | O_CREAT | O_NOFOLLOW | O_CLOEXEC, 0600));
     while (lockFile_ && flock(lockFile_.get(), mode) != 0 && errno == EINTR) {
     }
   }

@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "host/files/presenter_list.h"
+#include "host/support/unique_fd.h"
 #include "platform/file_coordinator.h"
 
 namespace vaelo {
@@ -43,7 +44,8 @@ class LocalFileCoordination : public FileCoordination {
 
   const std::string lockFile_;
   std::function<void(const URL&, const URL&)> moved_;
-  std::mutex mutex_;  // guards the two below
+  std::mutex mutex_;    // guards the three below
+  UniqueFd spareLock_;  // the lock file, open and free, since opening it for each of thousands of moves takes long
   std::condition_variable changed_;
   std::vector<const Access*> accesses_;  // waiting and under way, in the order in which they came
   PresenterList presenters_;             // has its own lock; last, since it looks at the disk from a thread of its own

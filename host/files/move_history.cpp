@@ -16,8 +16,9 @@ namespace {
 
 /// Of an item that is not downloaded, its promise.
 std::optional<struct stat> statusOf(const URL& item) {
-  const std::optional<std::string> physical = physicalPathOf(item.path());
   struct stat info {};
+  if (lstat(item.path().c_str(), &info) == 0) return info;
+  const std::optional<std::string> physical = physicalPathOf(item.path());
   if (!physical || lstat(physical->c_str(), &info) != 0) return std::nullopt;
   return info;
 }
