@@ -5,6 +5,7 @@ import subprocess
 import unittest
 
 from harness import App, pause, wait_for
+from touch_display import BEGIN, END, TouchApp
 
 LINES = ("The river rises in the hills", "and every river has a name", "until it meets the sea")
 
@@ -33,6 +34,7 @@ def portable_document(pages, lines=LINES):
 class Window(unittest.TestCase):
     """A window that shows a document of three pages; the tests are in what derives from it."""
     size = (800, 640)
+    app_type = App
 
     def setUp(self):
         def prepare(app):
@@ -41,7 +43,7 @@ class Window(unittest.TestCase):
             for folder in ("Desktop", "Documents"):
                 (app.drive / folder).mkdir()
             (app.drive / "Rivers.pdf").write_bytes(portable_document(3))
-        self.app = App(prepare=prepare, size=self.size)
+        self.app = self.app_type(prepare=prepare, size=self.size)
         self.addCleanup(self.app.close)
         self.file = self.app.drive / "Rivers.pdf"
         self.original = self.file.read_bytes()
@@ -233,6 +235,39 @@ class OnAPhone(Window):
         app.click("Done")
         app.key("Escape")
         app.wait_title("Vaelo Drive")
+
+
+class Fingers(Window):
+    size = (520, 640)
+    app_type = TouchApp
+
+    def test_one_finger_scrolls_without_a_tool_and_draws_with_one(self):
+        app = self.app
+        screen = app.desktop.screen
+        app.tap("Markup")
+        self.wait_for_tools()
+        app.tap("Draw")
+        screen.drag(self.page(60, 300), self.page(300, 100), 0.4)
+        self.wait_for_marks("Ink")
+        self.assertTrue(app.find("1 of 3"))
+        app.tap("Draw")
+        for _ in range(2):
+            screen.drag(self.page(60, 300), self.page(60, 20), 0.3)
+        wait_for("another page", lambda: not app.find("1 of 3"))
+        self.assertEqual(self.file.read_bytes().count(b"/Subtype /Ink"), 1)
+
+    def test_a_long_press_selects_a_word(self):
+        app = self.app
+        place = self.page(50, 55)
+        app.desktop.screen.touch(BEGIN, *place)
+        pause(1)
+        app.desktop.screen.touch(END, *place)
+        app.wait("Copy", "menu item")
+        pause(0.5)
+        app.key("Escape", "ctrl+c", "ctrl+f")
+        app.wait("Find in this document")
+        app.key("ctrl+v")
+        app.wait("1 of 9")  # "The", whatever its case
 
 
 if __name__ == "__main__":

@@ -54,9 +54,10 @@ PagesPointer::~PagesPointer() {
   }
 }
 
+// By the event, since its device may be the pointer that a finger moves too.
 bool PagesPointer::isFinger() const {
-  GdkDevice* device = gtk_event_controller_get_current_event_device(GTK_EVENT_CONTROLLER(drag_));
-  return device && gdk_device_get_source(device) == GDK_SOURCE_TOUCHSCREEN;
+  GdkEvent* event = gtk_event_controller_get_current_event(GTK_EVENT_CONTROLLER(drag_));
+  return event && gdk_event_get_event_type(event) == GDK_TOUCH_BEGIN;
 }
 
 int PagesPointer::countPresses(double x, double y) {
