@@ -16,7 +16,8 @@ PagesPointer::PagesPointer(PagesCanvas& canvas, Events events)
       events_(std::move(events)),
       drag_(gtk_gesture_drag_new()),
       longPress_(gtk_gesture_long_press_new()),
-      secondary_(gtk_gesture_click_new()) {
+      secondary_(gtk_gesture_click_new()),
+      click_(gtk_gesture_click_new()) {
   gtk_gesture_single_set_touch_only(GTK_GESTURE_SINGLE(longPress_), TRUE);
   gtk_gesture_single_set_button(GTK_GESTURE_SINGLE(secondary_), GDK_BUTTON_SECONDARY);
   g_signal_connect(drag_, "drag-begin",
@@ -39,8 +40,13 @@ PagesPointer::PagesPointer(PagesCanvas& canvas, Events events)
   g_signal_connect(
       secondary_, "pressed",
       G_CALLBACK(+[](GtkGestureClick*, int, double x, double y, PagesPointer* self) { self->events_.menu(x, y); }), this);
+  g_signal_connect(click_, "released",
+                   G_CALLBACK(+[](GtkGestureClick*, int presses, double x, double y, PagesPointer* self) {
+                     if (presses == 1) self->events_.click(x, y);
+                   }),
+                   this);
   gtk_gesture_group(longPress_, drag_);
-  for (GtkGesture* gesture : {drag_, longPress_, secondary_}) {
+  for (GtkGesture* gesture : {drag_, longPress_, secondary_, click_}) {
     gtk_widget_add_controller(canvas_.widget(), GTK_EVENT_CONTROLLER(gesture));
   }
 }
@@ -48,7 +54,7 @@ PagesPointer::PagesPointer(PagesCanvas& canvas, Events events)
 PagesPointer::~PagesPointer() {
   stopScrolling();
   dragging_ = false;
-  for (GtkGesture* gesture : {drag_, longPress_, secondary_}) {
+  for (GtkGesture* gesture : {drag_, longPress_, secondary_, click_}) {
     g_signal_handlers_disconnect_by_data(gesture, this);
     gtk_widget_remove_controller(canvas_.widget(), GTK_EVENT_CONTROLLER(gesture));
   }

@@ -20,7 +20,8 @@ class PagesPointer {
     std::function<void(bool cancelled)> end;
     std::function<void(double x, double y)> longPress;  ///< of a finger whose drag was not wanted; it may go on with moves
     std::function<void(double x, double y)> menu;
-    std::function<bool()> scrollsAtEdges;  ///< whether a drag beyond the window's edge scrolls
+    std::function<void(double x, double y)> click;  ///< of a pointer or a finger, without a drag
+    std::function<bool()> scrollsAtEdges;           ///< whether a drag beyond the window's edge scrolls
   };
 
   PagesPointer(PagesCanvas& canvas, Events events);
@@ -43,6 +44,7 @@ class PagesPointer {
   GtkGesture* drag_;
   GtkGesture* longPress_;
   GtkGesture* secondary_;
+  GtkGesture* click_;
   bool dragging_ = false;
   double x_ = 0;
   double y_ = 0;

@@ -45,7 +45,7 @@ void PortableDocumentMarkup::end() {
 void PortableDocumentMarkup::changed() {
   bar_.show(marks_->state(), !marks_->marks().empty());
   canvas_.redraw();
-  if (!isSaving()) events_.settled();
+  if (!isSaving() && !isUnsaved()) events_.settled();
 }
 
 bool PortableDocumentMarkup::maySave() {
@@ -131,6 +131,23 @@ void PortableDocumentMarkup::draw(const PageOverlay& overlay, int page) const {
     }
   }
   if (stroke_ && stroke_->page == page) overlay.draw(*stroke_, canvas_.width(), canvas_.height());
+}
+
+bool PortableDocumentMarkup::isUnsaved() const {
+  using State = PortableDocumentMarks::State;
+  return marks_ && (marks_->state() == State::Unsaved || marks_->state() == State::Failed);
+}
+
+const PageMark* PortableDocumentMarkup::noteAt(const PagePlace& place) const {
+  if (!marks_) return nullptr;
+  const std::vector<PageMark>& all = marks_->marks();
+  const auto hit = std::find_if(all.rbegin(), all.rend(), [&](const PageMark& mark) {
+    if (mark.kind != PageMark::Kind::Note || mark.page != place.page) return false;
+    const double x = place.x - mark.points.front()[0];
+    const double y = place.y - mark.points.front()[1];
+    return x >= 0 && y >= 0 && x <= PageMark::NoteSide && y <= PageMark::NoteSide;
+  });
+  return hit == all.rend() ? nullptr : &*hit;
 }
 
 }  // namespace vaelo

@@ -38,6 +38,8 @@ class PortableDocumentMarkup {
   void end();
   bool mayMark() const { return marks_ != nullptr; }
   bool isSaving() const { return marks_ && marks_->state() == PortableDocumentMarks::State::Saving; }
+  /// Marks wait to be saved, or could not be saved.
+  bool isUnsaved() const;
   /// True when what stands at the path was saved here.
   bool wrote(const std::string& path) const { return marks_ && marks_->wrote(path); }
 
@@ -51,6 +53,8 @@ class PortableDocumentMarkup {
   void askForNote(double x, double y);
   bool undo();
   void draw(const PageOverlay& overlay, int page) const;
+  /// The note of this time at the place; null when there is none.
+  const PageMark* noteAt(const PagePlace& place) const;
 
   const PortableDocumentMarks* marks() const { return marks_.get(); }
   NotePopover& note() { return note_; }

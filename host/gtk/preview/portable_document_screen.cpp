@@ -42,13 +42,15 @@ PortableDocumentScreen::PortableDocumentScreen(const PreviewedDocument& document
                [this] {
                  if (std::exchange(refreshWhenSaved_, false)) refresh();
                }}),
+      linkPopover_(pages_, canvas_.widget()),
       buttons_(markup_.bar(), G_CALLBACK(+[](PortableDocumentScreen* self) { self->toggleFind(); }), this),
-      pointer_(canvas_,
-               {[this](bool finger) { return source_ && (!finger || markup_.tool() != MarkTool::None); },
-                [this](double x, double y, int presses) { press(x, y, presses); },
-                [this](double x, double y) { drag(x, y); }, [this](bool cancelled) { release(cancelled); },
-                [this](double x, double y) { longPress(x, y); }, [this](double x, double y) { selecting_.showMenu(x, y); },
-                [this] { return markup_.tool() == MarkTool::None || markup_.tool() == MarkTool::Highlight; }}),
+      pointer_(
+          canvas_,
+          {[this](bool finger) { return source_ && (!finger || markup_.tool() != MarkTool::None); },
+           [this](double x, double y, int presses) { press(x, y, presses); }, [this](double x, double y) { drag(x, y); },
+           [this](bool cancelled) { release(cancelled); }, [this](double x, double y) { longPress(x, y); },
+           [this](double x, double y) { selecting_.showMenu(x, y); }, [this](double x, double y) { click(x, y); },
+           [this] { return markup_.tool() == MarkTool::None || markup_.tool() == MarkTool::Highlight; }}),
       indicator_([this](int page) {
         canvas_.showPage(page);
         gtk_widget_grab_focus(canvas_.widget());
@@ -89,10 +91,12 @@ void PortableDocumentScreen::opened(const PortableDocumentSource::Opened& opened
   if (!opened.error.empty()) return events_.failed(messageForDecoderError(opened.error));
   pictures_.reset();
   texts_.reset();
+  links_.reset();
   find_.setSource(nullptr, 0);
   selecting_.clear();
   source_ = std::move(nextSource_);
   texts_ = std::make_unique<PagesTexts>(*source_, [this] { selecting_.textRead(); });
+  links_ = std::make_unique<PagesLinks>(*source_);
   pictures_ = std::make_unique<PagesPictures>(*source_, [this] { pictureArrived(); });
   GtkWidget* page = gtk_widget_get_parent(stack_.get());
   if (page && gtk_widget_get_width(page) > 0) canvas_.expectWidth(gtk_widget_get_width(page));
@@ -183,9 +187,10 @@ void PortableDocumentScreen::drawProblem(GtkSnapshot* snapshot, const std::strin
   gtk_snapshot_restore(snapshot);
 }
 
-// What was saved here is on the screen already. While it is being saved it can't be told from what others write.
+// What was saved here is on the screen already. While it is being saved it can't be told from what others write, and what
+// could not be saved is nowhere else.
 void PortableDocumentScreen::refresh() {
-  refreshWhenSaved_ = markup_.isSaving();
+  refreshWhenSaved_ = markup_.isSaving() || markup_.isUnsaved();
   if (refreshWhenSaved_ || markup_.wrote(document_.path)) return;
   nextSource_.reset();
   load("");
@@ -281,6 +286,27 @@ void PortableDocumentScreen::longPress(double x, double y) {
   longPressed_ = true;
   lastX_ = x;
   lastY_ = y;
+}
+
+void PortableDocumentScreen::click(double x, double y) {
+  if (!links_ || markup_.tool() != MarkTool::None || canvas_.layout().count() == 0) return;
+  double left = 0;
+  double top = 0;
+  gtk_widget_translate_coordinates(canvas_.widget(), pages_, x, y, &left, &top);
+  const GdkRectangle pointed = {static_cast<int>(left), static_cast<int>(top), 1, 1};
+  const PagePlace place = canvas_.placeAt(x, y);
+  if (const PageMark* note = markup_.noteAt(place)) return linkPopover_.showNote(pointed, note->text);
+  links_->at(place, [this, pointed](const PageLink& link) { follow(link, pointed); });
+}
+
+void PortableDocumentScreen::follow(const PageLink& link, const GdkRectangle& place) {
+  if (link.kind == PageLink::Kind::Page) {
+    canvas_.showPage(link.page, link.top);
+  } else if (link.kind == PageLink::Kind::Address) {
+    linkPopover_.showAddress(place, link.text);
+  } else {
+    linkPopover_.showNote(place, link.text);
+  }
 }
 
 }  // namespace vaelo

@@ -10,9 +10,11 @@
 #include "host/gtk/preview/document_buttons.h"
 #include "host/gtk/preview/document_view.h"
 #include "host/gtk/preview/find_bar.h"
+#include "host/gtk/preview/link_popover.h"
 #include "host/gtk/preview/pages_canvas.h"
 #include "host/gtk/preview/pages_gestures.h"
 #include "host/gtk/preview/pages_indicator.h"
+#include "host/gtk/preview/pages_links.h"
 #include "host/gtk/preview/pages_pictures.h"
 #include "host/gtk/preview/pages_pointer.h"
 #include "host/gtk/preview/pages_selecting.h"
@@ -51,6 +53,8 @@ class PortableDocumentScreen {
   void press(double x, double y, int presses);
   void drag(double x, double y);
   void release(bool cancelled);
+  void click(double x, double y);
+  LinkPopover& linkPopover() { return linkPopover_; }
 
  private:
   bool key(guint key, GdkModifierType state);
@@ -58,6 +62,7 @@ class PortableDocumentScreen {
   void toolChosen();
   void beginMarkup(bool mayBeMarked);
   void showFound();
+  void follow(const PageLink& link, const GdkRectangle& place);
   void load(const std::string& password);
   void opened(const PortableDocumentSource::Opened& opened, const std::string& password);
   void askForSizes(std::size_t known);
@@ -79,6 +84,7 @@ class PortableDocumentScreen {
   PortableDocumentFind find_;
   PagesSelecting selecting_;
   PortableDocumentMarkup markup_;
+  LinkPopover linkPopover_;
   DocumentButtons buttons_;
   PagesPointer pointer_;
   PagesIndicator indicator_;
@@ -86,6 +92,7 @@ class PortableDocumentScreen {
   std::unique_ptr<PortableDocumentSource> source_;
   std::unique_ptr<PagesPictures> pictures_;
   std::unique_ptr<PagesTexts> texts_;
+  std::unique_ptr<PagesLinks> links_;
   std::unique_ptr<PortableDocumentSource> nextSource_;  // while the document is read anew
   bool shown_ = false;
   bool refreshWhenSaved_ = false;
