@@ -3,6 +3,7 @@
 
 #include <archive.h>
 #include <archive_entry.h>
+#include <unistd.h>
 
 #include <algorithm>
 #include <chrono>
@@ -27,7 +28,7 @@ constexpr std::chrono::milliseconds TimeOfAnAnswer(400);
 DecoderMessage error(const char* reason) { return {std::string("error ") + reason, UniqueFd()}; }
 
 // Without those that run programs of their own, and without lists of files that are elsewhere.
-void supportAll(archive* opened) {
+void supportFilters(archive* opened) {
   for (auto* support :
        {archive_read_support_filter_gzip, archive_read_support_filter_bzip2, archive_read_support_filter_xz,
         archive_read_support_filter_lzma, archive_read_support_filter_zstd, archive_read_support_filter_lz4,
@@ -83,18 +84,21 @@ ArchiveDecoder::ArchiveDecoder(UniqueFd document) : document_(std::move(document
 ArchiveDecoder::~ArchiveDecoder() = default;
 
 DecoderMessage ArchiveDecoder::answer(const std::string& request) {
-  if (request == "open") return open(false);
-  if (request == "open single") return open(true);
+  if (request == "open") return open(Reading::Archive);
+  if (request == "open single") return open(Reading::Single);
   if (request == "next" && archive_) return next();
   return error(DecoderError::Unsupported);
 }
 
-DecoderMessage ArchiveDecoder::open(bool single) {
-  single_ = single;
+DecoderMessage ArchiveDecoder::open(Reading reading) {
+  reading_ = reading;
   archive_.reset(archive_read_new());
   if (!archive_) return error(DecoderError::TooBig);
-  supportAll(archive_.get());
-  single ? static_cast<void>(archive_read_support_format_raw(archive_.get())) : supportFormats(archive_.get());
+  supportFilters(archive_.get());
+  if (reading == Reading::Single) archive_read_support_format_raw(archive_.get());
+  if (reading == Reading::Archive) supportFormats(archive_.get());
+  if (reading == Reading::WithoutDirectory) archive_read_support_format_zip_streamable(archive_.get());
+  if (::lseek(document_.get(), 0, SEEK_SET) != 0) return error(DecoderError::Unreadable);
   if (archive_read_open_fd(archive_.get(), document_.get(), BlockBytes) != ARCHIVE_OK) return failure();
   return {"ok", UniqueFd()};
 }
@@ -109,7 +113,16 @@ DecoderMessage ArchiveDecoder::next() {
   std::string lines;
   int count = 0;
   const char* state = readSome(lines, count);
-  if (listed_ == 0 && std::strcmp(state, "broken") == 0) return failure();
+  if (listed_ == 0 && std::strcmp(state, "broken") == 0) {
+    if (reading_ != Reading::Archive) return failure();
+    // What a damaged directory at its end doesn't tell, a zip archive says before each of its files too.
+    const DecoderMessage reason = failure();
+    open(Reading::WithoutDirectory);
+    state = readSome(lines, count);
+    if (listed_ == 0) return {reason.text, UniqueFd()};
+  }
+  // It has been read in this way because its directory is gone.
+  if (reading_ == Reading::WithoutDirectory && std::strcmp(state, "end") == 0) state = "broken";
   std::string answer = "ok " + std::to_string(count) + " " + state;
   if (lines.empty()) return {std::move(answer), UniqueFd()};
   PixelFile file(lines.size());
@@ -120,6 +133,7 @@ DecoderMessage ArchiveDecoder::next() {
 
 const char* ArchiveDecoder::readSome(std::string& lines, int& count) {
   const auto end = std::chrono::steady_clock::now() + TimeOfAnAnswer;
+  const bool isSingle = reading_ == Reading::Single;
   int retries = 0;
   while (count < EntriesOfAnAnswer && std::chrono::steady_clock::now() < end) {
     archive_entry* entry = nullptr;
@@ -128,14 +142,14 @@ const char* ArchiveDecoder::readSome(std::string& lines, int& count) {
     if (result == ARCHIVE_RETRY && ++retries < MostRetries) continue;
     if (result < ARCHIVE_WARN) return "broken";
     // What is not even compressed is no compressed document.
-    if (single_ && archive_filter_count(archive_.get()) < 2) return "broken";
+    if (isSingle && archive_filter_count(archive_.get()) < 2) return "broken";
     if (listed_ >= MostEntries || listedBytes_ >= MostBytes) return "full";
-    const std::string line = lineFor(entry, single_);
+    const std::string line = lineFor(entry, isSingle);
     lines += line;
     listedBytes_ += line.size();
     ++listed_;
     ++count;
-    if (single_) return "end";
+    if (isSingle) return "end";
   }
   return "more";
 }

@@ -30,14 +30,15 @@ class ArchiveDecoder : public Decoder {
     void operator()(archive* opened) const;
   };
 
-  DecoderMessage open(bool single);
+  enum class Reading { Archive, Single, WithoutDirectory };
+  DecoderMessage open(Reading reading);
   DecoderMessage next();
   const char* readSome(std::string& lines, int& count);
   DecoderMessage failure();
 
   UniqueFd document_;
   std::unique_ptr<archive, Free> archive_;
-  bool single_ = false;
+  Reading reading_ = Reading::Archive;
   int listed_ = 0;
   std::size_t listedBytes_ = 0;
 };

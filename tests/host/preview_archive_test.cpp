@@ -182,6 +182,16 @@ TEST_F(PreviewArchiveTest, OfAnArchiveThatIsCutTheBeginningIsListed) {
   EXPECT_NE(shown.find("The archive is damaged"), std::string::npos) << shown;
 }
 
+TEST_F(PreviewArchiveTest, OfAZipWhoseDirectoryIsDamagedTheFilesAreListed) {
+  std::string damaged = pack(Zip, Letters);
+  damaged[damaged.find("PK\x01\x02") + 2] = 'x';
+  openArchive("a.zip", "application/zip", damaged);
+  ASSERT_EQ(failure_, "");
+  const std::string shown = rows();
+  EXPECT_NE(shown.find("Picture.png\n"), std::string::npos) << shown;
+  EXPECT_NE(shown.find("The archive is damaged"), std::string::npos) << shown;
+}
+
 TEST_F(PreviewArchiveTest, ALockedArchiveIsListedOrSaysThatItIsLocked) {
   openArchive("a.zip", "application/zip", pack({Zip.format, Zip.filter, "zip:encryption=aes256"}, Letters));
   ASSERT_EQ(failure_, "");

@@ -1,6 +1,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/preview/archive_load.h"
 
+#include <algorithm>
+#include <cstdlib>
+
 #include "host/gtk/preview/shared_bytes.h"
 
 namespace vaelo {
@@ -10,6 +13,7 @@ namespace {
 // Names in a compressed archive stand between all its content, which may be a day's work.
 constexpr gint64 ListingTakes = 15 * G_TIME_SPAN_SECOND;
 constexpr std::chrono::seconds AnswerTakes(10);
+constexpr int MostEntries = 1'000'000;  // of an answer
 
 }  // namespace
 
@@ -39,7 +43,12 @@ void ArchiveLoad::received(DecoderProcess::Answer answer) {
   }
   if (GBytes* lines = takeSharedBytes(std::move(answer.file), 1)) lines_.emplace_back(lines, g_bytes_unref);
   const std::string state = answer.text.substr(answer.text.find(' ') + 1);
-  if (state == "more") return g_get_monotonic_time() < until_ ? askForMore() : finish(End::Slow);
+  if (state == "more") {
+    if (g_get_monotonic_time() >= until_) return finish(End::Slow);
+    entries_ += std::clamp(std::atoi(answer.text.c_str()), 0, MostEntries);
+    askForMore();
+    return events_.progress(entries_);
+  }
   if (state == "full") return finish(End::Full);
   finish(state == "end" ? End::Whole : End::Broken);
 }

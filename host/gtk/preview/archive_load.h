@@ -21,6 +21,7 @@ class ArchiveLoad {
   struct Events {
     std::function<void(std::shared_ptr<const ArchiveListing> listing, End end)> listed;
     std::function<void(const std::string& error)> failed;  ///< a word of DecoderError
+    std::function<void(int entries)> progress;             ///< so many are listed, and there are more
   };
 
   /// `single`: no archive, but one compressed document. `unnamed` as ArchiveListing takes it. No event comes before the
@@ -39,6 +40,7 @@ class ArchiveLoad {
   std::unique_ptr<DecoderProcess> process_;
   Worker worker_;
   std::vector<std::shared_ptr<GBytes>> lines_;
+  int entries_ = 0;
   gint64 until_;
 };
 

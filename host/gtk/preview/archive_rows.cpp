@@ -20,7 +20,7 @@ struct RowObject {
 
 void finalizeRow(GObject* object) {
   delete reinterpret_cast<RowObject*>(object)->listing;
-  static_cast<GObjectClass*>(g_type_class_peek_parent(G_OBJECT_GET_CLASS(object)))->finalize(object);
+  static_cast<GObjectClass*>(g_type_class_peek(G_TYPE_OBJECT))->finalize(object);
 }
 
 GType rowType() {
@@ -36,20 +36,39 @@ const ArchiveListing::Entry& entryOf(gpointer object) {
   return (*row->listing)->entry(row->index);
 }
 
+gpointer makeRow(GType type, const Listing& listing, std::uint32_t index) {
+  auto* row = static_cast<RowObject*>(g_object_new(type, nullptr));
+  row->listing = new Listing(listing);
+  row->index = index;
+  return row;
+}
+
+// Of a folder of many entries only the rows that are seen are made, so that opening it is quick.
+void initModel(gpointer interface, gpointer) {
+  auto* model = static_cast<GListModelInterface*>(interface);
+  model->get_item_type = [](GListModel*) { return rowType(); };
+  model->get_n_items = [](GListModel* folder) { return static_cast<guint>(entryOf(folder).inside.size()); };
+  model->get_item = [](GListModel* folder, guint place) -> gpointer {
+    const std::vector<std::uint32_t>& inside = entryOf(folder).inside;
+    const Listing& listing = *reinterpret_cast<RowObject*>(folder)->listing;
+    return place < inside.size() ? makeRow(rowType(), listing, inside[place]) : nullptr;
+  };
+}
+
+// A row as well, that of the folder.
+GType modelType() {
+  static const GType type = [] {
+    const GType made = g_type_register_static_simple(rowType(), "VaeloArchiveFolder", sizeof(GObjectClass), nullptr,
+                                                     sizeof(RowObject), nullptr, G_TYPE_FLAG_NONE);
+    const GInterfaceInfo interface = {initModel, nullptr, nullptr};
+    g_type_add_interface_static(made, G_TYPE_LIST_MODEL, &interface);
+    return made;
+  }();
+  return type;
+}
+
 GListModel* rowsIn(const Listing& listing, std::uint32_t folder) {
-  GListStore* store = g_list_store_new(rowType());
-  const std::vector<std::uint32_t>& inside = listing->entry(folder).inside;
-  std::vector<gpointer> rows;
-  rows.reserve(inside.size());
-  for (const std::uint32_t index : inside) {
-    auto* row = static_cast<RowObject*>(g_object_new(rowType(), nullptr));
-    row->listing = new Listing(listing);
-    row->index = index;
-    rows.push_back(row);
-  }
-  g_list_store_splice(store, 0, 0, rows.data(), static_cast<guint>(rows.size()));
-  for (gpointer row : rows) g_object_unref(row);
-  return G_LIST_MODEL(store);
+  return G_LIST_MODEL(makeRow(modelType(), listing, folder));
 }
 
 GListModel* rowsInside(gpointer object, gpointer) {

@@ -145,7 +145,10 @@ class ArchiveView : public DocumentView {
         document_.path, has(CompressedTypes, document_.contentType), withoutExtension(document_.name),
         ArchiveLoad::Events{
             [this](std::shared_ptr<const ArchiveListing> listing, ArchiveLoad::End end) { show(std::move(listing), end); },
-            [this](const std::string& error) { events_.failed(messageForDecoderError(error)); }});
+            [this](const std::string& error) { events_.failed(messageForDecoderError(error)); },
+            [this](int entries) {
+              events_.progress(counted(static_cast<std::size_t>(entries), "entry", "entries") + " so far");
+            }});
   }
 
  private:

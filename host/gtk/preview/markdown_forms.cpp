@@ -29,7 +29,7 @@ struct Colours {
 };
 
 constexpr Colours Light = {"#241f31", "#1a5fb4", "#5e5c64", "#f0eff1", "#d5d3d7"};
-constexpr Colours Dark = {"#ffffff", "#78aeed", "#b0aeb5", "#2a2a2c", "#4a4a4e"};
+constexpr Colours Dark = {"#ffffff", "#78aeed", "#b0aeb5", "#343437", "#4a4a4e"};
 
 }  // namespace
 
