@@ -84,6 +84,12 @@ TEST_F(PreviewMarkdownTest, ListsHangAndNest) {
   EXPECT_EQ(formsOf("to do "), "item1");
 }
 
+TEST_F(PreviewMarkdownTest, WhatIsReadFromTheRightIsMovedInFromThere) {
+  openMarkdown("> ציטוט\n\n- אחת\n");
+  EXPECT_EQ(formsOf("ציטוט"), "paragraph1r quote");
+  EXPECT_EQ(formsOf("אחת"), "item1r");
+}
+
 TEST_F(PreviewMarkdownTest, TablesStandInColumns) {
   openMarkdown("| Name | Number |\n|:-----|-------:|\n| **Ada** | 1 |\n| 東京 | 1000 |\n\nAfter | it\n");
   EXPECT_EQ(text(), "Name │ Number\n─────┼───────\nAda  │      1\n東京 │   1000\nAfter | it");

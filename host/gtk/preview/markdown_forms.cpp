@@ -1,8 +1,12 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/preview/markdown_forms.h"
 
+#include <unicode/uchar.h>
+
 #include <algorithm>
 #include <charconv>
+
+#include "host/support/glib_ptr.h"
 
 namespace vaelo {
 
@@ -18,6 +22,17 @@ int numberIn(std::string_view word, int least, int most) {
   int number = least;
   std::from_chars(word.data(), word.data() + word.size(), number);
   return std::clamp(number, least, most);
+}
+
+// By the first letter that has a direction, as a paragraph is laid out.
+bool isFromRight(const GtkTextIter& from, const GtkTextIter& to) {
+  const std::string text = takeString(gtk_text_iter_get_text(&from, &to));
+  for (const char* place = text.c_str(); *place; place = g_utf8_next_char(place)) {
+    const UCharDirection direction = u_charDirection(static_cast<UChar32>(g_utf8_get_char(place)));
+    if (direction == U_LEFT_TO_RIGHT) return false;
+    if (direction == U_RIGHT_TO_LEFT || direction == U_RIGHT_TO_LEFT_ARABIC) return true;
+  }
+  return gtk_widget_get_default_direction() == GTK_TEXT_DIR_RTL;
 }
 
 struct Colours {
@@ -75,13 +90,13 @@ void MarkdownForms::setDark(bool dark) {
 }
 
 // An item's bullet hangs before its text.
-GtkTextTag* MarkdownForms::levelTag(const char* form, int level) {
-  const std::string name = form + std::to_string(level);
+GtkTextTag* MarkdownForms::levelTag(const char* form, int level, bool fromRight) {
+  const std::string name = form + std::to_string(level) + (fromRight ? "r" : "");
   if (GtkTextTag* found = tag(name)) return found;
   const bool hangs = std::string_view(form) == "item";
   const int margin = LevelWidth * (hangs ? std::max(level - 1, 0) : level);
-  GtkTextTag* made =
-      gtk_text_buffer_create_tag(buffer_, name.c_str(), "accumulative-margin", TRUE, "left-margin", margin, nullptr);
+  GtkTextTag* made = gtk_text_buffer_create_tag(buffer_, name.c_str(), "accumulative-margin", TRUE,
+                                                fromRight ? "right-margin" : "left-margin", margin, nullptr);
   if (hangs) {
     PangoTabArray* tabs = pango_tab_array_new_with_positions(1, TRUE, PANGO_TAB_LEFT, LevelWidth);
     g_object_set(made, "indent", -LevelWidth, "tabs", tabs, "pixels-above-lines", 2, "pixels-below-lines", 2, nullptr);
@@ -92,21 +107,20 @@ GtkTextTag* MarkdownForms::levelTag(const char* form, int level) {
 }
 
 void MarkdownForms::apply(std::string_view form, int first, int end, std::string_view word) {
+  GtkTextIter from;
+  GtkTextIter to;
+  gtk_text_buffer_get_iter_at_offset(buffer_, &from, first);
+  gtk_text_buffer_get_iter_at_offset(buffer_, &to, end);
   GtkTextTag* applied = nullptr;
   if (form == "item" || form == "paragraph") {
     const int level = numberIn(word, 0, MostLevels);
-    if (level > 0) applied = levelTag(form == "item" ? "item" : "paragraph", level);
+    if (level > 0) applied = levelTag(form == "item" ? "item" : "paragraph", level, isFromRight(from, to));
   } else if (form == "heading") {
     applied = tag("heading" + std::to_string(numberIn(word, 1, MostHeadings)));
   } else {
     applied = tag(std::string(form));
   }
-  if (!applied) return;
-  GtkTextIter from;
-  GtkTextIter to;
-  gtk_text_buffer_get_iter_at_offset(buffer_, &from, first);
-  gtk_text_buffer_get_iter_at_offset(buffer_, &to, end);
-  gtk_text_buffer_apply_tag(buffer_, applied, &from, &to);
+  if (applied) gtk_text_buffer_apply_tag(buffer_, applied, &from, &to);
 }
 
 }  // namespace vaelo

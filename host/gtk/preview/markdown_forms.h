@@ -20,7 +20,7 @@ class MarkdownForms {
 
  private:
   GtkTextTag* tag(const std::string& name) const;
-  GtkTextTag* levelTag(const char* form, int level);
+  GtkTextTag* levelTag(const char* form, int level, bool fromRight);
 
   GtkTextBuffer* buffer_;
 };
