@@ -1,6 +1,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "app/document_list_controller_status_bar.h"
 
+#include "items/vlo_log.h"
+#include "platform/platform.h"
+#include "platform/ui/screen_factory.h"
+
 namespace vaelo {
 
 namespace {
@@ -12,20 +16,50 @@ constexpr const char* AttachmentKey = "_VaeloDriveAppStatusBar";
 void DocumentListControllerStatusBar::createStatusBarButtonPressDelegate(StorageOfferRef offer,
                                                                          std::weak_ptr<Delegate> delegate) {
   delegate_ = std::move(delegate);
-  primaryLabel_ = std::make_shared<Label>();
-  primaryLabel_->setFont(Font::preferred(TextStyle::Caption2));
-  primaryLabel_->setOpaque(false);
-  primaryLabel_->setTextColor(Color::black());
-  primaryLabel_->setBackgroundColor(std::nullopt);
-  primaryLabel_->sizeToFit();
+  labelsView_ = DriveStatusLabelView::initWithFrame(Platform::current().screens.device().statusBarFrame());
+  configureLabels(offer);
   const BarButtonItemRef space = BarButtonItem::system(SystemItem::FlexibleSpace);
-  toolbarItems_ = {space, BarButtonItem::withCustomView(primaryLabel_), space};
-  showUpgradeOffer(std::move(offer));
+  toolbarItems_ = {space, BarButtonItem::withCustomView(labelsView_), space};
 }
 
-void DocumentListControllerStatusBar::setStatusText(const std::string& text) {
-  primaryLabel_->setText(text);
-  primaryLabel_->sizeToFit();
+void DocumentListControllerStatusBar::configureLabels(const StorageOfferRef& offer) {
+  const auto label = std::make_shared<Label>();
+  label->setFont(Font::preferred(TextStyle::Caption2));
+  label->setOpaque(false);
+  label->setTextColor(Color::black());
+  label->setBackgroundColor(std::nullopt);
+  label->sizeToFit();
+  labelsView_->setPrimaryLabel(label);
+  const std::shared_ptr<UpgradeButton> button = Platform::current().screens.makeUpgradeButton(offer);
+  button->addAction(ControlEvent::TouchUpInside, [weak = weak_from_this()] {
+    const auto self = weak.lock();
+    if (self) self->upgradeStoragePressed(*self->labelsView_->quotaButton());
+  });
+  button->sizeToFit();
+  button->setHidden(true);
+  labelsView_->setQuotaButton(button);
+  labelsView_->showLowQuota(offer && button->shouldShowForOffer(*offer));
+}
+
+void DocumentListControllerStatusBar::setStatusText(const std::string& text) { labelsView_->setPrimaryLabelText(text); }
+
+void DocumentListControllerStatusBar::showUpgradeOffer(const StorageOfferRef& offer) {
+  UpgradeButton& button = *labelsView_->quotaButton();
+  if (button.offer() != offer) button.setOffer(offer);
+  labelsView_->showLowQuota(offer && button.shouldShowForOffer(*offer));
+}
+
+void DocumentListControllerStatusBar::upgradeStoragePressed(UpgradeButton& button) {
+  VLO_USER_ACTION("Pressed Upgrade Storage");
+  const std::shared_ptr<UpgradeLink> link = button.link();
+  const int action = link ? link->action() : 0;
+  VLO_INFO("UpgradeStorage button pressed, link.action=%{public}@", action);
+  if (link && link->performDefaultAction()) {
+    VLO_INFO("UpgradeStorage button pressed, launched default action (Manage Storage?)");
+    return;
+  }
+  const std::shared_ptr<Delegate> listener = delegate();
+  if (listener && action == UpgradeLink::ActionRunUpgradeFlow) listener->upgradeStorageButtonPressed();
 }
 
 StatusBarRef statusBarOf(const DocumentListController& list) {

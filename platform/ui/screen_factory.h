@@ -10,6 +10,7 @@
 #include "platform/ui/document_interaction_controller.h"
 #include "platform/ui/document_list_controller.h"
 #include "platform/ui/graphics.h"
+#include "platform/ui/upgrade_button.h"
 #include "platform/ui/upgrade_flow_manager.h"
 #include "platform/ui/window.h"
 
@@ -36,7 +37,9 @@ class ScreenFactory {
   virtual bool canPreviewItem(const URL& url) = 0;
   virtual std::shared_ptr<DocumentInteractionController> makeDocumentInteraction(const URL& url) = 0;
 
-  /// `offer` may be null. Null where the platform sells nothing; there is never an offer then.
+  /// A button for the offer, which may be null. Never null.
+  virtual std::shared_ptr<UpgradeButton> makeUpgradeButton(StorageOfferRef offer) = 0;
+  /// `offer` may be null. Never null.
   virtual std::shared_ptr<UpgradeFlowManager> makeUpgradeFlow(StorageOfferRef offer) = 0;
 
   /// Asks or tells the user what must be settled before the document is opened elsewhere, then runs `open` once, or never.

@@ -19,14 +19,17 @@ class UpgradeLink {
   virtual bool performDefaultAction() = 0;
 };
 
-/// A button for a storage offer. Main thread.
+/// A button for a storage offer, with a title that says what it is for. Main thread.
 class UpgradeButton : public Button {
  public:
   /// Null: no offer.
   virtual StorageOfferRef offer() const = 0;
+  /// Also takes over the title that suits the offer.
   virtual void setOffer(StorageOfferRef offer) = 0;
   /// Null when there is no offer.
   virtual std::shared_ptr<UpgradeLink> link() const = 0;
+  /// Whether the offer is one that a button should be shown for.
+  virtual bool shouldShowForOffer(const StorageOffer& offer) const = 0;
 };
 
 }  // namespace vaelo

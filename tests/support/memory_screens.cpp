@@ -4,6 +4,7 @@
 #include <deque>
 
 #include "tests/support/memory_drive_places.h"
+#include "tests/support/memory_upgrade_button.h"
 #include "tests/support/memory_upgrade_flow.h"
 
 namespace vaelo {
@@ -52,6 +53,12 @@ std::shared_ptr<DocumentInteractionController> MemoryScreens::makeDocumentIntera
   interactions.push_back(std::make_shared<MemoryDocumentInteraction>(url, record_));
   interactions.back()->opens = opensInPlace;
   return interactions.back();
+}
+
+std::shared_ptr<UpgradeButton> MemoryScreens::makeUpgradeButton(StorageOfferRef offer) {
+  const auto button = std::make_shared<MemoryUpgradeButton>(std::move(offer), hidesUpgrades);
+  button->setTitle(upgradeTitle);
+  return button;
 }
 
 std::shared_ptr<UpgradeFlowManager> MemoryScreens::makeUpgradeFlow(StorageOfferRef offer) {

@@ -26,6 +26,9 @@ class MemoryScreens : public ScreenFactory {
   MemoryDevice deviceShown;
   MemoryGraphics drawn;
   std::vector<std::shared_ptr<MemoryDocumentInteraction>> interactions;  ///< all that were made
+  /// How each upgrade button comes.
+  std::string upgradeTitle = "Upgrade";
+  bool hidesUpgrades = false;  ///< no offer is one that a button should be shown for
   ViewControllerRef upgradeFlowPresenter;
   /// True: the user has yet to answer what must be settled before a document opens; `heldOpening` is the answer yes.
   bool holdsOpening = false;
@@ -42,6 +45,7 @@ class MemoryScreens : public ScreenFactory {
   ViewControllerRef makeDriveUnavailable() override;
   bool canPreviewItem(const URL& url) override;
   std::shared_ptr<DocumentInteractionController> makeDocumentInteraction(const URL& url) override;
+  std::shared_ptr<UpgradeButton> makeUpgradeButton(StorageOfferRef offer) override;
   std::shared_ptr<UpgradeFlowManager> makeUpgradeFlow(StorageOfferRef offer) override;
   void runPreOpenAlert(const URL& url, const ViewControllerRef& presenter, std::function<void()> open) override;
 

@@ -95,7 +95,7 @@ void AppFixture::presentSomething() { nav->presentViewController(std::make_share
 std::shared_ptr<AlertController> AppFixture::presentedAlert() {
   return std::dynamic_pointer_cast<AlertController>(nav->presentedViewController());
 }
-std::string AppFixture::statusText() { return statusBarOf(*topList())->primaryLabel()->text(); }
+std::string AppFixture::statusText() { return statusBarOf(*topList())->labelsView()->primaryLabel()->text(); }
 
 void AppFixture::advance(std::chrono::nanoseconds time) { memory.clock->advance(time); }
 RecordingLog& AppFixture::log() { return memory.log; }

@@ -104,7 +104,7 @@ TEST_F(NavAccountsTest, AChangedOfferReachesEveryListAndFetchesTheQuotaThrice) {
   EXPECT_TRUE(logged("INFO", "Quota Offer Changed, offer level is 2"));
   for (const ViewControllerRef& screen : nav->viewControllers()) {
     const auto list = std::dynamic_pointer_cast<DocumentListController>(screen);
-    EXPECT_EQ(statusBarOf(*list)->offer(), nav->upgradeOffer());
+    EXPECT_EQ(statusBarOf(*list)->labelsView()->quotaButton()->offer(), nav->upgradeOffer());
   }
   runAllQueues();
   EXPECT_EQ(quotaFetches(), before);

@@ -19,9 +19,9 @@ TEST_F(NavStatusTest, TheLineIsCentredInTheToolbar) {
   const auto& items = topList()->toolbarItems();
   ASSERT_EQ(items.size(), 3u);
   EXPECT_EQ(items[0]->systemItem(), SystemItem::FlexibleSpace);
-  EXPECT_EQ(items[1]->customView(), statusBarOf(*topList())->primaryLabel());
+  EXPECT_EQ(items[1]->customView(), statusBarOf(*topList())->labelsView());
   EXPECT_EQ(items[2]->systemItem(), SystemItem::FlexibleSpace);
-  const auto& label = *statusBarOf(*topList())->primaryLabel();
+  const auto& label = *statusBarOf(*topList())->labelsView()->primaryLabel();
   EXPECT_EQ(label.font(), Font::preferred(TextStyle::Caption2));
   EXPECT_FALSE(label.opaque());
   EXPECT_EQ(statusBarOf(*topList())->delegate().get(), nav.get());
