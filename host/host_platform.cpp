@@ -12,15 +12,21 @@ HostFolders HostFolders::fromEnvironment() {
 }
 
 HostPlatform::HostPlatform(const HostFolders& folders)
-    : drive_(folders.data, log_, queues_, notifications_),
+    : offers_({[this] { return drive_.ubiquityIdentityToken() ? drive_.account().upgrade : std::nullopt; },
+               [this] { drive_.fetchQuota([](const Result<std::int64_t>&) {}); }},
+              queues_, notifications_),
+      drive_(folders.data, log_, queues_, notifications_),
       documentStore_(drive_.index()),
       fileProvider_(drive_.layout(), drive_.index(), queues_),
       resourceValues_(drive_.layout(), drive_.index(), types_),
       userActivities_(drive_.layout(), log_, queues_),
       syncedStore_(drive_.layout(), log_, notifications_),
       coordination_(folders.data + "/coordination.lock"),
+      thumbnails_(queues_, [this](const std::string& path) { coordination_.tellPresenters(URL(path)); }),
       preferences_(folders.preferencesFile, log_) {
   coordination_.setMoveObserver([this](const URL& from, const URL& to) { moves_.moved(from, to); });
+  resourceValues_.setThumbnails([this](const std::string& path) { return thumbnails_.thumbnailOf(path); });
+  drive_.observeStorage([this](const StorageFigures& figures) { offers_.storageMeasured(figures); });
 }
 
 HostPlatform::~HostPlatform() {
@@ -51,6 +57,14 @@ void HostPlatform::install(Application& application, ScreenFactory& screens) {
                                .userActivities = userActivities_});
   Platform::install(platform_.get());
   syncedStore_.watch();
+  // First of all who hear of another account, so that what they keep is of that one when the screens ask.
+  observations_.push_back(notifications_.addObserver(IdentityDidChangeNotification, [this](const Notification&) {
+    syncedStore_.accountChanged();
+    userActivities_.accountChanged();
+    offers_.accountChanged(true);
+  }));
+  observations_.push_back(notifications_.addObserver(AccountDidChangeNotification,
+                                                     [this](const Notification&) { offers_.accountChanged(false); }));
 }
 
 }  // namespace vaelo

@@ -2,9 +2,10 @@
 #pragma once
 
 #include <string>
+#include <vector>
 
 #include "host/desktop/gio_launch_services.h"
-#include "host/desktop/no_offers.h"
+#include "host/drive/account_offers.h"
 #include "host/drive/drive_file_progress.h"
 #include "host/drive/drive_synced_store.h"
 #include "host/drive/drive_user_activities.h"
@@ -21,6 +22,7 @@
 #include "host/files/local_file_manager.h"
 #include "host/files/local_resource_values.h"
 #include "host/files/move_history.h"
+#include "host/gtk/thumbnails/document_thumbnails.h"
 #include "platform/platform.h"
 
 namespace vaelo {
@@ -54,6 +56,7 @@ class HostPlatform {
   DocumentStore& documentStore() { return documentStore_; }
   FileProvider& fileProvider() { return fileProvider_; }
   MoveHistory& moves() { return moves_; }
+  DriveSyncedStore& syncedStore() { return syncedStore_; }
   DriveUserActivities& userActivities() { return userActivities_; }
 
  private:
@@ -64,6 +67,7 @@ class HostPlatform {
   GTypes types_;
   IcuCharacterClasses characterClasses_;
   IcuFormatting formatting_;
+  AccountOffers offers_;  // before the drive, whose workers tell it what they measure
   LocalCloudDocuments drive_;
   LocalFileManager fileManager_{&drive_.removals(), readNameRules(drive_.layout().accountFile())};
   LocalDocumentStore documentStore_;
@@ -74,10 +78,11 @@ class HostPlatform {
   DriveSyncedStore syncedStore_;
   MoveHistory moves_{queues_};
   LocalFileCoordination coordination_;
+  DocumentThumbnails thumbnails_;
   GioLaunchServices launchServices_;
-  NoOffers offers_;
   IniPreferences preferences_;
   std::unique_ptr<Platform> platform_;
+  std::vector<NotificationCenter::Token> observations_;
 };
 
 }  // namespace vaelo

@@ -6,6 +6,7 @@
 #include <optional>
 #include <string>
 
+#include "host/drive/account_record.h"
 #include "host/drive/drive_layout.h"
 #include "platform/cloud_documents.h"
 #include "platform/logging.h"
@@ -14,34 +15,24 @@
 
 namespace vaelo {
 
-/// What the account file says.
-struct AccountRecord {
-  std::string name;
-  std::string token;  ///< empty when there is none
-  bool signedIn = false;
-  std::optional<std::int64_t> allowance;  ///< bytes that the account may use; absent: as many as the disk holds
-};
-
-/// The record; nobody is signed in when the file is absent or damaged, and the log tells of the latter. Any thread.
-AccountRecord readAccount(const DriveLayout& layout, LogSink& log);
-
-/// On the first start, which an absent account file tells, makes the local account: an empty drive with a welcome document,
-/// then the file, so that a crash on the way is made good by the next start. Never touches what is there. Two processes may
-/// start at once: one account wins. Blocks; any thread.
-std::optional<Error> makeLocalAccountIfAbsent(const DriveLayout& layout);
+/// Posted on the main queue when anything changed in what the account file says.
+inline constexpr const char* AccountDidChangeNotification = "AccountDidChangeNotification";
 
 /// The signed-in account, as the account file says, which is watched: when another process changes it,
-/// IdentityDidChangeNotification is posted on the main queue. Made and destroyed on the main thread.
+/// IdentityDidChangeNotification is posted on the main queue if it is another account, and AccountDidChangeNotification in
+/// any case. The layout's mirror is that of the account. A file that is damaged while the program runs changes nothing,
+/// since whoever writes it may not be done; the log tells. Nobody is signed in when there is none. Made and destroyed on the
+/// main thread.
 class Account {
  public:
-  Account(const DriveLayout& layout, LogSink& log, Queues& queues, NotificationCenter& notifications);
+  Account(DriveLayout& layout, LogSink& log, Queues& queues, NotificationCenter& notifications);
   ~Account();
   Account(const Account&) = delete;
   Account& operator=(const Account&) = delete;
 
   /// Any thread; does not touch the disk.
   std::optional<UbiquityIdentityToken> token() const;
-  std::optional<std::int64_t> allowance() const;
+  AccountRecord record() const;
 
  private:
   class Watched;

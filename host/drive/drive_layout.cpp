@@ -97,16 +97,26 @@ std::string realLocation(const std::string& path) {
 }
 
 DriveLayout::DriveLayout(const std::string& dataFolder)
-    : dataFolder_(realLocation(dataFolder)),
-      mirrorRoot_(realLocation(dataFolder_ + "/mirror")),
-      trashFolder_(mirrorRoot_ + "/.Trash") {}
+    : dataFolder_(realLocation(dataFolder)), mirrorRoot_(realLocation(dataFolder_ + "/" + FirstMirror)) {}
+
+void DriveLayout::setMirror(const std::string& folder) {
+  std::string place = realLocation(dataFolder_ + "/" + folder);
+  const std::unique_lock lock(mutex_);
+  mirrorRoot_ = std::move(place);
+}
+
+std::string DriveLayout::mirrorRoot() const {
+  const std::shared_lock lock(mutex_);
+  return mirrorRoot_;
+}
 
 std::optional<std::string> DriveLayout::relativeToMirror(const std::string& path) const {
   if (!isUsable(path)) return std::nullopt;
   const std::string place = realLocation(path);
-  if (place == mirrorRoot_) return std::string();
-  if (place.compare(0, mirrorRoot_.size(), mirrorRoot_) != 0 || place[mirrorRoot_.size()] != '/') return std::nullopt;
-  return place.substr(mirrorRoot_.size() + 1);
+  const std::string mirror = mirrorRoot();
+  if (place == mirror) return std::string();
+  if (place.compare(0, mirror.size(), mirror) != 0 || place[mirror.size()] != '/') return std::nullopt;
+  return place.substr(mirror.size() + 1);
 }
 
 bool DriveLayout::isInMirror(const std::string& path) const { return relativeToMirror(path).has_value(); }

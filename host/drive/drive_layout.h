@@ -1,7 +1,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <mutex>
 #include <optional>
+#include <shared_mutex>
 #include <string>
 
 namespace vaelo {
@@ -11,21 +13,28 @@ namespace vaelo {
 /// back unchanged. One open for a path without links, otherwise one readlink a component; any thread.
 std::string realLocation(const std::string& path);
 
-/// Where the drive keeps what. Immutable, so safe from any thread.
+/// Where the drive keeps what. Each account of a device has a mirror of its own; the layout is that of the account whose
+/// turn it is. Safe from any thread.
 class DriveLayout {
  public:
   static constexpr const char* DefaultContainer = "com~marrow~Kestrel";
+  /// The mirror of a device's first account.
+  static constexpr const char* FirstMirror = "mirror";
 
   /// `dataFolder`: absolute; need not exist yet. Links in it are followed once, here.
   explicit DriveLayout(const std::string& dataFolder);
 
   const std::string& dataFolder() const { return dataFolder_; }
-  const std::string& mirrorRoot() const { return mirrorRoot_; }
-  const std::string& trashFolder() const { return trashFolder_; }
+  /// The account's mirror is `folder`, below the data folder, from now on.
+  void setMirror(const std::string& folder);
+  std::string mirrorRoot() const;
+  std::string trashFolder() const { return mirrorRoot() + "/.Trash"; }
   std::string accountFile() const { return dataFolder_ + "/account.ini"; }
+  /// What is known of the accounts whose turn it is not, and their mirrors.
+  std::string accountsFolder() const { return dataFolder_ + "/accounts"; }
   std::string indexFile() const { return dataFolder_ + "/index.sqlite"; }
   /// The folder of a container; `identifier` is in its folder form, one component.
-  std::string containerFolder(const std::string& identifier) const { return mirrorRoot_ + "/" + identifier; }
+  std::string containerFolder(const std::string& identifier) const { return mirrorRoot() + "/" + identifier; }
   std::string defaultContainerFolder() const { return containerFolder(DefaultContainer); }
 
   /// The location tests look at realLocation(path), so that "..", links and look-alike prefixes don't fool them. The mirror
@@ -39,9 +48,9 @@ class DriveLayout {
   std::optional<std::string> containerOf(const std::string& path) const;
 
  private:
-  std::string dataFolder_;
-  std::string mirrorRoot_;
-  std::string trashFolder_;
+  const std::string dataFolder_;
+  mutable std::shared_mutex mutex_;
+  std::string mirrorRoot_;  // guarded by mutex_
 };
 
 }  // namespace vaelo

@@ -1,23 +1,27 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/drive/drive_synced_store.h"
 
+#include <fcntl.h>
+#include <sys/file.h>
+
+#include <cerrno>
 #include <memory>
 
+#include "host/drive/item_attributes.h"
 #include "host/drive/small_file.h"
+#include "host/drive/tag_dictionary.h"
+#include "host/drive/variant.h"
 #include "host/support/glib_ptr.h"
+#include "host/support/unique_fd.h"
 
 namespace vaelo {
 
 namespace {
 
 constexpr const char* FileName = "/.vaelo/values";
+constexpr std::size_t LargestFile = 4 * 1024 * 1024;  // of tens of thousands of tags
 /// Other programs write the file: what is nested deeper is not read.
 constexpr int DeepestNesting = 8;
-
-struct VariantFree {
-  void operator()(GVariant* variant) const { g_variant_unref(variant); }
-};
-using Variant = std::unique_ptr<GVariant, VariantFree>;
 
 Value valueOf(GVariant* variant, int depth);
 
@@ -81,12 +85,27 @@ Value valueOf(GVariant* variant, int depth) {
 }  // namespace
 
 DriveSyncedStore::DriveSyncedStore(const DriveLayout& layout, LogSink& log, NotificationCenter& notifications)
-    : path_(layout.mirrorRoot() + FileName), log_(log), notifications_(notifications) {}
+    : layout_(layout), log_(log), notifications_(notifications) {}
 
-DriveSyncedStore::~DriveSyncedStore() {
+DriveSyncedStore::~DriveSyncedStore() { unwatch(); }
+
+std::string DriveSyncedStore::path() const { return layout_.mirrorRoot() + FileName; }
+
+void DriveSyncedStore::unwatch() {
   if (!monitor_) return;
   g_signal_handlers_disconnect_by_data(monitor_, this);
-  g_object_unref(monitor_);
+  g_file_monitor_cancel(monitor_);
+  g_clear_object(&monitor_);
+}
+
+void DriveSyncedStore::accountChanged() {
+  unwatch();
+  {
+    const std::lock_guard lock(mutex_);
+    current_ = false;
+  }
+  watch();
+  notifications_.post({SyncedStoreDidChangeExternallyNotification, {}});
 }
 
 Value DriveSyncedStore::objectForKey(const std::string& key) {
@@ -99,19 +118,46 @@ Value DriveSyncedStore::objectForKey(const std::string& key) {
 }
 
 Dictionary DriveSyncedStore::read() {
-  const Result<std::string> text = readSmallFile(path_);
-  if (!text.value) return {};
+  const Result<std::string> text = readSmallFile(path(), LargestFile);
+  if (!text.value) {
+    if (text.error->code != FileErrorCode::ReadNoSuchFile) {
+      log_.write(LogType::Error, "drive: the synced values can't be read: " + text.error->description());
+    }
+    return {};
+  }
   GError* problem = nullptr;
   const Variant parsed(g_variant_parse(G_VARIANT_TYPE_VARDICT, text.value->data(), text.value->data() + text.value->size(),
                                        nullptr, &problem));
   if (parsed) return dictionaryOf(parsed.get(), 0);
   const GErrorPtr owned(problem);
-  log_.write(LogType::Error, "drive: the synced values of " + path_ + " can't be read: " + owned->message);
+  log_.write(LogType::Error, "drive: the synced values of " + path() + " can't be read: " + owned->message);
   return {};
 }
 
+std::optional<Error> DriveSyncedStore::addTag(const std::string& name, unsigned label) {
+  if (!isTagName(name)) return fileError(FileErrorCode::WriteInvalidFileName, path(), "no name for a tag");
+  const std::string file = path();
+  const std::string folder = file.substr(0, file.rfind('/'));
+  if (g_mkdir_with_parents(folder.c_str(), 0700) != 0) return errorFromErrno(errno, folder, FileAccess::Write);
+  // Whoever writes holds it, so that no tag is lost to another process that adds one too.
+  const UniqueFd turn(::open((folder + "/.values.lock").c_str(), O_RDWR | O_CREAT | O_CLOEXEC, 0600));
+  while (turn && ::flock(turn.get(), LOCK_EX) != 0 && errno == EINTR) {
+  }
+  const Result<std::string> text = readSmallFile(file, LargestFile);
+  if (text.error && text.error->code != FileErrorCode::ReadNoSuchFile) return text.error;
+  Result<std::string> changed = valuesWithTag(text.value.value_or(""), name, label);
+  if (changed.error && changed.error->code == FileErrorCode::ReadUnknown) {
+    if (const int status = setFileAside(file)) return errorFromErrno(status, file, FileAccess::Write);
+    changed = valuesWithTag("", name, label);
+  }
+  if (changed.error) return changed.error;
+  if (text.value && *text.value == *changed.value) return std::nullopt;
+  if (changed.value->size() > LargestFile) return fileError(FileErrorCode::WriteUnknown, file, "there are too many tags");
+  return writeSmallFile(file, *changed.value);
+}
+
 void DriveSyncedStore::watch() {
-  const GRef<GFile> file(g_file_new_for_path(path_.c_str()));
+  const GRef<GFile> file(g_file_new_for_path(path().c_str()));
   monitor_ = g_file_monitor_file(file.get(), G_FILE_MONITOR_NONE, nullptr, nullptr);
   if (!monitor_) return;
   g_signal_connect_swapped(monitor_, "changed",

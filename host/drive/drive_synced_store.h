@@ -7,6 +7,7 @@
 #include <string>
 
 #include "host/drive/drive_layout.h"
+#include "platform/error.h"
 #include "platform/logging.h"
 #include "platform/notifications.h"
 #include "platform/synced_key_value_store.h"
@@ -27,11 +28,19 @@ class DriveSyncedStore : public SyncedKeyValueStore {
   /// Posts SyncedStoreDidChangeExternallyNotification whenever another process or device changed the file. Main thread,
   /// once.
   void watch();
+  /// Adds a tag to the user's tags, with a label from 0 to 7; nothing when there is one of that name. Other processes may
+  /// write at the same time. Errors: 514 for a name that is none; 3328 when a newer version wrote the tags; those of
+  /// FileManager. A file that is damaged is set aside. Blocks; any thread.
+  std::optional<Error> addTag(const std::string& name, unsigned label);
+  /// The values are those of the account whose turn it is now. Main thread.
+  void accountChanged();
 
  private:
+  std::string path() const;
   Dictionary read();
+  void unwatch();
 
-  std::string path_;
+  const DriveLayout& layout_;
   LogSink& log_;
   NotificationCenter& notifications_;
   GFileMonitor* monitor_ = nullptr;

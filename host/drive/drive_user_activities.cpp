@@ -40,11 +40,7 @@ class DriveUserActivities::Publisher : public CurrentActivity {
   using Found = std::function<void(std::optional<OtherActivity>)>;
 
   Publisher(const DriveLayout& layout, LogSink& log, Queues& queues)
-      : layout_(layout),
-        log_(log),
-        queues_(queues),
-        folder_(activitiesFolder(layout)),
-        queue_(queues.makeSerialQueue("com.marrow.VaeloDrive.activities")) {}
+      : layout_(layout), log_(log), queues_(queues), queue_(queues.makeSerialQueue("com.marrow.VaeloDrive.activities")) {}
 
   void becomes(const void* activity, std::optional<ActivityRecord> offered) override {
     const std::lock_guard lock(mutex_);
@@ -65,14 +61,14 @@ class DriveUserActivities::Publisher : public CurrentActivity {
   void findOthers(Found found) {
     queue_->async([this, found = std::move(found)]() mutable {
       found_ = std::move(found);
-      if (!isKept_) keep();
+      keep();
       found_(latest());
     });
   }
   void lookAgain() {
     queue_->async([this] { found_(latest()); });
   }
-  const std::string& folder() const { return folder_; }
+  std::string folder() const { return activitiesFolder(layout_); }
   LogSink& log() { return log_; }
   Queues& queues() { return queues_; }
 
@@ -93,17 +89,22 @@ class DriveUserActivities::Publisher : public CurrentActivity {
       offered = offered_;
     }
     if (offered) offered->deviceName = device().name;
-    if (isKept_ && offered == kept_) return;
+    const std::string folder = this->folder();
+    if (isKept_ && offered == kept_ && folder == keptIn_) return;
+    const std::string name = "/" + device().id + std::string(suffix);
+    // What was told to the devices of another account is no longer so.
+    if (isKept_ && kept_ && folder != keptIn_) ::unlink((keptIn_ + name).c_str());
     isKept_ = true;
     kept_ = offered;
-    const std::string file = folder_ + "/" + device().id + std::string(suffix);
+    keptIn_ = folder;
+    const std::string file = folder + name;
     std::optional<Error> error;
     if (!offered) {
       if (::unlink(file.c_str()) != 0 && errno != ENOENT && errno != ENOTDIR) {
         error = errorFromErrno(errno, file, FileAccess::Write);
       }
-    } else if (g_mkdir_with_parents(folder_.c_str(), 0700) != 0) {
-      error = errorFromErrno(errno, folder_, FileAccess::Write);
+    } else if (g_mkdir_with_parents(folder.c_str(), 0700) != 0) {
+      error = errorFromErrno(errno, folder, FileAccess::Write);
     } else {
       error = writeSmallFile(file, activityFileText(*offered));
     }
@@ -129,7 +130,7 @@ class DriveUserActivities::Publisher : public CurrentActivity {
 
   std::vector<std::string> activityFiles() {
     std::vector<std::string> names;
-    const std::unique_ptr<DIR, int (*)(DIR*)> stream(::opendir(folder_.c_str()), ::closedir);
+    const std::unique_ptr<DIR, int (*)(DIR*)> stream(::opendir(folder().c_str()), ::closedir);
     if (!stream) return names;
     const std::string own = device().id + std::string(suffix);
     while (const dirent* entry = ::readdir(stream.get())) {
@@ -151,7 +152,7 @@ class DriveUserActivities::Publisher : public CurrentActivity {
       reason = "not the name of a device's file";
       return std::nullopt;
     }
-    Result<ActivityRecord> record = readActivityFile(folder_ + "/" + name, queues_.now());
+    Result<ActivityRecord> record = readActivityFile(folder() + "/" + name, queues_.now());
     if (!record) {
       if (record.error->code != FileErrorCode::ReadNoSuchFile) {
         reason = record.error->localizedFailureReason.value_or("it can't be read");
@@ -170,13 +171,13 @@ class DriveUserActivities::Publisher : public CurrentActivity {
   const DriveLayout& layout_;
   LogSink& log_;
   Queues& queues_;
-  const std::string folder_;
   std::mutex mutex_;  // guards the two below
   const void* current_ = nullptr;
   std::optional<ActivityRecord> offered_;
   // On the queue:
   bool isKept_ = false;  // the file is as kept_ says
   std::optional<ActivityRecord> kept_;
+  std::string keptIn_;  // the folder
   DeviceIdentity device_;
   std::map<std::string, std::string> refusals_;  // which the log has told, by file
   bool toldOfMany_ = false;
@@ -194,7 +195,7 @@ class DriveUserActivities::Watch : public std::enable_shared_from_this<Watch> {
   Watch& operator=(const Watch&) = delete;
 
   void start() {
-    const std::string& folder = publisher_->folder();
+    const std::string folder = publisher_->folder();
     g_mkdir_with_parents(folder.c_str(), 0700);
     const GRef<GFile> file(g_file_new_for_path(folder.c_str()));
     GError* failure = nullptr;
@@ -210,6 +211,10 @@ class DriveUserActivities::Watch : public std::enable_shared_from_this<Watch> {
             if (const auto self = weak.lock()) self->found(found);
           });
         });
+  }
+  void restart() {
+    stop();
+    start();
   }
   void stop() {
     g_clear_handle_id(&timer_, g_source_remove);
@@ -259,6 +264,10 @@ DriveUserActivities::~DriveUserActivities() {
 
 std::shared_ptr<UserActivity> DriveUserActivities::makeActivity(const std::string& type) {
   return std::make_shared<PublishedActivity>(type, publisher_);
+}
+
+void DriveUserActivities::accountChanged() {
+  if (watch_) watch_->restart();
 }
 
 void DriveUserActivities::watchOthers(OfferChanged changed) {

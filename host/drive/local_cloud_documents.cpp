@@ -9,6 +9,7 @@
 
 #include "host/drive/bookmark_file.h"
 #include "host/drive/item_attributes.h"
+#include "host/drive/local_accounts.h"
 #include "host/drive/mirror_walk.h"
 #include "host/drive/promise_file.h"
 #include "host/drive/small_file.h"
@@ -17,8 +18,9 @@ namespace vaelo {
 
 namespace {
 
-std::optional<Error> setUp(const DriveLayout& layout, LogSink& log) {
-  std::optional<Error> error = makeLocalAccountIfAbsent(layout);
+std::optional<Error> setUp(LocalAccounts accounts, LogSink& log, bool& wasDamaged) {
+  wasDamaged = accounts.setDamagedFileAside();
+  std::optional<Error> error = accounts.makeFirstIfAbsent();
   if (error) log.write(LogType::Error, "drive: can't make the local account: " + error->description());
   return error;
 }
@@ -60,7 +62,7 @@ Error cloudError(int code, const std::string& path, const std::string& reason) {
 LocalCloudDocuments::LocalCloudDocuments(const std::string& dataFolder, LogSink& log, Queues& queues,
                                          NotificationCenter& notifications)
     : layout_(dataFolder),
-      setUpFailure_(setUp(layout_, log)),
+      setUpFailure_(setUp(LocalAccounts(layout_, log), log, accountWasDamaged_)),
       account_(layout_, log, queues, notifications),
       removals_(layout_.mirrorRoot() + "/.vaelo/removing", log, queues),
       containers_(layout_, log, removals_),
@@ -165,22 +167,38 @@ std::optional<Error> LocalCloudDocuments::evict(const URL& url) {
   return fileError(FileErrorCode::FeatureUnsupported, url.path(), "the drive keeps no other copy of this document");
 }
 
-Result<std::int64_t> LocalCloudDocuments::freeBytes() const {
-  if (!account_.token()) {
-    return cloudError(CloudDocumentsErrorCode::NoAccount, layout_.mirrorRoot(), "no account is signed in");
-  }
+Result<StorageFigures> LocalCloudDocuments::measureStorage() const {
+  const std::string mirror = layout_.mirrorRoot();
+  if (!account_.token()) return cloudError(CloudDocumentsErrorCode::NoAccount, mirror, "no account is signed in");
   struct statvfs disk = {};
-  if (::statvfs(layout_.mirrorRoot().c_str(), &disk) != 0) {
-    return errorFromErrno(errno, layout_.mirrorRoot(), FileAccess::Read);
+  if (::statvfs(mirror.c_str(), &disk) != 0) return errorFromErrno(errno, mirror, FileAccess::Read);
+  if (disk.f_blocks == 0) return fileError(FileErrorCode::ReadUnknown, mirror, "the disk doesn't tell how large it is");
+  StorageFigures figures = storageFigures(disk.f_bavail, disk.f_blocks, disk.f_frsize);
+  if (const std::optional<std::int64_t> allowance = account_.record().allowance) {
+    figures.free = std::clamp<std::int64_t>(*allowance - usedBytes(mirror), 0, figures.free);
+    figures.total = *allowance;
   }
-  const std::int64_t onDisk = static_cast<std::int64_t>(disk.f_bavail * disk.f_frsize);
-  const std::optional<std::int64_t> allowance = account_.allowance();
-  if (!allowance) return onDisk;
-  return std::clamp<std::int64_t>(*allowance - usedBytes(layout_.mirrorRoot()), 0, onDisk);
+  return figures;
 }
 
 void LocalCloudDocuments::fetchQuota(std::function<void(Result<std::int64_t>)> done) {
-  workers_->addOperation([this, done = std::move(done)] { done(freeBytes()); });
+  {
+    const std::lock_guard lock(quotaMutex_);
+    quotaWaiting_.push_back(std::move(done));
+    // Counting the documents takes a while; whoever asks meanwhile gets the same answer.
+    if (quotaWaiting_.size() > 1) return;
+  }
+  workers_->addOperation([this] {
+    const Result<StorageFigures> measured = measureStorage();
+    if (measured && storageObserver_) storageObserver_(*measured.value);
+    std::vector<std::function<void(Result<std::int64_t>)>> waiting;
+    {
+      const std::lock_guard lock(quotaMutex_);
+      waiting.swap(quotaWaiting_);
+    }
+    const Result<std::int64_t> free = measured ? Result<std::int64_t>(measured.value->free) : *measured.error;
+    for (const auto& each : waiting) each(free);
+  });
 }
 
 }  // namespace vaelo

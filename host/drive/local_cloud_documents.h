@@ -1,13 +1,17 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <functional>
 #include <memory>
+#include <mutex>
 #include <string>
+#include <vector>
 
 #include "host/drive/account.h"
 #include "host/drive/container_catalog.h"
 #include "host/drive/document_index.h"
 #include "host/drive/drive_layout.h"
+#include "host/drive/storage_figures.h"
 #include "platform/cloud_documents.h"
 
 namespace vaelo {
@@ -28,17 +32,24 @@ Error cloudError(int code, const std::string& path, const std::string& reason);
 /// The cloud-documents service on a local mirror alone. Nobody signed in: there are no containers to list and no default
 /// one, while the location tests and the container of a given item still answer, since the mirror stays.
 ///
-/// Made and destroyed on the main thread; calls come from any. It has no lock of its own: the layout is immutable, and
-/// account, catalog and index each guard what they keep.
+/// Made and destroyed on the main thread; calls come from any. Layout, account, catalog and index each guard what they keep;
+/// the one lock of its own is for those who wait for the quota.
 class LocalCloudDocuments : public CloudDocuments {
  public:
-  /// `dataFolder`: absolute. On the first start the local account is made there (see makeLocalAccountIfAbsent); when that
-  /// fails the log tells why and nobody is signed in. The index is opened by a worker. All references outlive the service.
+  /// `dataFolder`: absolute. On the first start the local account is made there (see LocalAccounts::makeFirstIfAbsent); when
+  /// that fails the log tells why and nobody is signed in. A damaged account file is moved aside first. The index is opened
+  /// by a worker. All references outlive the service.
   LocalCloudDocuments(const std::string& dataFolder, LogSink& log, Queues& queues, NotificationCenter& notifications);
 
   const DriveLayout& layout() const { return layout_; }
   /// Why the first start could not make the account, if so.
   const std::optional<Error>& setUpFailure() const { return setUpFailure_; }
+  /// The account file was damaged when the program started, and another one made.
+  bool accountWasDamaged() const { return accountWasDamaged_; }
+  /// What the account file says.
+  AccountRecord account() const { return account_.record(); }
+  /// `observer` gets, on any thread, what each quota fetch measured. Before the first fetch.
+  void observeStorage(std::function<void(const StorageFigures&)> observer) { storageObserver_ = std::move(observer); }
   DocumentIndex& index() { return index_; }
   TreeRemovals& removals() { return removals_; }
 
@@ -68,14 +79,18 @@ class LocalCloudDocuments : public CloudDocuments {
   void fetchQuota(std::function<void(Result<std::int64_t>)> done) override;
 
  private:
-  Result<std::int64_t> freeBytes() const;
+  Result<StorageFigures> measureStorage() const;
 
   DriveLayout layout_;
+  bool accountWasDamaged_ = false;
   std::optional<Error> setUpFailure_;
   Account account_;
   TreeRemovals removals_;
   ContainerCatalog containers_;
   DocumentIndex index_;
+  std::function<void(const StorageFigures&)> storageObserver_;
+  std::mutex quotaMutex_;
+  std::vector<std::function<void(Result<std::int64_t>)>> quotaWaiting_;  // guarded by quotaMutex_
   std::shared_ptr<OperationQueue> workers_;  // last, so that it ends before what its operations use
 };
 

@@ -5,6 +5,7 @@
 #include <sys/stat.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <cstdio>
 
@@ -111,22 +112,27 @@ Error fileError(int code, const std::string& path, const std::string& reason) {
   return error;
 }
 
-Result<std::string> readSmallFile(const std::string& path) {
+Result<std::string> readSmallFile(const std::string& path, std::size_t limit) {
   const Descriptor handle(::open(path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_NOCTTY | O_CLOEXEC));
   if (handle.get() < 0) return errorFromErrno(errno, path, FileAccess::Read);
   struct stat status = {};
   if (::fstat(handle.get(), &status) != 0) return errorFromErrno(errno, path, FileAccess::Read);
   if (!S_ISREG(status.st_mode)) return fileError(FileErrorCode::ReadUnknown, path, "not a regular file");
-  std::string bytes(SmallFileLimit + 1, '\0');
+  // One more than there should be: a file that grows meanwhile is read to its end, or to the limit.
+  std::string bytes(std::min(static_cast<std::size_t>(std::max<off_t>(status.st_size, 0)), limit) + 1, '\0');
   std::size_t length = 0;
-  while (length < bytes.size()) {
+  for (;;) {
+    if (length == bytes.size()) {
+      if (length > limit) break;
+      bytes.resize(limit + 1);
+    }
     const ssize_t count = ::read(handle.get(), bytes.data() + length, bytes.size() - length);
     if (count < 0 && errno == EINTR) continue;
     if (count < 0) return errorFromErrno(errno, path, FileAccess::Read);
     if (count == 0) break;
     length += static_cast<std::size_t>(count);
   }
-  if (length > SmallFileLimit) return fileError(FileErrorCode::ReadUnknown, path, "the file is too large");
+  if (length > limit) return fileError(FileErrorCode::ReadUnknown, path, "the file is too large");
   bytes.resize(length);
   return bytes;
 }
@@ -152,6 +158,14 @@ std::optional<Error> writeSmallFile(const std::string& path, std::string_view by
   }
   if (!flushFolder(path.substr(0, path.rfind('/') + 1))) return errorFromErrno(errno, path, FileAccess::Write);
   return std::nullopt;
+}
+
+int setFileAside(const std::string& path) {
+  int status = EEXIST;
+  for (int number = 1; status == EEXIST; ++number) {
+    status = renameWithoutReplacing(path, path + ".damaged-" + std::to_string(number));
+  }
+  return status;
 }
 
 int renameWithoutReplacing(const std::string& from, const std::string& to) {

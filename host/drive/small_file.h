@@ -22,12 +22,16 @@ Error errorFromErrno(int number, const std::string& path, FileAccess access);
 /// An error of FileErrorDomain with a reason of our own.
 Error fileError(int code, const std::string& path, const std::string& reason);
 
-/// The bytes of a regular file of at most SmallFileLimit bytes; a final link is not followed and a pipe doesn't block.
+/// The bytes of a regular file of at most `limit` bytes; a final link is not followed and a pipe doesn't block.
 /// Errors: 260, 257, else 256. Any thread.
-Result<std::string> readSmallFile(const std::string& path);
+Result<std::string> readSmallFile(const std::string& path, std::size_t limit = SmallFileLimit);
 /// Replaces `path` by a file with these bytes: temporary name in the same folder, flushed, renamed, the folder flushed.
 /// With `replacing` false an existing file stays and the error is 516. Any thread.
 std::optional<Error> writeSmallFile(const std::string& path, std::string_view bytes, bool replacing = true);
+
+/// Renames a file that is damaged to PATH.damaged-N, so that a new one is not what destroys it. Returns 0 or the error
+/// number.
+int setFileAside(const std::string& path);
 
 /// Renames a regular file and fails with EEXIST rather than replace one. Returns 0 or the error number.
 int renameWithoutReplacing(const std::string& from, const std::string& to);

@@ -8,21 +8,10 @@
 
 namespace vaelo {
 
-namespace {
-
-void keepAside(const std::string& path) {
-  int status = EEXIST;
-  for (int number = 1; status == EEXIST; ++number) {
-    status = renameWithoutReplacing(path, path + ".damaged-" + std::to_string(number));
-  }
-}
-
-}  // namespace
-
 KeyFile loadKeyFile(const std::string& path) {
   Result<KeyFile> file = readKeyFile(path);
   if (file) return std::move(*file.value);
-  if (file.error->code != FileErrorCode::ReadNoSuchFile) keepAside(path);
+  if (file.error->code != FileErrorCode::ReadNoSuchFile) setFileAside(path);
   return KeyFile(g_key_file_new());
 }
 

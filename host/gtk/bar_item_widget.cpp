@@ -3,8 +3,8 @@
 
 #include <memory>
 
+#include "host/gtk/framed_view.h"
 #include "platform/ui/button.h"
-#include "platform/ui/label.h"
 
 namespace vaelo {
 
@@ -42,37 +42,6 @@ void keepWithWidget(GtkWidget* widget, std::shared_ptr<void> token) {
                          [](gpointer held) { delete static_cast<std::shared_ptr<void>*>(held); });
 }
 
-/// Mirrors the text of one label.
-class LabelMirror : public ViewObserver {
- public:
-  LabelMirror(std::shared_ptr<Label> label, GtkLabel* widget) : label_(std::move(label)), widget_(widget) {
-    label_->setObserver(this);
-    show();
-  }
-  ~LabelMirror() override {
-    if (label_->observer() == this) label_->setObserver(nullptr);
-  }
-  void viewChanged(View&, ViewChange change) override {
-    if (change == ViewChange::Content) show();
-  }
-  void animationWillBegin(View&, const Animation&) override {}
-  void animationDidEnd(View&) override {}
-  void viewWillBeDestroyed(View&) override {}
-
- private:
-  void show() { gtk_label_set_text(widget_, label_->text().c_str()); }
-  std::shared_ptr<Label> label_;
-  GtkLabel* widget_;
-};
-
-GtkWidget* makeLabel(const std::shared_ptr<Label>& label) {
-  GtkWidget* widget = gtk_label_new(nullptr);
-  gtk_label_set_ellipsize(GTK_LABEL(widget), PANGO_ELLIPSIZE_END);
-  gtk_widget_add_css_class(widget, "caption");
-  keepWithWidget(widget, std::make_shared<LabelMirror>(label, GTK_LABEL(widget)));
-  return widget;
-}
-
 }  // namespace
 
 GtkWidget* makeBarItemWidget(const BarButtonItemRef& item) {
@@ -83,7 +52,9 @@ GtkWidget* makeBarItemWidget(const BarButtonItemRef& item) {
     if (system == SystemItem::FixedSpace) gtk_widget_set_size_request(space, 12, -1);
     return space;
   }
-  if (const auto label = std::dynamic_pointer_cast<Label>(item->customView())) return makeLabel(label);
+  if (item->customView() && !std::dynamic_pointer_cast<Button>(item->customView())) {
+    return makeFramedView(item->customView());
+  }
 
   GtkWidget* button = gtk_button_new();
   g_object_set_data(G_OBJECT(button), ItemKey, item.get());

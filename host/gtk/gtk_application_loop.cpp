@@ -6,6 +6,7 @@
 #include "host/desktop/recent_documents.h"
 #include "host/drive/drive_user_activities.h"
 #include "host/drive/promise_file.h"
+#include "host/gtk/accounts_page.h"
 #include "host/gtk/continue_banner.h"
 #include "host/gtk/drive_application.h"
 #include "host/gtk/gtk_screens.h"
@@ -108,6 +109,12 @@ int GtkApplicationLoop::run(int argc, char** argv, std::function<std::shared_ptr
        nullptr,
        nullptr,
        {0, 0, 0}},
+      {"accounts",
+       [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkApplicationLoop*>(self)->showAccounts(); },
+       nullptr,
+       nullptr,
+       nullptr,
+       {0, 0, 0}},
       {"quit",
        [](GSimpleAction*, GVariant*, gpointer self) {
          g_application_quit(G_APPLICATION(static_cast<GtkApplicationLoop*>(self)->application_));
@@ -192,11 +199,18 @@ void GtkApplicationLoop::launch(const LaunchOptions& options) {
   g_signal_connect_swapped(window->widget(), "notify::is-active",
                            G_CALLBACK(+[](GtkApplicationLoop* self) { self->windowFocusChanged(); }), this);
   offerToContinue();
+  tellOfDamage();
   rebuiltToken_ = notifications_.addObserver(DocumentIndexRebuiltNotification, [this](const Notification&) {
     if (const auto shown = screens_.window()) {
       shown->showToast("The drive’s index was damaged. It has been rebuilt, and the old one kept.", true);
     }
   });
+}
+
+void GtkApplicationLoop::tellOfDamage() {
+  if (!drive_.accountWasDamaged()) return;
+  screens_.window()->showToast(
+      "The file of your account was damaged. It was kept aside, and a new one made for the documents on this device.", true);
 }
 
 void GtkApplicationLoop::offerToContinue() {
@@ -275,7 +289,13 @@ void GtkApplicationLoop::restore() {
   if (!delegate_->applicationShouldRestoreApplicationState()) return;
   const auto window = screens_.window();
   const ViewControllerRef root = window ? window->rootViewController() : nullptr;
-  if (root) root->decodeRestorableStateWithCoder(DictionaryRestorationCoder(restoration_.load()));
+  if (!root) return;
+  const Dictionary kept = restoration_.load();
+  const auto place = kept.find("url");
+  const URL* document = place == kept.end() ? nullptr : place->second.get<URL>();
+  // What was shown may be another account's.
+  if (document && !drive_.URLIsInDriveMirror(*document)) return;
+  root->decodeRestorableStateWithCoder(DictionaryRestorationCoder(kept));
 }
 
 void GtkApplicationLoop::saveState() {
@@ -287,6 +307,10 @@ void GtkApplicationLoop::saveState() {
   if (const auto error = restoration_.save(coder.values())) {
     Platform::current().log.write(LogType::Error, "State can't be saved: " + error->description());
   }
+}
+
+void GtkApplicationLoop::showAccounts() {
+  if (const auto window = screens_.window()) showAccountsPage(window->widget(), drive_.layout(), notifications_);
 }
 
 void GtkApplicationLoop::showAbout() {

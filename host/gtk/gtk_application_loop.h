@@ -49,6 +49,8 @@ class GtkApplicationLoop : public Application {
   void restore();
   void saveState();
   void showAbout();
+  void showAccounts();
+  void tellOfDamage();
 
   GtkScreens& screens_;
   LocalCloudDocuments& drive_;

@@ -1,11 +1,17 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/gtk_screens.h"
 
+#include <glib/gi18n.h>
+
+#include "host/desktop/web_page.h"
 #include "host/gtk/drive_unavailable_screen.h"
 #include "host/gtk/folder_list_screen.h"
 #include "host/gtk/gtk_document_interaction.h"
 #include "host/gtk/gtk_window.h"
+#include "host/gtk/offer_button.h"
 #include "host/gtk/root_list_screen.h"
+#include "host/gtk/upgrade_flow.h"
+#include "host/support/glib_ptr.h"
 
 namespace vaelo {
 
@@ -18,11 +24,11 @@ WindowRef GtkScreens::makeWindow(const Rect& bounds) {
 DocumentListControllerRef GtkScreens::makeRootList() {
   const std::optional<URL> root = drive_.defaultContainerURL();
   if (!root) return nullptr;
-  return std::make_shared<RootListScreen>(*root, drive_, *this);
+  return std::make_shared<RootListScreen>(*root, drive_, *this, tags_);
 }
 
 DocumentListControllerRef GtkScreens::makeList(const URL& folder) {
-  return std::make_shared<FolderListScreen>(folder, drive_, *this);
+  return std::make_shared<FolderListScreen>(folder, drive_, *this, tags_);
 }
 
 std::optional<std::vector<DocumentListControllerRef>> GtkScreens::hierarchyTo(const URL& folder) {
@@ -57,6 +63,25 @@ std::shared_ptr<DocumentInteractionController> GtkScreens::makeDocumentInteracti
   return std::make_shared<GtkDocumentInteraction>(url, drive_, window_);
 }
 
+std::function<void(const std::string&)> GtkScreens::pageOpener() {
+  return [weak = window_](const std::string& address) {
+    const auto shown = weak.lock();
+    const GRef<GdkAppLaunchContext> context(
+        shown ? gdk_display_get_app_launch_context(gtk_widget_get_display(GTK_WIDGET(shown->widget()))) : nullptr);
+    openWebPage(address, G_APP_LAUNCH_CONTEXT(context.get()), [weak](const std::string& reason) {
+      if (const auto window = weak.lock()) window->showToast(std::string(_("The page can’t be opened.")) + " " + reason);
+    });
+  };
+}
+
+std::shared_ptr<UpgradeButton> GtkScreens::makeUpgradeButton(StorageOfferRef offer) {
+  return std::make_shared<OfferButton>(std::move(offer), pageOpener());
+}
+
+std::shared_ptr<UpgradeFlowManager> GtkScreens::makeUpgradeFlow(StorageOfferRef offer) {
+  return std::make_shared<UpgradeFlow>(std::move(offer), pageOpener());
+}
+
 void GtkScreens::runPreOpenAlert(const URL&, const ViewControllerRef&, std::function<void()> open) { open(); }
 
 InterfaceIdiom GtkScreens::userInterfaceIdiom() {
@@ -66,7 +91,8 @@ InterfaceIdiom GtkScreens::userInterfaceIdiom() {
 
 Screen GtkScreens::mainScreen() {
   constexpr Rect usual{0, 0, 800, 640};
-  return {usual, 1};
+  const auto shown = window();
+  return {usual, shown ? shown->traitCollection().displayScale : 1};
 }
 
 InterfaceOrientation GtkScreens::statusBarOrientation() {

@@ -9,12 +9,14 @@
 
 namespace vaelo {
 
+class DriveSyncedStore;
 class GtkWindowHost;
 
 /// Makes the screens of the GTK platform. Main thread.
 class GtkScreens : public ScreenFactory, private Device {
  public:
-  explicit GtkScreens(LocalCloudDocuments& drive) : drive_(drive) {}
+  /// Both outlive it.
+  GtkScreens(LocalCloudDocuments& drive, DriveSyncedStore& tags) : drive_(drive), tags_(tags) {}
   /// The application that new windows belong to.
   void setApplication(GtkApplication* application) { application_ = application; }
   /// The last window made; null before.
@@ -29,7 +31,8 @@ class GtkScreens : public ScreenFactory, private Device {
   ViewControllerRef makeDriveUnavailable() override;
   bool canPreviewItem(const URL& url) override;
   std::shared_ptr<DocumentInteractionController> makeDocumentInteraction(const URL& url) override;
-  std::shared_ptr<UpgradeFlowManager> makeUpgradeFlow(StorageOfferRef) override { return nullptr; }
+  std::shared_ptr<UpgradeButton> makeUpgradeButton(StorageOfferRef offer) override;
+  std::shared_ptr<UpgradeFlowManager> makeUpgradeFlow(StorageOfferRef offer) override;
   void runPreOpenAlert(const URL& url, const ViewControllerRef& presenter, std::function<void()> open) override;
 
  private:
@@ -38,7 +41,10 @@ class GtkScreens : public ScreenFactory, private Device {
   Rect statusBarFrame() override { return {}; }
   InterfaceOrientation statusBarOrientation() override;
 
+  std::function<void(const std::string&)> pageOpener();
+
   LocalCloudDocuments& drive_;
+  DriveSyncedStore& tags_;
   PangoGraphics graphics_;
   GtkApplication* application_ = nullptr;
   std::weak_ptr<GtkWindowHost> window_;

@@ -6,6 +6,7 @@
 #include "host/gtk/action_sheet.h"
 #include "host/gtk/alert_dialog.h"
 #include "host/gtk/folder_picker.h"
+#include "host/gtk/host_dialog.h"
 #include "host/gtk/host_screen.h"
 #include "platform/platform.h"
 #include "platform/ui/search_controller.h"
@@ -26,6 +27,7 @@ GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds)
   adw_toast_overlay_set_child(ADW_TOAST_OVERLAY(toasts_), overlay_);
   adw_application_window_set_content(window_, toasts_);
   g_menu_append(menu_, "_Refresh", "win.refresh");
+  g_menu_append(menu_, "A_ccounts…", "app.accounts");
   g_menu_append(menu_, "_About Vaelo Drive", "app.about");
   addActions();
   stack_.onSwipedBack([this](std::size_t left) {
@@ -161,6 +163,11 @@ void GtkWindowHost::present(const ViewControllerRef&, const ViewControllerRef& p
   } else if (alert) {
     dialogs_[presented.get()] = showAlertDialog(alert, widget(), std::move(done));
     return;
+  }
+  if (const auto screen = std::dynamic_pointer_cast<HostDialog>(presented)) {
+    GtkWindow* dialog = screen->makeDialog(widget());
+    dialogs_[presented.get()] = dialog;
+    gtk_window_present(dialog);
   }
   if (const auto picker = std::dynamic_pointer_cast<DocumentTargetSelectionController>(presented)) {
     folderPicker_ = std::make_shared<FolderPicker>(picker, Platform::current().cloudDocuments, widget());

@@ -32,14 +32,36 @@ TEST_F(DriveServiceTest, ADriveThatOutlivedItsAccountFileIsLeftAlone) {
   EXPECT_TRUE(exists(drive + "/mine.txt"));
 }
 
-TEST_F(DriveServiceTest, ADamagedAccountFileSignsNobodyInAndStays) {
+TEST_F(DriveServiceTest, ADamagedAccountFileIsSetAsideAndTheDriveOpens) {
+  write(drive + "/mine.txt");
   write(data + "/account.ini", "garbage");
   start();
-  EXPECT_FALSE(service->ubiquityIdentityToken());
-  EXPECT_EQ(read(data + "/account.ini"), "garbage");
-  EXPECT_GE(log.count("can't read the account"), 1);
-  EXPECT_TRUE(service->allContainers().empty());
-  EXPECT_EQ(service->defaultContainerURL(), std::nullopt);
+  EXPECT_TRUE(service->ubiquityIdentityToken());
+  EXPECT_TRUE(service->accountWasDamaged());
+  EXPECT_EQ(read(data + "/account.ini.damaged-1"), "garbage");
+  EXPECT_EQ(log.count("can't read the account"), 1);
+  EXPECT_EQ(service->defaultContainerURL(), URL(drive));
+  EXPECT_FALSE(exists(drive + "/Welcome to Vaelo Drive.md"));
+  const auto token = service->ubiquityIdentityToken();
+  start();
+  EXPECT_FALSE(service->accountWasDamaged());
+  EXPECT_EQ(service->ubiquityIdentityToken(), token);
+  write(data + "/account.ini", "[Account]\nName=no token\nSignedIn=true\n");
+  start();
+  EXPECT_TRUE(exists(data + "/account.ini.damaged-2"));
+}
+
+TEST_F(DriveServiceTest, AnAccountFileThatIsDamagedMeanwhileChangesNothing) {
+  start();
+  const auto token = service->ubiquityIdentityToken();
+  int posted = 0;
+  const auto observation = notifications.addObserver(AccountDidChangeNotification, [&](const Notification&) { ++posted; });
+  write(root + "/half", "[Account]\nNam");
+  std::filesystem::rename(root + "/half", data + "/account.ini");
+  ASSERT_TRUE(waitFor([&] { return log.count("can't read the account") >= 1; }));
+  EXPECT_EQ(service->ubiquityIdentityToken(), token);
+  EXPECT_EQ(posted, 0);
+  EXPECT_EQ(read(data + "/account.ini"), "[Account]\nNam");
 }
 
 TEST_F(DriveServiceTest, ADataFolderThatCannotBeMadeIsLogged) {

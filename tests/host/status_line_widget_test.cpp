@@ -1,0 +1,135 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include <adwaita.h>
+#include <gtest/gtest.h>
+
+#include "app/drive_status_label_view.h"
+#include "host/drive/account_offers.h"
+#include "host/gtk/framed_view.h"
+#include "host/gtk/offer_button.h"
+#include "tests/support/memory_platform.h"
+
+namespace vaelo {
+namespace {
+
+class StatusLineWidgetTest : public testing::Test {
+ protected:
+  StatusLineWidgetTest() {
+    adw_init();
+    label->setFont(Font::preferred(TextStyle::Caption2));
+    view->setPrimaryLabel(label);
+    view->setQuotaButton(button);
+    view->showLowQuota(false);
+    gtk_window_set_child(GTK_WINDOW(window), widget = makeFramedView(view));
+    gtk_window_set_default_size(GTK_WINDOW(window), 360, 60);
+    gtk_widget_show(window);
+    settle();
+  }
+  ~StatusLineWidgetTest() override { gtk_window_destroy(GTK_WINDOW(window)); }
+
+  void settle() {
+    // Until a frame was drawn after the last change.
+    bool drawn = false;
+    gtk_widget_queue_draw(window);
+    g_signal_connect(gtk_widget_get_frame_clock(window), "after-paint",
+                     G_CALLBACK(+[](GdkFrameClock*, bool* flag) { *flag = true; }), &drawn);
+    while (!drawn) g_main_context_iteration(nullptr, TRUE);
+    g_signal_handlers_disconnect_by_data(gtk_widget_get_frame_clock(window), &drawn);
+  }
+  GtkWidget* text() { return gtk_widget_get_first_child(widget); }
+  GtkWidget* press() { return gtk_widget_get_last_child(widget); }
+  double middleOf(GtkWidget* part) {
+    graphene_rect_t bounds;
+    EXPECT_TRUE(gtk_widget_compute_bounds(part, widget, &bounds));
+    return static_cast<double>(bounds.origin.x + bounds.size.width / 2);
+  }
+
+  MemoryPlatform memory;
+  std::vector<std::string> opened;
+  std::shared_ptr<DriveStatusLabelView> view = DriveStatusLabelView::initWithFrame({});
+  std::shared_ptr<Label> label = std::make_shared<Label>();
+  std::shared_ptr<OfferButton> button =
+      std::make_shared<OfferButton>(nullptr, [this](const std::string& page) { opened.push_back(page); });
+  GtkWidget* window = gtk_window_new();
+  GtkWidget* widget = nullptr;
+};
+
+TEST_F(StatusLineWidgetTest, ShowsTheLineInTheMiddleAndFollowsIt) {
+  view->setPrimaryLabelText("12 items, 4 GB available");
+  settle();
+  EXPECT_STREQ(gtk_label_get_text(GTK_LABEL(text())), "12 items, 4 GB available");
+  EXPECT_FALSE(gtk_widget_get_visible(press()));
+  EXPECT_NEAR(middleOf(text()), gtk_widget_get_width(widget) / 2.0, 1);
+  EXPECT_EQ(view->frame().width, gtk_widget_get_width(widget));
+}
+
+TEST_F(StatusLineWidgetTest, TheButtonComesUnderTheLineAndIsPressed) {
+  int presses = 0;
+  button->addAction(ControlEvent::TouchUpInside, [&presses] { ++presses; });
+  view->setPrimaryLabelText("12 items");
+  view->showLowQuota(true);
+  settle();
+  ASSERT_TRUE(gtk_widget_get_visible(press()));
+  graphene_rect_t line;
+  graphene_rect_t below;
+  ASSERT_TRUE(gtk_widget_compute_bounds(text(), widget, &line));
+  ASSERT_TRUE(gtk_widget_compute_bounds(press(), widget, &below));
+  EXPECT_GT(below.origin.y + below.size.height / 2, line.origin.y + line.size.height);
+  EXPECT_NEAR(middleOf(press()), gtk_widget_get_width(widget) / 2.0, 1);
+  g_signal_emit_by_name(press(), "clicked");
+  EXPECT_EQ(presses, 1);
+  view->showLowQuota(false);
+  EXPECT_FALSE(gtk_widget_get_visible(press()));
+}
+
+TEST_F(StatusLineWidgetTest, NothingIsLaidOutAgainWhenNothingChanged) {
+  view->setPrimaryLabelText("12 items");
+  settle();
+  struct Count : ViewObserver {
+    int changes = 0;
+    void viewChanged(View&, ViewChange) override { ++changes; }
+    void animationWillBegin(View&, const Animation&) override {}
+    void animationDidEnd(View&) override {}
+    void viewWillBeDestroyed(View&) override {}
+  } count;
+  ViewObserver* mirror = label->observer();
+  label->setObserver(&count);
+  gtk_widget_queue_resize(widget);
+  settle();
+  EXPECT_EQ(count.changes, 0);
+  label->setObserver(mirror);
+}
+
+TEST_F(StatusLineWidgetTest, AWidgetThatIsGoneLeavesTheView) {
+  gtk_window_set_child(GTK_WINDOW(window), nullptr);
+  EXPECT_EQ(view->observer(), nullptr);
+  EXPECT_EQ(label->observer(), nullptr);
+  GtkWidget* second = makeFramedView(view);
+  gtk_window_set_child(GTK_WINDOW(window), second);
+  view->setPrimaryLabelText("again");
+  EXPECT_STREQ(gtk_label_get_text(GTK_LABEL(gtk_widget_get_first_child(second))), "again");
+}
+
+TEST_F(StatusLineWidgetTest, TheLinkOpensThePageByItselfUnlessTheProviderWantsToBeAskedFirst) {
+  EXPECT_EQ(button->link(), nullptr);
+  button->setOffer(
+      std::make_shared<ProviderOffer>(1, UpgradeTerms{"https://a.example", {10}, false}, StorageFigures{5, 100}));
+  EXPECT_NE(button->link()->action(), UpgradeLink::ActionRunUpgradeFlow);
+  EXPECT_TRUE(button->link()->performDefaultAction());
+  EXPECT_EQ(opened, std::vector<std::string>{"https://a.example"});
+  EXPECT_EQ(button->title(), "Storage Almost Full – Upgrade…");
+  button->setOffer(
+      std::make_shared<ProviderOffer>(1, UpgradeTerms{"https://b.example", {10}, true}, StorageFigures{0, 100}));
+  EXPECT_EQ(button->link()->action(), UpgradeLink::ActionRunUpgradeFlow);
+  EXPECT_FALSE(button->link()->performDefaultAction());
+  EXPECT_EQ(opened.size(), 1u);
+  EXPECT_EQ(button->title(), "Storage Full – Upgrade…");
+}
+
+TEST_F(StatusLineWidgetTest, AButtonIsShownForAProvidersOffersAlone) {
+  const ProviderOffer offer(1, UpgradeTerms{"https://a.example", {10}, false}, StorageFigures{5, 100});
+  EXPECT_TRUE(button->shouldShowForOffer(offer));
+  EXPECT_FALSE(button->shouldShowForOffer(MemoryOffer(4)));
+}
+
+}  // namespace
+}  // namespace vaelo
