@@ -32,6 +32,8 @@ class LocalFileCoordination : public FileCoordination {
   void removeFilePresenter(FilePresenter& presenter) override;
   /// Told of every item that this program has moved, on the thread that moved it. Set before anything moves.
   void setMoveObserver(std::function<void(const URL& from, const URL& to)> observer) { moved_ = std::move(observer); }
+  /// What presenters of the item show of it is no longer what there is, though the item itself did not change.
+  void tellPresenters(const URL& item) { presenters_.itemChanged(item, nullptr); }
 
  private:
   friend class LocalFileCoordinator;

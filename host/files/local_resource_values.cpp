@@ -65,7 +65,7 @@ class LocalResourceValues::Reader {
       case ResourceKey::DocumentIdentifier:
         return documentIdentifier();
       case ResourceKey::ThumbnailDictionary:
-        return {};
+        return thumbnails();
     }
     return {};
   }
@@ -112,6 +112,11 @@ class LocalResourceValues::Reader {
   Value downloadingStatus() const {
     if (promise_) return DownloadingStatusNotDownloaded;
     return owner_.layout_.isInMirror(url_.path()) ? Value(DownloadingStatusCurrent) : Value();
+  }
+  Value thumbnails() const {
+    if (promise_ || !S_ISREG(info_.stx_mode) || !owner_.thumbnails_) return {};
+    const ImageRef image = owner_.thumbnails_(url_.path());
+    return image ? Value(Dictionary{{Thumbnail1024SizeKey, Value(image)}}) : Value();
   }
   Value documentIdentifier() const {
     const Result<std::int64_t> id = owner_.index_.documentIDFor(url_.path(), true);

@@ -1,5 +1,5 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include "host/gtk/list/thumbnail_cache.h"
+#include "host/gtk/thumbnails/thumbnail_cache.h"
 #include "host/support/glib_ptr.h"
 #include "tests/host/list_test_folder.h"
 

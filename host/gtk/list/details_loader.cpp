@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "host/gtk/list/details_reader.h"
+#include "host/gtk/thumbnails/thumbnail_maker.h"
 
 namespace vaelo {
 namespace {
@@ -25,6 +26,7 @@ void DetailsLoader::setFolder(const std::string& folder) {
   folder_ = folder;
   ++generation_;
   wanted_.clear();
+  missing_.clear();
 }
 
 void DetailsLoader::request(FolderItem& item) {
@@ -56,9 +58,47 @@ void DetailsLoader::readNext() {
           if (!item) continue;
           item->details = job.details;
           loaded_(*item);
+          if (job.details->mayHaveThumbnail) missing_.push_back(job.name);
         }
       }
       readNext();
+      if (!making_) makeNextThumbnail();
+    };
+  });
+}
+
+FolderItem* DetailsLoader::shownItem(const std::string& name) {
+  FolderItem* item = model_.liveItem(name);
+  return item && item->row ? item : nullptr;
+}
+
+void DetailsLoader::makeNextThumbnail() {
+  FolderItem* item = nullptr;
+  while (!missing_.empty() && !item) {
+    item = shownItem(missing_.back());
+    if (!item) {
+      // Asks again when it is drawn again.
+      if (FolderItem* gone = model_.liveItem(missing_.back())) gone->detailsAreFresh = false;
+      missing_.pop_back();
+    }
+  }
+  making_ = item != nullptr;
+  if (!making_) return;
+  missing_.pop_back();
+  maker_.run([this, generation = generation_, name = item->name, kind = item->kind, folder = folder_,
+              pixels = thumbnailPixels_]() -> std::function<void()> {
+    const std::string path = folder.empty() ? name : folder + "/" + name;
+    std::shared_ptr<const ItemDetails> details;
+    if (makeThumbnail(Thumbnailers::installed(), g_get_user_cache_dir(), path, pixels)) {
+      details = readDetails(path, kind, pixels);
+    }
+    return [this, generation, name, details] {
+      FolderItem* made = generation == generation_ ? model_.liveItem(name) : nullptr;
+      if (made && details) {
+        made->details = details;
+        loaded_(*made);
+      }
+      makeNextThumbnail();
     };
   });
 }

@@ -13,7 +13,8 @@ namespace vaelo {
 /// Fills in the details of the rows that are seen. Main thread.
 ///
 /// Rows ask when they are drawn. The names go to a worker in small batches, the ones asked for last first, since they are
-/// what is on screen now; a row that shows something else by the time its turn comes costs nothing.
+/// what is on screen now; a row that shows something else by the time its turn comes costs nothing. Thumbnails that are
+/// missing are made by another worker, one at a time, likewise: a thumbnailer may take long, and texts do not wait for it.
 class DetailsLoader {
  public:
   /// `loaded` is called for each item whose details came.
@@ -27,6 +28,8 @@ class DetailsLoader {
 
  private:
   void readNext();
+  void makeNextThumbnail();
+  FolderItem* shownItem(const std::string& name);
 
   FolderModel& model_;
   std::function<void(FolderItem&)> loaded_;
@@ -34,8 +37,11 @@ class DetailsLoader {
   int thumbnailPixels_ = 48;
   unsigned generation_ = 0;
   bool reading_ = false;
+  bool making_ = false;
   std::vector<std::string> wanted_;
+  std::vector<std::string> missing_;  // thumbnails
   Worker worker_;
+  Worker maker_;
 };
 
 }  // namespace vaelo

@@ -14,7 +14,8 @@
 
 #include "host/drive/promise_file.h"
 #include "host/gtk/list/folder_reader.h"
-#include "host/gtk/list/thumbnail_cache.h"
+#include "host/gtk/thumbnails/thumbnail_cache.h"
+#include "host/gtk/thumbnails/thumbnail_maker.h"
 
 namespace vaelo {
 namespace {
@@ -89,7 +90,10 @@ std::shared_ptr<const ItemDetails> readDetails(const std::string& path, EntryKin
     return details;
   }
   details->secondLine = joinedText({sizeText(status.stx_size), date});
-  details->thumbnail = cachedThumbnail(g_get_user_cache_dir(), path, status.stx_mtime.tv_sec, thumbnailPixels);
+  const char* cache = g_get_user_cache_dir();
+  details->thumbnail = cachedThumbnail(cache, path, status.stx_mtime.tv_sec, thumbnailPixels);
+  details->mayHaveThumbnail = !details->thumbnail && status.stx_size > 0 &&
+                              mayHaveThumbnail(Thumbnailers::installed(), cache, path, status.stx_mtime.tv_sec);
   return details;
 }
 

@@ -15,6 +15,7 @@ namespace vaelo {
 struct ItemDetails {
   std::string secondLine;           ///< UTF-8, ready to show
   GdkTexture* thumbnail = nullptr;  ///< owned
+  bool mayHaveThumbnail = false;    ///< one is missing that could be made
   ItemDetails() = default;
   ~ItemDetails() { g_clear_object(&thumbnail); }
   ItemDetails(const ItemDetails&) = delete;
