@@ -19,7 +19,7 @@ int main(int argc, char** argv) {
   vaelo::drawWithoutGLWhereItIsEmulated();
   const vaelo::HostFolders folders = vaelo::HostFolders::fromEnvironment();
   vaelo::HostPlatform platform(folders);
-  vaelo::GtkScreens screens(platform.drive());
+  vaelo::GtkScreens screens(platform.drive(), platform.syncedStore());
   vaelo::GtkApplicationLoop loop(screens, platform.drive(), platform.notifications(), platform.userActivities(),
                                  vaelo::RestorationStore(folders.restorationFile));
   platform.install(loop, screens);

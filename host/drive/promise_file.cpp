@@ -156,6 +156,19 @@ std::optional<Error> writePromise(const std::string& folder, const PromiseInfo& 
   return writeSmallFile(path, keyFileText(file.get()));
 }
 
+std::optional<Error> setPromiseTags(const std::string& promisePath, const std::vector<std::string>& tags) {
+  const Result<KeyFile> file = readKeyFile(promisePath);
+  if (!file) return file.error;
+  std::vector<const char*> texts;
+  for (const std::string& tag : tags) texts.push_back(tag.c_str());
+  if (texts.empty()) {
+    g_key_file_remove_key(file.value->get(), group, "Tags", nullptr);
+  } else {
+    g_key_file_set_string_list(file.value->get(), group, "Tags", texts.data(), texts.size());
+  }
+  return writeSmallFile(promisePath, keyFileText(file.value->get()));
+}
+
 std::optional<Error> setPromiseDocumentID(const std::string& promisePath, std::int64_t documentID) {
   const Result<KeyFile> file = readKeyFile(promisePath);
   if (!file) return file.error;

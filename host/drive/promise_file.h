@@ -50,6 +50,8 @@ Result<PromiseInfo> readPromise(const std::string& promisePath);
 /// Writes the promise of `info.name` into `folder`, replacing one that is there: a temporary name in the same folder,
 /// flushed, renamed, the folder flushed. Either the old or the new promise survives a crash. Errors: those of FileManager.
 std::optional<Error> writePromise(const std::string& folder, const PromiseInfo& info);
+/// Writes the tags into a promise, likewise; none takes the key away.
+std::optional<Error> setPromiseTags(const std::string& promisePath, const std::vector<std::string>& tags);
 /// Writes the identifier into a promise as writePromise does and keeps all else that the file says.
 std::optional<Error> setPromiseDocumentID(const std::string& promisePath, std::int64_t documentID);
 

@@ -21,7 +21,7 @@ constexpr std::chrono::milliseconds Settling(100);
 constexpr std::size_t MostFolders = 256;    // of one item's tree
 constexpr std::size_t MostEntries = 20000;  // that are read to find them
 constexpr unsigned OwnMoves = IN_MOVE_SELF | IN_DELETE_SELF;
-constexpr unsigned Entries = IN_CREATE | IN_DELETE | IN_MOVED_FROM | IN_MOVED_TO | IN_CLOSE_WRITE | IN_MODIFY;
+constexpr unsigned Entries = IN_CREATE | IN_DELETE | IN_MOVED_FROM | IN_MOVED_TO | IN_CLOSE_WRITE | IN_MODIFY | IN_ATTRIB;
 
 std::vector<std::string> foldersIn(const std::string& folder, std::size_t& entries) {
   std::vector<std::string> found;
@@ -193,6 +193,8 @@ void ItemWatcher::notice(int folder, unsigned mask, const std::string& name) {
       if (path != state.folder() || !state.concerns(name)) continue;
     } else if (mask & (IN_DELETE | IN_MOVED_FROM)) {
       state.sawRemoval(path + "/" + name);
+    } else if (mask & IN_ATTRIB) {
+      continue;  // of what an item holds nobody shows attributes
     } else if (mask & (IN_CREATE | IN_MOVED_TO)) {
       state.sawArrival(path + "/" + name);
       if (mask & IN_ISDIR) item->needsArming = true;

@@ -8,6 +8,8 @@
 #include <algorithm>
 #include <utility>
 
+#include "host/drive/extended_attribute.h"
+#include "host/drive/item_attributes.h"
 #include "host/drive/promise_file.h"
 
 namespace vaelo {
@@ -26,7 +28,7 @@ bool isThere(const std::string& path) {
 }  // namespace
 
 bool WatchedItem::Seen::isSameAs(const Seen& other) const {
-  if (device != other.device || inode != other.inode || type != other.type) return false;
+  if (device != other.device || inode != other.inode || type != other.type || tags != other.tags) return false;
   // A folder's own times say less than what is seen in it.
   return S_ISDIR(type) ||
          (size == other.size && modified.tv_sec == other.modified.tv_sec && modified.tv_nsec == other.modified.tv_nsec);
@@ -50,7 +52,8 @@ std::optional<WatchedItem::Seen> WatchedItem::see(UniqueFd* held) const {
   struct stat status = {};
   if (!file || ::fstat(file.get(), &status) != 0) return std::nullopt;
   *held = std::move(file);
-  return Seen{status.st_dev, status.st_ino, status.st_mode & S_IFMT, status.st_size, status.st_mtim};
+  return Seen{status.st_dev,  status.st_ino,  status.st_mode & S_IFMT,
+              status.st_size, status.st_mtim, extendedAttribute(*physical, TagsAttribute).value_or("")};
 }
 
 // The kernel knows the name under which a file was opened also after that was changed, or one of the folders above it.

@@ -64,6 +64,7 @@ class WatchedItem {
     mode_t type = 0;
     off_t size = 0;
     timespec modified = {};
+    std::string tags;  // the attribute, as it is kept
     bool isSameAs(const Seen& other) const;
   };
   void setPath(const std::string& path);

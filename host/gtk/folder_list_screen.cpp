@@ -4,6 +4,7 @@
 #include <adwaita.h>
 
 #include "host/gtk/item_actions_menu.h"
+#include "host/gtk/tags_popover.h"
 #include "platform/platform.h"
 
 namespace vaelo {
@@ -30,8 +31,9 @@ std::string titleOf(const URL& folder, CloudDocuments& drive) {
 
 }  // namespace
 
-FolderListScreen::FolderListScreen(const URL& folder, CloudDocuments& drive, ScreenFactory& screens, bool allContainers)
-    : DocumentListController(folder, allContainers), drive_(drive), screens_(screens) {
+FolderListScreen::FolderListScreen(const URL& folder, CloudDocuments& drive, ScreenFactory& screens, DriveSyncedStore& tags,
+                                   bool allContainers)
+    : DocumentListController(folder, allContainers), drive_(drive), screens_(screens), tags_(tags) {
   setTitle(titleOf(folder, drive));
 }
 
@@ -94,6 +96,7 @@ void FolderListScreen::offerActions(const URL& url, GtkWidget* over, const GdkRe
     const graphene_point_t corner = {static_cast<float>(at.x), static_cast<float>(at.y)};
     GtkWidget* window = GTK_WIDGET(gtk_widget_get_root(over));
     if (!window || !gtk_widget_compute_point(over, window, &corner, &place)) return;
+    if (action == TagsEntry) return showTagsPopover(over, at, url, self->tags_);
     self->anchor_ = std::make_shared<View>(Rect{static_cast<double>(place.x), static_cast<double>(place.y),
                                                 static_cast<double>(at.width), static_cast<double>(at.height)});
     // What is opened is what a peek has prepared; what can't be peeked at, as a link, is opened as by a tap.

@@ -13,10 +13,13 @@
 
 namespace vaelo {
 
+class DriveSyncedStore;
+
 /// The list of one folder: its rows, and the search below it. Main thread.
 class FolderListScreen : public DocumentListController, public HostScreen {
  public:
-  FolderListScreen(const URL& folder, CloudDocuments& drive, ScreenFactory& screens, bool allContainers = false);
+  FolderListScreen(const URL& folder, CloudDocuments& drive, ScreenFactory& screens, DriveSyncedStore& tags,
+                   bool allContainers = false);
   ~FolderListScreen() override;
 
   GtkWidget* contentWidget() override;
@@ -54,6 +57,7 @@ class FolderListScreen : public DocumentListController, public HostScreen {
 
   CloudDocuments& drive_;
   ScreenFactory& screens_;
+  DriveSyncedStore& tags_;
   std::unique_ptr<FolderView> view_;
   std::unique_ptr<FolderView> results_;
   GtkWidget* content_ = nullptr;

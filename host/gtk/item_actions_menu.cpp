@@ -15,9 +15,10 @@ struct Entry {
 };
 
 // What a person does most comes first, and what can't be undone last.
-constexpr Entry Entries[] = {{ItemAction::FirmpressPop, "_Open"}, {ItemAction::Share, "_Share…"},
-                             {ItemAction::Info, "_Info"},         {ItemAction::Rename, "_Rename…"},
-                             {ItemAction::Move, "_Move…"},        {ItemAction::Delete, "_Delete…"}};
+constexpr Entry Entries[] = {
+    {ItemAction::FirmpressPop, "_Open"}, {ItemAction::Share, "_Share…"}, {ItemAction::Info, "_Info"},
+    {ItemAction::Rename, "_Rename…"},    {TagsEntry, "_Tags…"},          {ItemAction::Move, "_Move…"},
+    {ItemAction::Delete, "_Delete…"}};
 
 using Chosen = std::function<void(int)>;
 
@@ -44,7 +45,7 @@ void showItemActionsMenu(GtkWidget* over, const GdkRectangle& at, unsigned avail
   GMenu* menu = g_menu_new();
   GMenu* section = g_menu_new();
   for (const Entry& entry : Entries) {
-    if (!(available & 1U << entry.action)) continue;
+    if (entry.action != TagsEntry && !(available & 1U << entry.action)) continue;
     if (entry.action == ItemAction::Delete) {
       g_menu_append_section(menu, nullptr, G_MENU_MODEL(section));
       g_object_unref(section);

@@ -7,9 +7,12 @@
 
 namespace vaelo {
 
+/// The code of the host's own entry beside those of ItemAction: the item's tags.
+inline constexpr int TagsEntry = 1000;
+
 /// Offers the actions of one item in a menu that points at `at`, in the coordinates of `over`. `available` has bit n for the
-/// code n of ItemAction. `chosen` gets the code, once, after the menu closed; nothing when the user changes their mind. Main
-/// thread.
+/// code n of ItemAction; the tags are always offered. `chosen` gets the code, once, after the menu closed; nothing when the
+/// user changes their mind. Main thread.
 void showItemActionsMenu(GtkWidget* over, const GdkRectangle& at, unsigned available, std::function<void(int)> chosen);
 
 }  // namespace vaelo

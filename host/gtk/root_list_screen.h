@@ -10,8 +10,8 @@ namespace vaelo {
 /// The root of the drive: the content of the drive's own folder, and the app libraries with their names. Main thread.
 class RootListScreen : public FolderListScreen {
  public:
-  RootListScreen(const URL& folder, CloudDocuments& drive, ScreenFactory& screens)
-      : FolderListScreen(folder, drive, screens, true) {}
+  RootListScreen(const URL& folder, CloudDocuments& drive, ScreenFactory& screens, DriveSyncedStore& tags)
+      : FolderListScreen(folder, drive, screens, tags, true) {}
   void refresh() override { read(); }
 
  protected:

@@ -67,7 +67,7 @@ class PresenterPageTest : public drive_test::DriveTest {
     if (!gtk_init_check()) GTEST_SKIP() << "no display";
     adw_init();
     platform = std::make_unique<HostPlatform>(HostFolders{data, root + "/preferences.ini", root + "/restoration.ini"});
-    screens = std::make_unique<GtkScreens>(platform->drive());
+    screens = std::make_unique<GtkScreens>(platform->drive(), platform->syncedStore());
     platform->install(application, *screens);
     window = gtk_window_new();
     gtk_window_set_default_size(GTK_WINDOW(window), 400, 500);

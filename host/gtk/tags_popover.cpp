@@ -1,0 +1,244 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include "host/gtk/tags_popover.h"
+
+#include <glib/gi18n.h>
+
+#include <algorithm>
+#include <array>
+#include <cmath>
+#include <map>
+#include <memory>
+#include <optional>
+#include <set>
+#include <string>
+#include <vector>
+
+#include "host/drive/drive_synced_store.h"
+#include "host/drive/item_attributes.h"
+#include "host/drive/promise_file.h"
+#include "host/drive/small_file.h"
+#include "host/gtk/list/worker.h"
+#include "host/support/glib_ptr.h"
+#include "items/file_tags.h"
+
+namespace vaelo {
+
+namespace {
+
+/// More than anybody looks through; the field finds the others by their name.
+constexpr std::size_t MostRows = 200;
+constexpr int RowHeight = 44;
+constexpr std::array<const char*, 8> ColorNames = {N_("No color"), N_("Gray"),   N_("Green"), N_("Purple"),
+                                                   N_("Blue"),     N_("Yellow"), N_("Red"),   N_("Orange")};
+
+std::string dotOf(const Color& color) {
+  const auto byte = [](double channel) { return static_cast<int>(std::lround(std::clamp(channel, 0.0, 1.0) * 255)); };
+  return takeString(
+      g_strdup_printf("<span foreground=\"#%02x%02x%02x\">●</span>", byte(color.red), byte(color.green), byte(color.blue)));
+}
+
+/// On one line, whatever another program has put into a name.
+std::string shown(std::string name) {
+  std::replace_if(
+      name.begin(), name.end(), [](unsigned char c) { return c < 0x20 || c == 0x7f; }, ' ');
+  return name;
+}
+
+void setAccessibleName(GtkWidget* widget, const std::string& name) {
+  gtk_accessible_update_property(GTK_ACCESSIBLE(widget), GTK_ACCESSIBLE_PROPERTY_LABEL, name.c_str(), -1);
+}
+
+std::optional<Error> setTag(const std::string& path, const std::string& name, bool on) {
+  const std::optional<std::string> physical = physicalPathOf(path);
+  if (!physical) return fileError(FileErrorCode::NoSuchFile, path, _("The item is no longer there."));
+  return setTagAt(*physical, name, on);
+}
+
+std::string messageFor(const Error& error) {
+  switch (error.code) {
+    case FileErrorCode::WriteInvalidFileName:
+      return _("A tag’s name is text without commas, at most 100 letters.");
+    case FileErrorCode::NoSuchFile:
+      return _("The item is no longer there.");
+    case FileErrorCode::WriteNoPermission:
+      return _("You have no permission to change this item.");
+    case FileErrorCode::FeatureUnsupported:
+      return _("A newer version of the application keeps the tags.");
+    default:
+      return std::string(_("The tags can’t be changed:")) + " " + error.localizedFailureReason.value_or("");
+  }
+}
+
+/// Lives as long as its popover.
+class TagsPopover {
+ public:
+  TagsPopover(GtkWidget* over, const GdkRectangle& at, const URL& item, DriveSyncedStore& tags)
+      : path_(item.path()), tags_(tags), popover_(gtk_popover_new()) {
+    gtk_widget_set_parent(popover_, over);
+    gtk_popover_set_pointing_to(GTK_POPOVER(popover_), &at);
+    setAccessibleName(popover_, _("Tags"));
+    GtkWidget* box = gtk_box_new(GTK_ORIENTATION_VERTICAL, 6);
+    rows_ = gtk_box_new(GTK_ORIENTATION_VERTICAL, 0);
+    GtkWidget* scroller = gtk_scrolled_window_new();
+    gtk_scrolled_window_set_policy(GTK_SCROLLED_WINDOW(scroller), GTK_POLICY_NEVER, GTK_POLICY_AUTOMATIC);
+    gtk_scrolled_window_set_propagate_natural_height(GTK_SCROLLED_WINDOW(scroller), TRUE);
+    gtk_scrolled_window_set_max_content_height(GTK_SCROLLED_WINDOW(scroller), 6 * RowHeight);
+    gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scroller), rows_);
+    gtk_box_append(GTK_BOX(box), scroller);
+    makeField(box);
+    gtk_popover_set_child(GTK_POPOVER(popover_), box);
+    g_signal_connect(popover_, "closed", G_CALLBACK(closed), nullptr);
+    g_signal_connect(popover_, "destroy", G_CALLBACK(+[](GtkWidget*, TagsPopover* self) { delete self; }), this);
+    worker_.run([this, path = path_]() -> std::function<void()> {
+      const std::optional<std::string> physical = physicalPathOf(path);
+      return [this, names = physical ? tagNamesAt(*physical) : std::vector<std::string>()] { fill(names); };
+    });
+  }
+
+ private:
+  static void closed(GtkWidget* popover, gpointer) {
+    // A toggle of it may still be on its way.
+    g_idle_add_full(
+        G_PRIORITY_LOW,
+        [](gpointer held) -> gboolean {
+          gtk_widget_unparent(GTK_WIDGET(held));
+          return G_SOURCE_REMOVE;
+        },
+        g_object_ref(popover), g_object_unref);
+  }
+
+  void makeField(GtkWidget* box) {
+    field_ = gtk_entry_new();
+    gtk_entry_set_placeholder_text(GTK_ENTRY(field_), _("New tag"));
+    setAccessibleName(field_, _("New tag"));
+    gtk_box_append(GTK_BOX(box), field_);
+    g_signal_connect_swapped(field_, "activate", G_CALLBACK(+[](TagsPopover* self) { self->addTyped(); }), this);
+    GtkWidget* palette = gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 0);
+    gtk_widget_set_halign(palette, GTK_ALIGN_CENTER);
+    for (std::size_t i = 0; i < ColorNames.size(); ++i) {
+      GtkWidget* button = gtk_toggle_button_new();
+      GtkWidget* dot = gtk_label_new(nullptr);
+      gtk_label_set_markup(GTK_LABEL(dot), dotOf(FileTags::_tagBlipColors()[i]).c_str());
+      gtk_button_set_child(GTK_BUTTON(button), dot);
+      gtk_widget_add_css_class(button, "flat");
+      gtk_widget_set_tooltip_text(button, _(ColorNames[i]));
+      setAccessibleName(button, _(ColorNames[i]));
+      if (i > 0) gtk_toggle_button_set_group(GTK_TOGGLE_BUTTON(button), GTK_TOGGLE_BUTTON(colors_[0]));
+      colors_[i] = button;
+      gtk_box_append(GTK_BOX(palette), button);
+    }
+    gtk_toggle_button_set_active(GTK_TOGGLE_BUTTON(colors_[0]), TRUE);
+    gtk_box_append(GTK_BOX(box), palette);
+    problem_ = gtk_label_new(nullptr);
+    gtk_label_set_wrap(GTK_LABEL(problem_), TRUE);
+    gtk_label_set_max_width_chars(GTK_LABEL(problem_), 32);
+    gtk_label_set_xalign(GTK_LABEL(problem_), 0);
+    gtk_widget_add_css_class(problem_, "error");
+    gtk_widget_set_visible(problem_, FALSE);
+    gtk_box_append(GTK_BOX(box), problem_);
+  }
+
+  void fill(const std::vector<std::string>& names) {
+    const std::set<std::string> on(names.begin(), names.end());
+    // Those that it has come first: of ten thousand they may not be among the first.
+    for (const std::string& name : names) addRow(name, true);
+    for (const std::string& name : FileTags::allTags()) {
+      if (checks_.size() >= MostRows) break;
+      if (!on.contains(name) && isTagName(name)) addRow(name, false);
+    }
+    gtk_popover_popup(GTK_POPOVER(popover_));
+  }
+
+  void addRow(const std::string& name, bool on) {
+    if (checks_.contains(name)) return;
+    const std::map<std::string, Color> colors = FileTags::tagColorsByTag();
+    const auto color = colors.find(name);
+    GtkWidget* text = gtk_label_new(nullptr);
+    const std::string markup = dotOf(color == colors.end() ? FileTags::_tagBlipColors()[0] : color->second) + " " +
+                               takeString(g_markup_escape_text(shown(name).c_str(), -1));
+    gtk_label_set_markup(GTK_LABEL(text), markup.c_str());
+    gtk_label_set_ellipsize(GTK_LABEL(text), PANGO_ELLIPSIZE_END);
+    gtk_label_set_max_width_chars(GTK_LABEL(text), 28);
+    gtk_label_set_xalign(GTK_LABEL(text), 0);
+    GtkWidget* check = gtk_check_button_new();
+    gtk_check_button_set_child(GTK_CHECK_BUTTON(check), text);
+    gtk_check_button_set_active(GTK_CHECK_BUTTON(check), on);
+    gtk_widget_set_size_request(check, -1, RowHeight);
+    setAccessibleName(check, shown(name));
+    g_object_set_data_full(G_OBJECT(check), "vaelo-tag", g_strdup(name.c_str()), g_free);
+    g_signal_connect(check, "toggled", G_CALLBACK(+[](GtkCheckButton* toggled, TagsPopover* self) {
+                       const auto* tag = static_cast<const char*>(g_object_get_data(G_OBJECT(toggled), "vaelo-tag"));
+                       self->toggled(tag, gtk_check_button_get_active(toggled));
+                     }),
+                     this);
+    checks_[name] = check;
+    gtk_box_append(GTK_BOX(rows_), check);
+  }
+
+  void toggled(const std::string& name, bool on) {
+    if (settling_) return;
+    gtk_widget_set_visible(problem_, FALSE);
+    worker_.run([this, path = path_, name, on]() -> std::function<void()> {
+      return [this, name, on, failed = setTag(path, name, on)] {
+        if (failed) refuse(name, !on, *failed);
+      };
+    });
+  }
+
+  void refuse(const std::string& name, bool was, const Error& error) {
+    settling_ = true;
+    if (const auto check = checks_.find(name); check != checks_.end()) {
+      gtk_check_button_set_active(GTK_CHECK_BUTTON(check->second), was);
+    }
+    settling_ = false;
+    gtk_label_set_text(GTK_LABEL(problem_), messageFor(error).c_str());
+    gtk_widget_set_visible(problem_, TRUE);
+  }
+
+  unsigned chosenLabel() const {
+    for (std::size_t i = 0; i < colors_.size(); ++i) {
+      if (gtk_toggle_button_get_active(GTK_TOGGLE_BUTTON(colors_[i]))) return static_cast<unsigned>(i);
+    }
+    return 0;
+  }
+
+  void addTyped() {
+    const std::string name = takeString(g_strstrip(g_strdup(gtk_editable_get_text(GTK_EDITABLE(field_)))));
+    if (name.empty()) return;
+    gtk_widget_set_visible(problem_, FALSE);
+    worker_.run([this, path = path_, name, label = chosenLabel(), tags = &tags_]() -> std::function<void()> {
+      std::optional<Error> failed = tags->addTag(name, label);
+      if (!failed) failed = setTag(path, name, true);
+      return [this, name, failed] { added(name, failed); };
+    });
+  }
+
+  void added(const std::string& name, const std::optional<Error>& failed) {
+    if (failed) return refuse(name, false, *failed);
+    gtk_editable_set_text(GTK_EDITABLE(field_), "");
+    FileTags::_tagColorsDidChange();
+    addRow(name, true);
+    settling_ = true;
+    gtk_check_button_set_active(GTK_CHECK_BUTTON(checks_.at(name)), TRUE);
+    settling_ = false;
+  }
+
+  const std::string path_;
+  DriveSyncedStore& tags_;
+  GtkWidget* popover_;
+  GtkWidget* rows_ = nullptr;
+  GtkWidget* field_ = nullptr;
+  GtkWidget* problem_ = nullptr;
+  std::array<GtkWidget*, 8> colors_{};
+  std::map<std::string, GtkWidget*> checks_;
+  bool settling_ = false;
+  Worker worker_;
+};
+
+}  // namespace
+
+void showTagsPopover(GtkWidget* over, const GdkRectangle& at, const URL& item, DriveSyncedStore& tags) {
+  new TagsPopover(over, at, item, tags);
+}
+
+}  // namespace vaelo
