@@ -33,12 +33,11 @@ void AccountOffers::take(const StorageFigures& figures) {
 }
 
 void AccountOffers::accountChanged(bool isAnother) {
-  if (isAnother) {
-    figures_.reset();
-    changedAt_.reset();
-  }
+  if (isAnother) figures_.reset();
+  // Somebody did something, such as to buy: what comes of it need not wait.
+  changedAt_.reset();
   update();
-  if (!figures_ && account_.terms()) account_.measure();
+  if (account_.terms()) account_.measure();
 }
 
 std::shared_ptr<ProviderOffer> AccountOffers::offerNow() const {
@@ -62,7 +61,7 @@ void AccountOffers::update() {
 }
 
 void AccountOffers::updateAfterPause() {
-  if (waits_ || offerNow() == offer_) return;
+  if (offerNow() == offer_) return;
   const Date now = queues_.now();
   const Date due = changedAt_ ? *changedAt_ + ChangePause : now;
   if (due <= now) {
@@ -70,6 +69,7 @@ void AccountOffers::updateAfterPause() {
     update();
     return;
   }
+  if (waits_) return;
   waits_ = true;
   queues_.main().after(due - now, [self = self_] {
     if (!*self) return;

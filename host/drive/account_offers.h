@@ -56,7 +56,7 @@ class AccountOffers : public OfferManager {
 
   /// Any thread; takes effect on the main queue.
   void storageMeasured(const StorageFigures& figures);
-  /// The terms may have changed; `isAnother`: so has the account.
+  /// What the account may use, or its provider's terms, may have changed; `isAnother`: so has the account. Measures anew.
   void accountChanged(bool isAnother);
 
  private:

@@ -113,7 +113,9 @@ class FramedView : public ViewObserver {
     const auto* button = dynamic_cast<const Button*>(part.view.get());
     const Label& label = button ? *button->titleLabel() : static_cast<const Label&>(*part.view);
     gtk_label_set_text(GTK_LABEL(part.text), label.text().c_str());
-    if (button) gtk_widget_set_sensitive(part.widget, button->enabled());
+    if (!button) return;
+    gtk_widget_set_sensitive(part.widget, button->enabled());
+    gtk_accessible_update_property(GTK_ACCESSIBLE(part.widget), GTK_ACCESSIBLE_PROPERTY_LABEL, label.text().c_str(), -1);
   }
 
   static void place(const Part& part, int width) {

@@ -102,7 +102,17 @@ TEST_F(AccountOffersTest, OtherTermsAreAnotherOfferAtOnce) {
   offers.accountChanged(false);
   EXPECT_EQ(offers.currentOffer(), nullptr);
   EXPECT_EQ(changes, 3);
-  EXPECT_EQ(measures, 0);
+}
+
+TEST_F(AccountOffersTest, WhatWasBoughtIsMeasuredAndNeedNotWait) {
+  measured(150);
+  measured(10);  // waits for the pause to end
+  EXPECT_EQ(level(), 1);
+  offers.accountChanged(false);
+  EXPECT_EQ(measures, 1);
+  EXPECT_EQ(level(), 3);
+  measured(900);
+  EXPECT_EQ(level(), 0);
 }
 
 TEST_F(AccountOffersTest, AnotherAccountIsMeasuredAnew) {
