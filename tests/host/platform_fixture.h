@@ -16,7 +16,7 @@ class PlatformTest : public DriveTest {
  protected:
   PlatformTest()
       : platform({data, root + "/preferences.ini", root + "/restoration.ini"}),
-        screens(platform.drive()),
+        screens(platform.drive(), platform.syncedStore()),
         loop(screens, platform.drive(), platform.notifications(), platform.userActivities(),
              RestorationStore(root + "/restoration.ini")) {
     platform.install(loop, screens);
