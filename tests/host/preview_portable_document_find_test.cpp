@@ -60,6 +60,14 @@ TEST_F(PortableDocumentFindTest, BeginsAtThePageThatIsReadAndGoesRound) {
   EXPECT_EQ(screen_->canvas().visiblePages().second, 9);
 }
 
+TEST_F(PortableDocumentFindTest, APlaceIsFoundOnceThoughTheSearchGoesRound) {
+  writeDocument(path(), 10);
+  open();
+  screen_->canvas().showPage(5);
+  find("page 8");
+  EXPECT_EQ(screen_->find().count(), 1);
+}
+
 TEST_F(PortableDocumentFindTest, AnotherTextGivesTheFirstUp) {
   writeDocument(path(), 400);
   open();
