@@ -57,6 +57,12 @@ class DriveUserActivities::Publisher : public CurrentActivity {
     current_ = nullptr;
     offer(std::nullopt);
   }
+  /// What was current was so for the account before.
+  void forget() {
+    const std::lock_guard lock(mutex_);
+    current_ = nullptr;
+    offer(std::nullopt);
+  }
   /// Calls back on the queue, now and when this device's own activity has changed.
   void findOthers(Found found) {
     queue_->async([this, found = std::move(found)]() mutable {
@@ -267,6 +273,7 @@ std::shared_ptr<UserActivity> DriveUserActivities::makeActivity(const std::strin
 }
 
 void DriveUserActivities::accountChanged() {
+  publisher_->forget();
   if (watch_) watch_->restart();
 }
 

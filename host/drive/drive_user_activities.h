@@ -38,7 +38,8 @@ class DriveUserActivities : public UserActivities {
   /// behind when it crashed goes. Files that can't be believed are ignored, and the log tells of each once. Main thread,
   /// once.
   void watchOthers(OfferChanged changed);
-  /// Another account has its turn: what it is told and what is followed is in its mirror now. Main thread.
+  /// Another account has its turn: nothing is current any more, and what is told and followed from now on is in its mirror.
+  /// Main thread.
   void accountChanged();
 
  private:

@@ -87,6 +87,7 @@ class TagsPopover {
     gtk_box_append(GTK_BOX(box), scroller);
     makeField(box);
     gtk_popover_set_child(GTK_POPOVER(popover_), box);
+    keepFocusIn(box);
     g_signal_connect(popover_, "closed", G_CALLBACK(closed), nullptr);
     g_signal_connect(popover_, "destroy", G_CALLBACK(+[](GtkWidget*, TagsPopover* self) { delete self; }), this);
     worker_.run([this, path = path_]() -> std::function<void()> {
@@ -105,6 +106,24 @@ class TagsPopover {
           return G_SOURCE_REMOVE;
         },
         g_object_ref(popover), g_object_unref);
+  }
+
+  /// The parent does not know of the popover when it moves the focus, so that Tab would leave it.
+  void keepFocusIn(GtkWidget* box) {
+    GtkEventController* keys = gtk_event_controller_key_new();
+    gtk_event_controller_set_propagation_phase(keys, GTK_PHASE_CAPTURE);
+    g_signal_connect(
+        keys, "key-pressed",
+        G_CALLBACK(+[](GtkEventControllerKey*, guint key, guint, GdkModifierType, GtkWidget* inside) -> gboolean {
+          if (key != GDK_KEY_Tab && key != GDK_KEY_ISO_Left_Tab) return FALSE;
+          const GtkDirectionType way = key == GDK_KEY_Tab ? GTK_DIR_TAB_FORWARD : GTK_DIR_TAB_BACKWARD;
+          if (gtk_widget_child_focus(inside, way)) return TRUE;
+          gtk_root_set_focus(gtk_widget_get_root(inside), nullptr);
+          gtk_widget_child_focus(inside, way);
+          return TRUE;
+        }),
+        box);
+    gtk_widget_add_controller(popover_, keys);
   }
 
   void makeField(GtkWidget* box) {

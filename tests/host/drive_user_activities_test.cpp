@@ -59,7 +59,7 @@ class DriveUserActivitiesTest : public drive_test::DriveTest {
   }
   bool becomes(const std::function<bool()>& condition) { return waitUntil(condition); }
 
-  const DriveLayout layout{data};
+  DriveLayout layout{data};
   const std::string folder = mirror + "/.vaelo/activities";
   const std::string own = folder + "/own.ini";
   GLibQueues queues;
@@ -83,6 +83,20 @@ TEST_F(DriveUserActivitiesTest, TheCurrentActivityIsAFileThatGoesWhenItResigns) 
   again->resignCurrent();
   stop();
   EXPECT_FALSE(exists(own));
+}
+
+TEST_F(DriveUserActivitiesTest, WhatIsCurrentIsNotToldToTheDevicesOfAnotherAccount) {
+  start();
+  const auto activity = publish("vlo1:7:a");
+  stop();
+  start();
+  const auto again = publish("vlo1:7:a");
+  layout.setMirror("accounts/0b");
+  activities->accountChanged();
+  const auto later = publish("vlo1:8:b");
+  stop();
+  EXPECT_FALSE(exists(own));
+  EXPECT_NE(read(data + "/accounts/0b/.vaelo/activities/own.ini").find("vlo1:8:b"), std::string::npos);
 }
 
 TEST_F(DriveUserActivitiesTest, OneReplacesTheOtherAndThenOnlyItsOwnResignationCounts) {

@@ -111,6 +111,19 @@ class PresenterWatchingTest : public drive_test::DriveTest {
   std::unique_ptr<WaitingPresenter> presenter;
 };
 
+TEST_F(PresenterWatchingTest, TagsAreAChangeAndOtherAttributesAreNot) {
+  show(document);
+  setAttribute(document, "user.vaelo.docid", "7");
+  std::filesystem::permissions(document, std::filesystem::perms::owner_read);
+  untilLookedAt();
+  EXPECT_EQ(presenter->told(), Told());
+  setAttribute(document, "user.xdg.tags", "Red");
+  EXPECT_TRUE(presenter->hears("changed"));
+  presenter->forget();
+  removeAttribute(document, "user.xdg.tags");
+  EXPECT_TRUE(presenter->hears("changed"));
+}
+
 TEST_F(PresenterWatchingTest, AChangeIsAChange) {
   show(document);
   write(document, "after, and longer");

@@ -1,0 +1,89 @@
+# SPDX-License-Identifier: GPL-3.0-or-later
+"""Tags from the item's menu, as other programs read and write them; thumbnails that the desktop's thumbnailers make."""
+import os
+import subprocess
+import unittest
+
+from harness import App, wait_for
+
+PICTURE = """
+import gi, sys
+gi.require_version("GdkPixbuf", "2.0")
+from gi.repository import GdkPixbuf
+picture = GdkPixbuf.Pixbuf.new(GdkPixbuf.Colorspace.RGB, False, 8, 400, 200)
+picture.fill(0x3366ccff)
+picture.savev(sys.argv[1], "png", [], [])
+"""
+
+
+class Tags(unittest.TestCase):
+    def setUp(self):
+        def prepare(app):
+            app.drive.mkdir(parents=True)
+            (app.data / "account.ini").write_text("[Account]\nName=x\nToken=ab\nSignedIn=true\n")
+            (app.drive / "Report.txt").write_text("words")
+            os.setxattr(app.drive / "Report.txt", "user.xdg.tags", b"Work,Own")
+            subprocess.run(["/usr/bin/python3", "-c", PICTURE, str(app.drive / "Photo.png")], check=True)
+            values = app.data / "mirror" / ".vaelo" / "values"
+            values.parent.mkdir()
+            values.write_text("{'RoverTagDict': <{'RoverTagDictVersion': <uint64 2>, 'RoverTags': "
+                              "<[{'n': <'Red'>, 'l': <uint64 6>}, {'n': <'Work'>, 'l': <uint64 4>}]>}>}")
+        self.app = App(prepare=prepare)
+        self.addCleanup(self.app.close)
+        self.app.wait("Report.txt", "list item")
+        self.values = self.app.data / "mirror" / ".vaelo" / "values"
+
+    def open_tags(self):
+        self.app.click("Report.txt", "list item", button=3)
+        self.app.wait("Tags…", "menu item")
+        self.app.key("t")
+        self.app.wait("New tag")
+
+    def tags(self):
+        try:
+            return os.getxattr(self.app.drive / "Report.txt", "user.xdg.tags").decode()
+        except OSError:
+            return ""
+
+    def test_known_tags_are_put_on_and_taken_off(self):
+        self.open_tags()
+        self.assertEqual([row[1] for row in self.app.accessibility.showing() if row[0] == "check box"],
+                         ["Work", "Own", "Red"])
+        self.app.key("space")  # the first is in focus
+        wait_for("Work to be off", lambda: self.tags() == "Own")
+        self.app.key("Tab", "Tab", "space")
+        wait_for("Red to be on", lambda: self.tags() == "Own,Red")
+
+    def test_a_new_tag_is_the_users_from_then_on(self):
+        app = self.app
+        self.open_tags()
+        app.key("Tab", "Tab", "Tab")
+        app.type("To do, now")
+        app.key("Return")
+        app.wait("A tag’s name is text without commas")
+        self.assertEqual(self.tags(), "Work,Own")
+        app.key("ctrl+a")
+        app.type("To do")
+        app.key("Return")
+        wait_for("the new tag", lambda: self.tags() == "Work,Own,To do")
+        app.wait("To do", "check box")
+        self.assertIn("'To do'", self.values.read_text())
+        self.assertIn("'Red'", self.values.read_text())
+
+    def test_what_another_program_adds_is_offered(self):
+        new = self.values.with_suffix(".new")
+        new.write_text("{'RoverTagDict': <{'RoverTagDictVersion': <uint64 2>, 'RoverTags': <[{'n': <'Garden'>, 'l': <uint64 2>}]>}>}")
+        new.rename(self.values)
+        os.setxattr(self.app.drive / "Report.txt", "user.xdg.tags", b"Own")
+        self.open_tags()
+        self.app.wait("Garden", "check box")
+        self.assertIsNone(self.app.find("Red", "check box"))
+
+    def test_a_missing_thumbnail_is_made(self):
+        cache = self.app.base / "cache" / "thumbnails" / "normal"
+        wait_for("the thumbnail", lambda: cache.is_dir() and list(cache.glob("*.png")))
+        self.assertFalse(list((self.app.base / "cache" / "thumbnails").glob("fail/*/*.png")))
+
+
+if __name__ == "__main__":
+    unittest.main()
