@@ -16,9 +16,10 @@ namespace {
 
 constexpr const char* MirrorKey = "vaelo-framed-view";
 constexpr int LeastWidth = 40;
+constexpr double TouchSide = 44;  // a finger needs more than a line of small text
 // A model's button is its title with a little room around it; a theme's is higher than a toolbar's line may be.
 constexpr const char* ButtonStyle =
-    "button.vaelo-framed { min-height: 0; min-width: 0; padding: 5px 6px; border-radius: 9px; }";
+    "button.vaelo-framed { min-height: 0; min-width: 0; padding: 5px 6px; border-radius: 9px; font-weight: normal; }";
 
 void addStyle() {
   static bool added = false;
@@ -45,6 +46,13 @@ class FramedView : public ViewObserver {
   FramedView(ViewRef view, GtkWidget* box) : view_(std::move(view)), box_(box) {
     view_->setObserver(this);
     for (const ViewRef& part : view_->subviews()) add(part);
+    // The buttons themselves come first; what is left are the presses beside them.
+    GtkGesture* beside = gtk_gesture_click_new();
+    g_signal_connect(beside, "released", G_CALLBACK(+[](GtkGesture*, int, double x, double y, FramedView* self) {
+                       self->pressBeside({x, y});
+                     }),
+                     this);
+    gtk_widget_add_controller(box_, GTK_EVENT_CONTROLLER(beside));
   }
   ~FramedView() override {
     if (view_->observer() == this) view_->setObserver(nullptr);
@@ -86,6 +94,16 @@ class FramedView : public ViewObserver {
     GtkWidget* widget;
     GtkWidget* text;
   };
+
+  void pressBeside(const Point& at) const {
+    for (const Part& part : parts_) {
+      const auto button = std::dynamic_pointer_cast<Button>(part.view);
+      const Rect& frame = part.view->frame();
+      const Rect around =
+          frame.insetBy(std::min(0.0, (frame.width - TouchSide) / 2), std::min(0.0, frame.height - TouchSide));
+      if (button && !button->hidden() && around.contains(at)) return button->sendActions(ControlEvent::TouchUpInside);
+    }
+  }
 
   void add(const ViewRef& view) {
     Part part{view, nullptr, nullptr};

@@ -45,7 +45,8 @@ GtkJustification justificationOf(TextAlignment alignment) {
 
 PangoAttrList* attributesOf(const Font& font) {
   PangoAttrList* attributes = pango_attr_list_new();
-  pango_attr_list_insert(attributes, pango_attr_size_new_absolute(static_cast<int>(font.pointSize * PANGO_SCALE)));
+  pango_attr_list_insert(attributes,
+                         pango_attr_size_new_absolute(static_cast<int>(font.pointSize * textScale() * PANGO_SCALE)));
   // The family that text is measured in.
   pango_attr_list_insert(attributes, pango_attr_family_new(PangoGraphics::FontFamilies));
   return attributes;

@@ -18,7 +18,7 @@ PangoContext* context() {
 GRef<PangoLayout> layoutOf(const std::string& text, const Font& font) {
   GRef<PangoLayout> layout(pango_layout_new(context()));
   PangoFontDescription* description = pango_font_description_from_string(PangoGraphics::FontFamilies);
-  pango_font_description_set_absolute_size(description, font.pointSize * PANGO_SCALE);
+  pango_font_description_set_absolute_size(description, font.pointSize * textScale() * PANGO_SCALE);
   pango_layout_set_font_description(layout.get(), description);
   pango_font_description_free(description);
   pango_layout_set_text(layout.get(), text.c_str(), static_cast<int>(text.size()));
@@ -90,6 +90,14 @@ class CairoContext : public DrawingContext {
 };
 
 }  // namespace
+
+double textScale() {
+  constexpr double usual = 96 * 1024;
+  GtkSettings* settings = gtk_settings_get_default();
+  int resolution = -1;
+  if (settings) g_object_get(settings, "gtk-xft-dpi", &resolution, nullptr);
+  return resolution > 0 ? resolution / usual : 1;
+}
 
 FontMetrics PangoGraphics::fontMetrics(const Font& font) {
   const GRef<PangoLayout> layout = layoutOf("X", font);

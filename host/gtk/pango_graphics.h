@@ -18,6 +18,9 @@ class PangoGraphics : public Graphics {
                         IconFormat format) override;
 };
 
+/// How much larger than usual the user wants text.
+double textScale();
+
 /// An image as the toolkit holds it.
 class GtkImageData : public Image {
  public:

@@ -38,7 +38,7 @@ class UpgradeScreen : public ViewController, public HostDialog {
     gtk_window_set_transient_for(GTK_WINDOW(window), over);
     gtk_window_set_modal(GTK_WINDOW(window), TRUE);
     gtk_window_set_title(GTK_WINDOW(window), _("Upgrade Storage"));
-    gtk_window_set_default_size(GTK_WINDOW(window), 360, 480);
+    gtk_window_set_default_size(GTK_WINDOW(window), 360, 520);
     GtkWidget* box = gtk_box_new(GTK_ORIENTATION_VERTICAL, 0);
     gtk_box_append(GTK_BOX(box), adw_header_bar_new());
     gtk_box_append(GTK_BOX(box), makePage());
@@ -61,6 +61,7 @@ class UpgradeScreen : public ViewController, public HostDialog {
     const StorageFigures& figures = offer_->figures();
     GtkWidget* page = adw_status_page_new();
     gtk_widget_set_vexpand(page, TRUE);
+    gtk_widget_add_css_class(page, "compact");
     adw_status_page_set_icon_name(ADW_STATUS_PAGE(page), "drive-harddisk-symbolic");
     adw_status_page_set_title(ADW_STATUS_PAGE(page),
                               figures.free == 0 ? _("Your storage is full") : _("Your storage is almost full"));

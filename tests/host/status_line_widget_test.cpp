@@ -5,7 +5,9 @@
 #include "app/drive_status_label_view.h"
 #include "host/drive/account_offers.h"
 #include "host/gtk/framed_view.h"
+#include "host/gtk/mirrored_text.h"
 #include "host/gtk/offer_button.h"
+#include "host/gtk/pango_graphics.h"
 #include "tests/support/memory_platform.h"
 
 namespace vaelo {
@@ -79,6 +81,22 @@ TEST_F(StatusLineWidgetTest, TheButtonComesUnderTheLineAndIsPressed) {
   EXPECT_EQ(presses, 1);
   view->showLowQuota(false);
   EXPECT_FALSE(gtk_widget_get_visible(press()));
+}
+
+TEST_F(StatusLineWidgetTest, TextIsAsLargeAsTheUserWants) {
+  PangoGraphics graphics;
+  const Font font = Font::preferred(TextStyle::Caption2);
+  const Size usual = graphics.measure("12 items, 4 GB available", font, 0, 1);
+  g_object_set(gtk_settings_get_default(), "gtk-xft-dpi", 2 * 96 * 1024, nullptr);
+  const Size large = graphics.measure("12 items, 4 GB available", font, 0, 1);
+  PangoAttrList* attributes = attributesOf(font);
+  const auto shown = reinterpret_cast<PangoAttrInt*>(
+      pango_attr_iterator_get(pango_attr_list_get_iterator(attributes), PANGO_ATTR_ABSOLUTE_SIZE));
+  EXPECT_EQ(shown->value, 22 * PANGO_SCALE);
+  pango_attr_list_unref(attributes);
+  g_object_set(gtk_settings_get_default(), "gtk-xft-dpi", 96 * 1024, nullptr);
+  EXPECT_NEAR(large.width, 2 * usual.width, 4);
+  EXPECT_NEAR(large.height, 2 * usual.height, 2);
 }
 
 TEST_F(StatusLineWidgetTest, NothingIsLaidOutAgainWhenNothingChanged) {
