@@ -23,8 +23,7 @@ class PreviewOfficeTest : public preview_test::PreviewViewTest {
     PreviewViewTest::SetUp();
     path_ = std::getenv("PATH");
     bin_ = pathOf("bin");
-    tmp_ = pathOf("tmp");
-    for (const std::string& folder : {bin_, tmp_}) std::filesystem::create_directory(folder);
+    std::filesystem::create_directory(bin_);
     for (const char* program : {"cp", "mkdir", "bash", "tail"}) {
       std::filesystem::create_symlink("/bin/" + std::string(program), bin_ + "/" + program);
     }
@@ -76,7 +75,6 @@ class PreviewOfficeTest : public preview_test::PreviewViewTest {
 
   std::string path_;
   std::string bin_;
-  std::string tmp_;
 };
 
 TEST_F(PreviewOfficeTest, WithoutASuiteThereIsNoView) {

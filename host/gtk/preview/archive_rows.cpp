@@ -1,7 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/preview/archive_rows.h"
 
-#include <string>
+#include <algorithm>
 
 #include "host/support/glib_ptr.h"
 #include "platform/platform.h"
@@ -161,7 +161,36 @@ void unbind(GtkSignalListItemFactory*, GtkListItem* item, gpointer) {
   gtk_tree_expander_set_list_row(GTK_TREE_EXPANDER(widgetsOf(item).expander), nullptr);
 }
 
+constexpr guint MostRemembered = 2000;  // rows, each of which is made for it
+
+GRef<GtkTreeListRow> rowAt(GtkTreeListModel* rows, guint place) {
+  return GRef<GtkTreeListRow>(gtk_tree_list_model_get_row(rows, place));
+}
+
+std::string pathOf(GtkTreeListRow* row) {
+  const GRef<GtkTreeListRow> above(gtk_tree_list_row_get_parent(row));
+  const GRef<GObject> object(G_OBJECT(gtk_tree_list_row_get_item(row)));
+  return (above ? pathOf(above.get()) : "") + "/" + entryOf(object.get()).name;
+}
+
 }  // namespace
+
+std::set<std::string> openArchiveFolders(GtkTreeListModel* rows) {
+  std::set<std::string> paths;
+  const guint count = std::min(g_list_model_get_n_items(G_LIST_MODEL(rows)), MostRemembered);
+  for (guint place = 0; place < count; ++place) {
+    const GRef<GtkTreeListRow> row = rowAt(rows, place);
+    if (gtk_tree_list_row_get_expanded(row.get())) paths.insert(pathOf(row.get()));
+  }
+  return paths;
+}
+
+void openArchiveFolders(GtkTreeListModel* rows, const std::set<std::string>& paths) {
+  for (guint place = 0; place < std::min(g_list_model_get_n_items(G_LIST_MODEL(rows)), MostRemembered); ++place) {
+    const GRef<GtkTreeListRow> row = rowAt(rows, place);
+    if (paths.contains(pathOf(row.get()))) gtk_tree_list_row_set_expanded(row.get(), TRUE);
+  }
+}
 
 GtkTreeListModel* makeArchiveRows(std::shared_ptr<const ArchiveListing> listing) {
   GListModel* top = rowsIn(listing, 0);

@@ -153,21 +153,39 @@ class ArchiveView : public DocumentView {
 
  private:
   void show(std::shared_ptr<const ArchiveListing> listing, ArchiveLoad::End end) {
-    GtkTreeListModel* rows = makeArchiveRows(listing);
-    // A folder that holds all the rest is no news.
-    if (listing->files() + listing->folders() <= FewRows) {
-      for (guint row = 0; row < g_list_model_get_n_items(G_LIST_MODEL(rows)); ++row) expand(rows, row);
+    const GRef<GtkTreeListModel> rows(makeArchiveRows(listing));
+    if (rows_) {
+      openArchiveFolders(rows.get(), openArchiveFolders(rows_.get()));
+    } else if (listing->files() + listing->folders() <= FewRows) {
+      for (guint row = 0; row < g_list_model_get_n_items(G_LIST_MODEL(rows.get())); ++row) expand(rows.get(), row);
     } else if (listing->entry(0).inside.size() == 1) {
-      expand(rows, 0);
+      // A folder that holds all the rest is no news.
+      expand(rows.get(), 0);
     }
-    const GRef<GtkNoSelection> selection(gtk_no_selection_new(G_LIST_MODEL(rows)));
-    gtk_list_view_set_model(GTK_LIST_VIEW(list_), GTK_SELECTION_MODEL(selection.get()));
+    showRows(rows.get());
     const bool isEmpty = listing->entry(0).inside.empty();
     gtk_stack_set_visible_child_name(GTK_STACK(stack_), isEmpty ? "empty" : "list");
     std::string note = isEmpty ? "" : totalOf(*listing) + remarkFor(end);
     if (listing->hasLocked()) note += " The content is protected by a password.";
     setPreviewNote(note_, note);
     events_.shown();
+  }
+
+  // An archive that was read anew is shown where it was: what stood first in the window does again.
+  void showRows(GtkTreeListModel* rows) {
+    const guint first = firstVisibleRow();
+    const GRef<GtkNoSelection> selection(gtk_no_selection_new(G_LIST_MODEL(g_object_ref(rows))));
+    gtk_list_view_set_model(GTK_LIST_VIEW(list_), GTK_SELECTION_MODEL(selection.get()));
+    const guint count = g_list_model_get_n_items(G_LIST_MODEL(rows));
+    if (rows_ && count > 0) gtk_widget_activate_action(list_, "list.scroll-to-item", "u", std::min(first, count - 1));
+    rows_.reset(GTK_TREE_LIST_MODEL(g_object_ref(rows)));
+  }
+
+  guint firstVisibleRow() const {
+    GtkAdjustment* place = gtk_scrollable_get_vadjustment(GTK_SCROLLABLE(list_));
+    const guint count = rows_ ? g_list_model_get_n_items(G_LIST_MODEL(rows_.get())) : 0;
+    const double height = gtk_adjustment_get_upper(place);
+    return height > 0 ? static_cast<guint>(gtk_adjustment_get_value(place) / height * count) : 0;
   }
 
   static void expand(GtkTreeListModel* rows, guint place) {
@@ -181,6 +199,7 @@ class ArchiveView : public DocumentView {
   GtkWidget* stack_;
   GtkWidget* list_;
   GtkWidget* note_;
+  GRef<GtkTreeListModel> rows_;  // that are shown
   std::unique_ptr<ArchiveLoad> load_;
 };
 

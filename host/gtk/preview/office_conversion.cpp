@@ -9,7 +9,6 @@
 #include <csignal>
 #include <cstdlib>
 #include <filesystem>
-#include <thread>
 #include <utility>
 
 #include "host/support/glib_ptr.h"
@@ -55,18 +54,16 @@ struct OfficeConversion::State {
   pid_t group = 0;                         // zero when the process has ended
   OfficeConversion* conversion = nullptr;  // null when it is gone, or has its result
 
+  // Where there is a folder for this session, what a crash leaves behind goes with the session.
   State() {
-    std::string pattern = takeString(g_build_filename(g_get_tmp_dir(), "vaelo-office-XXXXXX", nullptr));
+    const char* runtime = g_getenv("XDG_RUNTIME_DIR");
+    std::string pattern = std::string(runtime ? runtime : g_get_tmp_dir()) + "/vaelo-office-XXXXXX";
     if (::mkdtemp(pattern.data())) folder = pattern;
   }
 
-  // A profile is hundreds of files.
   ~State() {
-    if (folder.empty()) return;
-    std::thread([gone = std::move(folder)] {
-      std::error_code ignored;
-      fs::remove_all(gone, ignored);
-    }).detach();
+    std::error_code ignored;
+    if (!folder.empty()) fs::remove_all(folder, ignored);
   }
 
   State(const State&) = delete;
