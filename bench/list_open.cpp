@@ -87,6 +87,8 @@ void activate(GtkApplication* application) {
                         .selectionChanged = nullptr,
                         .folderRemoved = [] { std::printf("removed\n"); },
                         .readFailed = [](int error) { std::printf("failed %s\n", std::strerror(error)); },
+                        .refreshWanted = nullptr,
+                        .commanded = nullptr,
                         .contextRequested = nullptr});
   run->view->setEditing(run->edit);
   run->view->setFolder(run->folder);

@@ -75,6 +75,9 @@ void FolderListScreen::build() {
   events.contextRequested = [this](const std::string& name, GtkWidget* over, const GdkRectangle& at) {
     offerActions(urlOf(name), over, at);
   };
+  events.commanded = [this](ListCommand command, const std::string& name, GtkWidget* over, const GdkRectangle& at) {
+    commanded(command, urlOf(name), over, at);
+  };
   events.refreshWanted = [this] { refresh(); };
   view_->setEvents(std::move(events));
   editingToken_ =
@@ -91,18 +94,41 @@ void FolderListScreen::followEditing(DocumentListChange change) {
 void FolderListScreen::offerActions(const URL& url, GtkWidget* over, const GdkRectangle& at) {
   if (editing()) return;
   showItemActionsMenu(over, at, availableActions(), [self = sharedSelf(this), url, over, at](int action) {
-    // What the action shows points at where the menu was.
-    graphene_point_t place;
-    const graphene_point_t corner = {static_cast<float>(at.x), static_cast<float>(at.y)};
-    GtkWidget* window = GTK_WIDGET(gtk_widget_get_root(over));
-    if (!window || !gtk_widget_compute_point(over, window, &corner, &place)) return;
     if (action == TagsEntry) return showTagsPopover(over, at, url, self->tags_);
-    self->anchor_ = std::make_shared<View>(Rect{static_cast<double>(place.x), static_cast<double>(place.y),
-                                                static_cast<double>(at.width), static_cast<double>(at.height)});
     // What is opened is what a peek has prepared; what can't be peeked at, as a link, is opened as by a tap.
     if (action == ItemAction::FirmpressPop && !self->viewControllerForPreviewing(url)) return self->userSelectedItem(url);
-    self->userChoseAction(action, url, self->anchor_, [] {});
+    self->perform(action, url, over, at);
   });
+}
+
+void FolderListScreen::perform(int action, const URL& url, GtkWidget* over, const GdkRectangle& at) {
+  // What the action shows points at the item, or at where its menu was.
+  graphene_point_t place;
+  const graphene_point_t corner = {static_cast<float>(at.x), static_cast<float>(at.y)};
+  GtkWidget* window = GTK_WIDGET(gtk_widget_get_root(over));
+  if (!window || !gtk_widget_compute_point(over, window, &corner, &place)) return;
+  anchor_ = std::make_shared<View>(Rect{static_cast<double>(place.x), static_cast<double>(place.y),
+                                        static_cast<double>(at.width), static_cast<double>(at.height)});
+  userChoseAction(action, url, anchor_, [] {});
+}
+
+void FolderListScreen::commanded(ListCommand command, const URL& url, GtkWidget* over, const GdkRectangle& at) {
+  if (editing()) {
+    // The toolbar's buttons act on what is selected: new folder, move and delete, with spaces between.
+    constexpr std::size_t moveButton = 2;
+    constexpr std::size_t deleteButton = 4;
+    const std::size_t wanted = command == ListCommand::Delete ? deleteButton : moveButton;
+    const bool known = command == ListCommand::Delete || command == ListCommand::Move;
+    if (!known || toolbarItems().size() <= wanted) return;
+    const BarButtonItemRef button = toolbarItems()[wanted];
+    if (button->enabled()) button->press();
+    return;
+  }
+  const int action = command == ListCommand::Rename    ? ItemAction::Rename
+                     : command == ListCommand::Delete  ? ItemAction::Delete
+                     : command == ListCommand::Details ? ItemAction::Info
+                                                       : ItemAction::Move;
+  if (availableActions() & 1U << action) perform(action, url, over, at);
 }
 
 void FolderListScreen::fill() { view_->setFolder(presentedURL()->path()); }
@@ -212,6 +238,9 @@ void FolderListScreen::showSearch(const std::shared_ptr<SearchController>& searc
     events.activated = [this](const std::string& path) { activated(*results_, path, URL(path)); };
     events.contextRequested = [this](const std::string& path, GtkWidget* over, const GdkRectangle& at) {
       offerActions(URL(path), over, at);
+    };
+    events.commanded = [this](ListCommand command, const std::string& path, GtkWidget* over, const GdkRectangle& at) {
+      commanded(command, URL(path), over, at);
     };
     results_->setEvents(std::move(events));
     g_signal_connect_swapped(searchEntry_, "search-changed", G_CALLBACK(+[](FolderListScreen* self) { self->queryTyped(); }),

@@ -50,6 +50,8 @@ class FolderListScreen : public DocumentListController, public HostScreen {
   /// The row `name` of `view`, which stands for `url`.
   void activated(FolderView& view, const std::string& name, const URL& url);
   void offerActions(const URL& url, GtkWidget* over, const GdkRectangle& at);
+  void perform(int action, const URL& url, GtkWidget* over, const GdkRectangle& at);
+  void commanded(ListCommand command, const URL& url, GtkWidget* over, const GdkRectangle& at);
   /// Keeps check marks and selection in step with the model.
   void followEditing(DocumentListChange change);
   void queryTyped();

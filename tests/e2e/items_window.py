@@ -57,6 +57,17 @@ class ItemsWindow(unittest.TestCase):
         for item in items:
             self.app.click(item, "list item")
 
+    def click_message(self, name):
+        """A message's button, when it has slid to its place."""
+        before = [None]
+
+        def rests():
+            row = self.app.find(name, "push button")
+            before[0], same = row, row is not None and row == before[0]
+            return same
+        wait_for(f"“{name}” to rest", rests)
+        self.app.click(name, "push button")
+
     def answer(self, *keys):
         """Answers the sheet that shows by keyboard, which begins at Cancel, the last answer."""
         wait_for("the sheet's answers", lambda: self.app.find("Cancel", "push button"))

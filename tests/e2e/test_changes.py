@@ -49,7 +49,7 @@ class Names(ItemsWindow):
         self.rename("Report.txt", "Summary.txt")
         self.on_disk("Summary.txt")
         self.app.wait("Renamed to “Summary.txt”")
-        self.app.click("Undo", "push button")
+        self.click_message("Undo")
         self.on_disk("Report.txt")
         self.on_disk("Summary.txt", False)
         self.app.wait("Report.txt", "list item")
@@ -58,7 +58,7 @@ class Names(ItemsWindow):
         self.rename("Report.txt", "Summary.txt")
         self.on_disk("Summary.txt")
         (self.drive / "Report.txt").write_text("another")
-        self.app.click("Undo", "push button")
+        self.click_message("Undo")
         self.app.wait("An item named “Report.txt” already exists.")
         self.assertEqual((self.drive / "Report.txt").read_text(), "another")
         self.assertEqual((self.drive / "Summary.txt").read_text(), "Report.txt")
@@ -82,7 +82,7 @@ class Moves(ItemsWindow):
         self.press("Move")
         self.on_disk("Plans/Third.txt")
         app.wait("Moved 2 items")
-        app.click("Undo", "push button")
+        self.click_message("Undo")
         self.on_disk("Third.txt")
         wait_for("everything to be as it was", lambda: content(self.drive) == before)
 
@@ -125,6 +125,72 @@ class MovesIntoANewFolder(ItemsWindow):
         app.key("Escape")
         app.wait_gone("Enter a name for this folder.")
         self.on_disk("Third.txt")
+
+
+class Keys(ItemsWindow):
+    """The row under the keyboard's focus, which letters find."""
+
+    def focus(self, item):
+        """A press would open it; the keyboard comes to the list after the buttons above it."""
+        self.app.key(*["Tab"] * 7)
+        self.app.type(item[:3].lower())
+
+    def test_f2_renames(self):
+        app = self.app
+        self.focus("Report.txt")
+        app.key("F2")
+        app.wait("Enter a new name for this item.")
+        app.key("ctrl+a")
+        app.type("Summary")
+        app.key("Return")
+        self.on_disk("Summary.txt")
+
+    def test_delete_asks_and_deletes(self):
+        app = self.app
+        self.focus("Third.txt")
+        app.key("Delete")
+        app.wait("\"Third.txt\" will be permanently deleted")
+        self.delete_for_good()
+        self.on_disk("Third.txt", False)
+        self.on_disk("Second.txt")
+
+    def test_alt_return_shows_the_details(self):
+        self.focus("Report.txt")
+        self.app.key("alt+Return")
+        self.app.wait("plain text document")
+
+    def test_control_m_moves_one_or_what_is_selected(self):
+        app = self.app
+        self.focus("Report.txt")
+        app.key("ctrl+m")
+        app.wait("The item is in this folder already.")
+        app.key("Escape")
+        app.wait_gone("The item is in this folder already.")
+        self.choose("Second.txt", "Third.txt")
+        app.key("ctrl+m")
+        app.wait("The items are in this folder already.")
+
+    def test_while_selecting_delete_means_what_is_selected(self):
+        app = self.app
+        self.choose("Second.txt", "Third.txt")
+        app.wait_title("2 Items Selected")
+        app.key("Delete")
+        app.wait("2 items will be permanently deleted")
+        self.delete_for_good()
+        self.on_disk("Third.txt", False)
+        self.on_disk("Report.txt")
+
+    def test_a_drag_selects_what_it_passes(self):
+        app = self.app
+        app.click("Select", "push button")
+        app.wait_title("Select Items")
+        x, y = app.place(app.wait("Third.txt", "list item"))
+        _, to_y = app.place(app.wait("Report.txt", "list item"))
+        app.mouse("mousemove", "--sync", str(x + 60), str(y + 80), "mousedown", "1")
+        for step in range(1, 9):
+            app.mouse("mousemove", "--sync", str(x + 60 - 10 * step), str(y + 80 + (to_y - y - 80) * step // 8))
+        app.mouse("mouseup", "1")
+        app.wait_title("3 Items Selected")
 
 
 if __name__ == "__main__":

@@ -87,7 +87,7 @@ class Deletions(ItemsWindow):
         self.delete_for_good()
         self.on_disk("Plans", False)
         app.wait("Deleting “Plans” and its 1500 items…")
-        app.click("Cancel", "push button")
+        self.click_message("Cancel")
         app.wait("“Plans” is back, with everything in it.")
         self.assertEqual(content(self.drive), before)
         app.wait("Plans", "list item")

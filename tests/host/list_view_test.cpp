@@ -25,6 +25,7 @@ class FolderViewTest : public testing::Test {
                       .folderRemoved = [this] { removed_ = true; },
                       .readFailed = [this](int error) { error_ = error; },
                       .refreshWanted = nullptr,
+                      .commanded = nullptr,
                       .contextRequested = nullptr});
     window_ = gtk_window_new();
     gtk_window_set_default_size(GTK_WINDOW(window_), 400, 500);

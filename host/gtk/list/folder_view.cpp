@@ -135,6 +135,7 @@ void FolderView::makeList() {
   }
   g_signal_connect_swapped(list_, "activate", G_CALLBACK(+press), this);
   context_.list = list_;
+  setRubberband();
   gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scroller_), list_);
 }
 
@@ -159,8 +160,17 @@ void FolderView::setEditing(bool editing) {
   context_.editing = editing;
   lastPressed_.clear();
   model_.setSelectable(editing);
+  setRubberband();
   if (!editing) setSelection({});
   redrawRows();
+}
+
+void FolderView::setRubberband() {
+  if (context_.grid) {
+    gtk_grid_view_set_enable_rubberband(GTK_GRID_VIEW(list_), context_.editing);
+  } else {
+    gtk_list_view_set_enable_rubberband(GTK_LIST_VIEW(list_), context_.editing);
+  }
 }
 
 void FolderView::setSelection(const std::vector<std::string>& names) {
@@ -206,8 +216,15 @@ void FolderView::setEntries(std::vector<FolderEntry> entries) {
   details_.setFolder({});
   errorNumber_ = 0;
   loaded_ = true;
+  // All rows are made anew, and the keyboard would be left without one.
+  const FolderItem* focused = focusedItem();
+  const std::optional<std::string> focusedName = focused ? std::optional(std::string(focused->name)) : std::nullopt;
   model_.setEntries(std::move(entries));
   showPage();
+  if (focusedName) {
+    focusRevealed_ = scrollTo(*focusedName);
+    if (!focusRevealed_) grabFocus();
+  }
   if (events_.itemsChanged) events_.itemsChanged();
 }
 
@@ -373,12 +390,13 @@ bool FolderView::scrollTo(const std::string& name) {
 
 void FolderView::finishReveal() {
   FolderItem* item = model_.liveItem(std::exchange(revealed_, {}));
+  const bool focuses = std::exchange(focusRevealed_, false);
   graphene_rect_t bounds;
   if (!item || !item->row || !gtk_widget_compute_bounds(gtk_widget_get_parent(item->row), list_, &bounds)) return;
   const double top = static_cast<double>(bounds.origin.y);
   const double bottom = top + static_cast<double>(bounds.size.height) - gtk_widget_get_height(list_);
   if (top < 0 || bottom > 0) setScrollPosition(scrollPosition() + (top < 0 ? top : bottom));
-  if (std::exchange(focusRevealed_, false)) gtk_widget_grab_focus(gtk_widget_get_parent(item->row));
+  if (focuses) gtk_widget_grab_focus(gtk_widget_get_parent(item->row));
 }
 
 double FolderView::scrollPosition() const { return gtk_adjustment_get_value(adjustment()); }

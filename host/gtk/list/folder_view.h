@@ -19,6 +19,9 @@
 
 namespace vaelo {
 
+/// What a key means for a row, or for the selected ones while editing.
+enum class ListCommand { Rename, Delete, Details, Move };
+
 /// What a FolderView tells its owner. All on the main thread; unset ones are not called. Names are bytes as they stand in
 /// the folder (for promises the item's name), or the paths of supplied entries.
 struct FolderViewEvents {
@@ -34,6 +37,8 @@ struct FolderViewEvents {
   std::function<void(int errorNumber)> readFailed;
   /// The user wants supplied entries to be looked up again.
   std::function<void()> refreshWanted;
+  /// F2, Delete, Alt+Return or Control+M on a row, at a place in `view`'s coordinates; while editing, `name` may be empty.
+  std::function<void(ListCommand command, const std::string& name, GtkWidget* view, const GdkRectangle& at)> commanded;
   /// A secondary click, a long press or the menu key on a row, at a place in `view`'s coordinates.
   std::function<void(const std::string& name, GtkWidget* view, const GdkRectangle& at)> contextRequested;
 };
@@ -100,6 +105,8 @@ class FolderView {
   void connectKeys();
   void connectContextGestures();
   void showPage();
+  /// While editing, a pointer that is dragged over rows selects them.
+  void setRubberband();
   void follow();
   void read();
   void folderRead(std::shared_ptr<const FolderSnapshot> next, const std::vector<Splice>& splices, int errorNumber);
@@ -109,6 +116,9 @@ class FolderView {
   bool keyPressed(guint key, GdkModifierType modifiers);
   void requestContext(double x, double y);
   void requestContextAtFocus();
+  bool command(guint key, GdkModifierType modifiers);
+  /// Where the row stands in the scroller, if it shows.
+  std::optional<GdkRectangle> placeOf(const FolderItem& item) const;
   void detailsAreOld(FolderItem& item);
   void allDetailsAreOld();
   void redrawRows();

@@ -51,6 +51,7 @@ bool FolderView::keyPressed(guint key, GdkModifierType modifiers) {
     requestContextAtFocus();
     return true;
   }
+  if (command(key, modifiers)) return true;
   const gint64 now = g_get_monotonic_time();
   FolderItem* focused = focusedItem();
   const std::size_t last = model_.itemCount() - 1;
@@ -107,13 +108,35 @@ void FolderView::requestContext(double x, double y) {
   events_.contextRequested(std::string(item->name), scroller_, at);
 }
 
+std::optional<GdkRectangle> FolderView::placeOf(const FolderItem& item) const {
+  graphene_rect_t bounds;
+  if (!item.row || !gtk_widget_compute_bounds(item.row, scroller_, &bounds)) return std::nullopt;
+  return GdkRectangle{static_cast<int>(bounds.origin.x), static_cast<int>(bounds.origin.y),
+                      static_cast<int>(bounds.size.width), static_cast<int>(bounds.size.height)};
+}
+
 void FolderView::requestContextAtFocus() {
   FolderItem* item = focusedItem();
-  graphene_rect_t bounds;
-  if (!item || !events_.contextRequested || !gtk_widget_compute_bounds(item->row, scroller_, &bounds)) return;
-  const GdkRectangle at{static_cast<int>(bounds.origin.x), static_cast<int>(bounds.origin.y),
-                        static_cast<int>(bounds.size.width), static_cast<int>(bounds.size.height)};
-  events_.contextRequested(std::string(item->name), scroller_, at);
+  const auto at = item ? placeOf(*item) : std::nullopt;
+  if (at && events_.contextRequested) events_.contextRequested(std::string(item->name), scroller_, *at);
+}
+
+bool FolderView::command(guint key, GdkModifierType modifiers) {
+  const auto held = static_cast<GdkModifierType>(modifiers & gtk_accelerator_get_default_mod_mask());
+  std::optional<ListCommand> command;
+  if (key == GDK_KEY_F2 && !held) command = ListCommand::Rename;
+  if (key == GDK_KEY_Delete && !held) command = ListCommand::Delete;
+  if (key == GDK_KEY_Return && held == GDK_ALT_MASK) command = ListCommand::Details;
+  if (key == GDK_KEY_m && held == GDK_CONTROL_MASK) command = ListCommand::Move;
+  if (!command || !events_.commanded) return false;
+  // Whoever types fast is ahead of the frame in which the row that was found takes the focus, and that must not take it from
+  // what the command shows.
+  if (focusRevealed_) finishReveal();
+  FolderItem* item = focusedItem();
+  const auto at = item ? placeOf(*item) : std::nullopt;
+  if (!at && !context_.editing) return false;
+  events_.commanded(*command, at ? std::string(item->name) : std::string(), scroller_, at.value_or(GdkRectangle()));
+  return true;
 }
 
 }  // namespace vaelo

@@ -53,7 +53,9 @@ std::optional<std::size_t> TypeAhead::type(const FolderModel& model, const std::
   const std::size_t first = from + (again || typed_ == letter ? 1 : 0);
   for (std::size_t step = 0; step < count; ++step) {
     const std::size_t i = (first + step) % count;
-    if (beginsWith(model.nameAt(i), prefix, ascii)) return i;
+    // Entries that somebody supplied are named by their paths, which nobody sees.
+    const std::string_view shown = model.entries() ? (*model.entries())[i].displayName : model.nameAt(i);
+    if (beginsWith(shown, prefix, ascii)) return i;
   }
   return std::nullopt;
 }
