@@ -18,6 +18,8 @@ std::string realLocation(const std::string& path);
 class DriveLayout {
  public:
   static constexpr const char* DefaultContainer = "com~marrow~Kestrel";
+  /// Below the mirror's root: what is deleted already and not yet removed.
+  static constexpr const char* Removing = "/.vaelo/removing";
   /// The mirror of a device's first account.
   static constexpr const char* FirstMirror = "mirror";
 

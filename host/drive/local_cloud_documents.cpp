@@ -64,7 +64,7 @@ LocalCloudDocuments::LocalCloudDocuments(const std::string& dataFolder, LogSink&
     : layout_(dataFolder),
       setUpFailure_(setUp(LocalAccounts(layout_, log), log, accountWasDamaged_)),
       account_(layout_, log, queues, notifications),
-      removals_(layout_.mirrorRoot() + "/.vaelo/removing", log, queues),
+      removals_(layout_.mirrorRoot() + DriveLayout::Removing, log, queues),
       containers_(layout_, log, removals_),
       index_(layout_, log,
              [&queues, &notifications] {

@@ -5,6 +5,8 @@
 
 #include <memory>
 
+#include "host/drive/drive_layout.h"
+
 namespace vaelo {
 
 void walkTree(const std::string& root,
@@ -13,8 +15,13 @@ void walkTree(const std::string& root,
   char* const roots[] = {start.data(), nullptr};
   const std::unique_ptr<FTS, int (*)(FTS*)> walk(::fts_open(roots, FTS_PHYSICAL | FTS_NOCHDIR, nullptr), ::fts_close);
   if (!walk) return;
-  while (const FTSENT* entry = ::fts_read(walk.get())) {
+  const std::string removing = root + DriveLayout::Removing;
+  while (FTSENT* entry = ::fts_read(walk.get())) {
     if (entry->fts_level == FTS_ROOTLEVEL) continue;
+    if (removing == entry->fts_path) {
+      ::fts_set(walk.get(), entry, FTS_SKIP);
+      continue;
+    }
     switch (entry->fts_info) {
       case FTS_D:
       case FTS_F:

@@ -127,6 +127,39 @@ class MovesIntoANewFolder(ItemsWindow):
         self.on_disk("Third.txt")
 
 
+class Selection(ItemsWindow):
+    """What is selected stays so while other programs change the folder."""
+
+    def prepare(self, app):
+        for name in ("b", "d", "f"):
+            (app.drive / "Plans" / name).write_text(name)
+
+    def follow(self, folder, first, second, others):
+        app = self.app
+        self.choose(first, second)
+        app.wait_title("2 Items Selected")
+        for name in others:
+            (folder / name).write_text(name)
+            app.wait(name, "list item")
+        app.wait_title("2 Items Selected")
+        (folder / first).unlink()
+        app.wait_title("1 Item Selected")
+        app.click("Delete", "push button")
+        app.wait(f"\"{second}\" will be permanently deleted")
+        self.delete_for_good()
+        wait_for("it to go", lambda: not (folder / second).exists())
+        self.assertTrue(all((folder / name).exists() for name in others))
+
+    def test_at_the_drives_root(self):
+        self.follow(self.drive, "Report.txt", "Third.txt", ["A first.txt", "Sixth.txt", "Zz last.txt"])
+
+    def test_in_a_folder(self):
+        self.app.click("Plans", "list item")
+        self.app.wait_title("Plans")
+        self.app.wait("f,", "list item")
+        self.follow(self.drive / "Plans", "b", "f", ["a new", "c new", "g new"])
+
+
 class Keys(ItemsWindow):
     """The row under the keyboard's focus, which letters find."""
 

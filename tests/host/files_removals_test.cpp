@@ -8,6 +8,7 @@
 #include <cerrno>
 #include <cstring>
 
+#include "host/drive/mirror_walk.h"
 #include "host/files/glib_queues.h"
 #include "host/files/local_file_manager.h"
 #include "host/files/tree_removals.h"
@@ -147,6 +148,20 @@ TEST_F(FilesRemovalsTest, WhatALivingProcessHoldsIsLeftToIt) {
   start();
   EXPECT_TRUE(waitFor([&] { return !exists(place + "/dead"); }));
   EXPECT_EQ(read(place + "/living/1/sub/2"), "2");
+}
+
+TEST_F(FilesRemovalsTest, WhatIsOnItsWayOutIsNeitherIndexedNorCounted) {
+  start();
+  makeTree(drive + "/Photos", 50);
+  write(drive + "/kept");
+  EXPECT_EQ(removals->remove(drive + "/Photos"), 0);
+  ASSERT_TRUE(waitFor([&] { return told(Stage::Waiting); }));
+  std::vector<std::string> files;
+  walkTree(mirror, [&files](const std::string& path, const struct stat& status) {
+    if (S_ISREG(status.st_mode)) files.push_back(path);
+    return true;
+  });
+  EXPECT_EQ(files, std::vector<std::string>{drive + "/kept"});
 }
 
 TEST_F(FilesRemovalsTest, ALinkAmongTheLeftoversLeadsNobodyAstray) {
