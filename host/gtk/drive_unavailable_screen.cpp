@@ -2,6 +2,7 @@
 #include "host/gtk/drive_unavailable_screen.h"
 
 #include <adwaita.h>
+#include <glib/gi18n.h>
 
 #include "host/support/glib_ptr.h"
 
@@ -27,6 +28,13 @@ DriveUnavailableController::DriveUnavailableController(const std::optional<Error
   adw_status_page_set_title(ADW_STATUS_PAGE(page_), "Vaelo Drive is not available");
   const std::string reason = takeString(g_markup_escape_text(reasonOf(setUpFailure).c_str(), -1));
   adw_status_page_set_description(ADW_STATUS_PAGE(page_), reason.c_str());
+  if (!setUpFailure) {
+    GtkWidget* accounts = gtk_button_new_with_label(_("Accounts…"));
+    gtk_actionable_set_action_name(GTK_ACTIONABLE(accounts), "app.accounts");
+    gtk_widget_add_css_class(accounts, "pill");
+    gtk_widget_set_halign(accounts, GTK_ALIGN_CENTER);
+    adw_status_page_set_child(ADW_STATUS_PAGE(page_), accounts);
+  }
   setTitle("Vaelo Drive");
 }
 

@@ -159,6 +159,7 @@ class TagsPopover {
 
   void fill(const std::vector<std::string>& names) {
     const std::set<std::string> on(names.begin(), names.end());
+    palette_ = FileTags::tagColorsByTag();
     // Those that it has come first: of ten thousand they may not be among the first.
     for (const std::string& name : names) addRow(name, true);
     for (const std::string& name : FileTags::allTags()) {
@@ -170,10 +171,9 @@ class TagsPopover {
 
   void addRow(const std::string& name, bool on) {
     if (checks_.contains(name)) return;
-    const std::map<std::string, Color> colors = FileTags::tagColorsByTag();
-    const auto color = colors.find(name);
+    const auto color = palette_.find(name);
     GtkWidget* text = gtk_label_new(nullptr);
-    const std::string markup = dotOf(color == colors.end() ? FileTags::_tagBlipColors()[0] : color->second) + " " +
+    const std::string markup = dotOf(color == palette_.end() ? FileTags::_tagBlipColors()[0] : color->second) + " " +
                                takeString(g_markup_escape_text(shown(name).c_str(), -1));
     gtk_label_set_markup(GTK_LABEL(text), markup.c_str());
     gtk_label_set_ellipsize(GTK_LABEL(text), PANGO_ELLIPSIZE_END);
@@ -236,6 +236,7 @@ class TagsPopover {
     if (failed) return refuse(name, false, *failed);
     gtk_editable_set_text(GTK_EDITABLE(field_), "");
     FileTags::_tagColorsDidChange();
+    palette_ = FileTags::tagColorsByTag();
     addRow(name, true);
     settling_ = true;
     gtk_check_button_set_active(GTK_CHECK_BUTTON(checks_.at(name)), TRUE);
@@ -249,6 +250,7 @@ class TagsPopover {
   GtkWidget* field_ = nullptr;
   GtkWidget* problem_ = nullptr;
   std::array<GtkWidget*, 8> colors_{};
+  std::map<std::string, Color> palette_;  // of the user's tags; a copy, since there may be thousands
   std::map<std::string, GtkWidget*> checks_;
   bool settling_ = false;
   Worker worker_;

@@ -71,6 +71,9 @@ class Account(unittest.TestCase):
         self.press("Sign Out: Ada")
         app.wait("Vaelo Drive is not available")
         self.assertIn("SignedIn=false", (app.data / "account.ini").read_text())
+        app.key("Escape")
+        app.wait_gone("Sign In: Ada")
+        app.click("Accounts…", "push button")  # of the page that says so
         self.press("Sign In: Ada")
         app.wait("Report.txt", "list item")
         app.wait_gone("Vaelo Drive is not available")

@@ -333,6 +333,31 @@ TEST_F(DriveServiceTest, TheQuotaIsTheSmallerOfAllowanceAndDisk) {
   EXPECT_TRUE(free().error);
 }
 
+TEST_F(DriveServiceTest, ADiskThatDoesNotTellItsSizeHasNoQuota) {
+  makeFolder(data);
+  writeAccount("Token=t\nSignedIn=true\nAllowance=100\n");
+  link("/proc", mirror);
+  start();
+  Result<std::int64_t> answer;
+  int measured = 0;
+  service->observeStorage([&](const StorageFigures&) { ++measured; });
+  service->fetchQuota([&](Result<std::int64_t> result) { answer = std::move(result); });
+  ASSERT_TRUE(answer.error);
+  EXPECT_EQ(answer.error->localizedFailureReason, "the disk doesn't tell how large it is");
+  EXPECT_EQ(measured, 0);
+}
+
+TEST_F(DriveServiceTest, WhatAFetchMeasuresIsToldBesides) {
+  makeFolder(data);
+  writeAccount("Token=t\nSignedIn=true\nAllowance=1000\n");
+  write(drive + "/a", std::string(400, 'x'));
+  start();
+  std::optional<StorageFigures> measured;
+  service->observeStorage([&](const StorageFigures& figures) { measured = figures; });
+  service->fetchQuota([](const Result<std::int64_t>&) {});
+  EXPECT_EQ(measured, (StorageFigures{600, 1000}));
+}
+
 TEST_F(DriveServiceTest, ARebuiltIndexIsAnnounced) {
   write(data + "/index.sqlite", std::string(5000, 'x'));
   int posted = 0;
