@@ -92,6 +92,10 @@ DriveSyncedStore::~DriveSyncedStore() { unwatch(); }
 std::string DriveSyncedStore::path() const { return layout_.mirrorRoot() + FileName; }
 
 void DriveSyncedStore::unwatch() {
+  {
+    const std::lock_guard lock(mutex_);
+    watched_ = current_ = false;
+  }
   if (!monitor_) return;
   g_signal_handlers_disconnect_by_data(monitor_, this);
   g_file_monitor_cancel(monitor_);
@@ -100,10 +104,6 @@ void DriveSyncedStore::unwatch() {
 
 void DriveSyncedStore::accountChanged() {
   unwatch();
-  {
-    const std::lock_guard lock(mutex_);
-    current_ = false;
-  }
   watch();
   notifications_.post({SyncedStoreDidChangeExternallyNotification, {}});
 }
@@ -112,7 +112,7 @@ Value DriveSyncedStore::objectForKey(const std::string& key) {
   const std::lock_guard lock(mutex_);
   if (!current_) values_ = read();
   // Without a watch every question reads the file again.
-  current_ = monitor_ != nullptr;
+  current_ = watched_;
   const auto found = values_.find(key);
   return found == values_.end() ? Value() : found->second;
 }
@@ -172,6 +172,9 @@ void DriveSyncedStore::watch() {
                              self->notifications_.post({SyncedStoreDidChangeExternallyNotification, {}});
                            }),
                            this);
+  const std::lock_guard lock(mutex_);
+  watched_ = true;
+  current_ = false;  // it may have changed before the watch began
 }
 
 }  // namespace vaelo

@@ -43,8 +43,9 @@ class DriveSyncedStore : public SyncedKeyValueStore {
   const DriveLayout& layout_;
   LogSink& log_;
   NotificationCenter& notifications_;
-  GFileMonitor* monitor_ = nullptr;
+  GFileMonitor* monitor_ = nullptr;  // main thread
   std::mutex mutex_;
+  bool watched_ = false;  // guarded by mutex_: who changes the file is heard of
   bool current_ = false;  // guarded by mutex_: values_ is what the file says
   Dictionary values_;     // guarded by mutex_
 };
