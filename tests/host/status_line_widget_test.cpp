@@ -16,7 +16,6 @@ namespace {
 class StatusLineWidgetTest : public testing::Test {
  protected:
   StatusLineWidgetTest() {
-    adw_init();
     label->setFont(Font::preferred(TextStyle::Caption2));
     view->setPrimaryLabel(label);
     view->setQuotaButton(button);
@@ -51,7 +50,7 @@ class StatusLineWidgetTest : public testing::Test {
   std::shared_ptr<Label> label = std::make_shared<Label>();
   std::shared_ptr<OfferButton> button =
       std::make_shared<OfferButton>(nullptr, [this](const std::string& page) { opened.push_back(page); });
-  GtkWidget* window = gtk_window_new();
+  GtkWidget* window = (adw_init(), gtk_window_new());
   GtkWidget* widget = nullptr;
 };
 
