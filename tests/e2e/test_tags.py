@@ -47,8 +47,8 @@ class Tags(unittest.TestCase):
 
     def test_known_tags_are_put_on_and_taken_off(self):
         self.open_tags()
-        self.assertEqual([row[1] for row in self.app.accessibility.showing() if row[0] == "check box"],
-                         ["Work", "Own", "Red"])
+        wait_for("the item's tags and then the others",
+                 lambda: [row[1] for row in self.app.accessibility.showing() if row[0] == "check box"] == ["Work", "Own", "Red"])
         self.app.key("space")  # the first is in focus
         wait_for("Work to be off", lambda: self.tags() == "Own")
         self.app.key("Tab", "Tab", "space")
@@ -57,6 +57,7 @@ class Tags(unittest.TestCase):
     def test_a_new_tag_is_the_users_from_then_on(self):
         app = self.app
         self.open_tags()
+        app.wait("Red", "check box")
         app.key("Tab", "Tab", "Tab")
         app.type("To do, now")
         app.key("Return")
