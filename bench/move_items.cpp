@@ -27,7 +27,7 @@ double since(Clock::time_point start) { return std::chrono::duration<double>(Clo
 struct World {
   World()
       : platform({folder + "/data", folder + "/preferences.ini", folder + "/restoration.ini"}),
-        screens(platform.drive()),
+        screens(platform.drive(), platform.syncedStore()),
         loop(screens, platform.drive(), platform.notifications(), platform.userActivities(),
              vaelo::RestorationStore(folder + "/restoration.ini")) {
     platform.install(loop, screens);
