@@ -36,7 +36,7 @@ class List : public vaelo::FolderListScreen {
 struct World {
   explicit World(bool folders)
       : platform({folder + "/data", folder + "/preferences.ini", folder + "/restoration.ini"}),
-        screens(platform.drive()),
+        screens(platform.drive(), platform.syncedStore()),
         loop(screens, platform.drive(), platform.notifications(), platform.userActivities(),
              vaelo::RestorationStore(folder + "/restoration.ini")) {
     platform.install(loop, screens);
@@ -52,7 +52,7 @@ struct World {
     }
     navigation = std::make_shared<vaelo::NavController>();
     navigation->view();
-    list = std::make_shared<List>(vaelo::URL(large, true), platform.drive(), screens);
+    list = std::make_shared<List>(vaelo::URL(large, true), platform.drive(), screens, platform.syncedStore());
     navigation->pushViewController(list, false);
     navigation->initNewListController(list);
     window = gtk_window_new();
