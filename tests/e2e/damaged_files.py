@@ -4,7 +4,6 @@
 
     damaged_files.py FOLDER     prints a line for each: the kind of view or decoder it is meant for, a tab, its name
 """
-import functools
 import gzip
 import io
 import pathlib
@@ -12,6 +11,7 @@ import random
 import struct
 import sys
 import tarfile
+import typing
 import zipfile
 import zlib
 
@@ -19,6 +19,12 @@ from PIL import Image
 
 PICTURE, DOCUMENT, ARCHIVE, TEXT, MEDIA = "picture", "document", "archive", "text", "media"
 GIBIBYTE = 1 << 30
+
+
+class Sparse(typing.NamedTuple):
+    """A file that takes less of the disk than it is long."""
+    begin: bytes
+    length: int
 
 
 def noise(count, seed):
@@ -66,13 +72,18 @@ def png(width, height, depth, colour, *chunks):
     return b"\x89PNG\r\n\x1a\n" + head + b"".join(chunks) + chunk(b"IEND", b"")
 
 
-@functools.cache
 def squeezed_zeroes(count):
-    """A zlib stream of so many zeroes, made without holding them."""
+    """A zlib stream of so many zeroes, made without squeezing them all: the same block again and again."""
+    block = 1 << 20
     packer = zlib.compressobj(9)
-    block = bytes(1 << 20)
-    parts = [packer.compress(block[:min(len(block), count - at)]) for at in range(0, count, len(block))]
-    return b"".join(parts) + packer.flush()
+    begin = packer.compress(bytes(block)) + packer.flush(zlib.Z_FULL_FLUSH)
+    again = packer.compress(bytes(block)) + packer.flush(zlib.Z_FULL_FLUSH)
+    blocks, rest = divmod(count, block)
+    if blocks == 0:
+        return zlib.compress(bytes(count), 9)
+    last = packer.compress(bytes(rest)) + packer.flush()
+    checksum = (count % 65521) << 16 | 1
+    return begin + again * (blocks - 1) + last[:-4] + struct.pack(">I", checksum)
 
 
 def blank_png(width, height):
@@ -277,6 +288,8 @@ def texts():
     yield "Directions.txt", ("\u202e\u2066" * 20000 + "text\n").encode()
     yield "Controls.txt", bytes(range(256)) * 100
     yield "Nothing.txt", b""
+    yield "Two gibibytes.txt", Sparse(b"A line at the beginning.\n" * 5000, 2 * GIBIBYTE)
+    yield "Two gibibytes of nothing.txt", Sparse(b"", 2 * GIBIBYTE)
     yield "Quotes in quotes.md", b">" * 100000 + b"x\n"
     yield "Brackets.md", b"[" * 100000 + b"](x)\n"
     yield "Lists in lists.md", b"".join(b" " * i + b"- x\n" for i in range(2000))
@@ -298,6 +311,13 @@ def media():
     yield "Nothing.mp4", b""
 
 
+def write(path, content):
+    with open(path, "wb") as file:
+        file.write(content.begin if isinstance(content, Sparse) else content)
+        if isinstance(content, Sparse):
+            file.truncate(content.length)
+
+
 MAKERS = ((PICTURE, (pngs, jpegs, gifs, webps, tiffs, other_pictures, svgs)), (DOCUMENT, (documents,)), (ARCHIVE, (archives,)),
           (TEXT, (texts,)), (MEDIA, (media,)))
 
@@ -313,7 +333,7 @@ def make(folder, kinds=(PICTURE, DOCUMENT, ARCHIVE, TEXT, MEDIA)):
             continue
         for maker in makers:
             for name, content in maker():
-                (folder / name).write_bytes(content)
+                write(folder / name, content)
                 made.append((kind, name))
     return made
 

@@ -127,6 +127,17 @@ TEST_F(TextLoadTest, AMissingDocumentFails) {
   ASSERT_TRUE(waitUntil([this] { return !failure_.empty(); }));
 }
 
+TEST_F(TextLoadTest, WhereTheFileWasNeverWrittenTheTextEnds) {
+  std::string content;
+  while (content.size() < 100'000) content += "A line of the log\n";
+  load("hole.txt", content + std::string((3U << 20) - content.size(), '\0'));
+  ASSERT_TRUE(waitUntil([this] { return load_->finished(); }));
+  EXPECT_EQ(text(), content);
+  EXPECT_TRUE(load_->progress().shortened);
+  EXPECT_EQ(load_->progress().bytesRead, content.size());
+  EXPECT_EQ(load_->progress().documentBytes, 3U << 20);
+}
+
 TEST_F(TextLoadTest, LeavingInTheMiddleEndsIt) {
   load("long.txt", std::string(8'000'000, 'x'));
   load_.reset();

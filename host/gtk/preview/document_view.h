@@ -3,6 +3,7 @@
 
 #include <gtk/gtk.h>
 
+#include <chrono>
 #include <functional>
 #include <memory>
 #include <string>
@@ -16,6 +17,8 @@ struct PreviewedDocument {
   std::string name;         ///< for a person
   std::string contentType;  ///< a MIME type of the shared-mime-info database
   bool mayBeEdited = false;
+  /// With what takes long to be shown. A kind that knows better has less.
+  std::chrono::milliseconds patience = std::chrono::seconds(20);
 };
 
 /// What a view tells its page. All on the main thread, none before the view's constructor returned.

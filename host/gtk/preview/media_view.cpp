@@ -19,7 +19,7 @@ namespace vaelo {
 
 namespace {
 
-constexpr guint LoadingTakes = 12;  // seconds
+constexpr std::chrono::milliseconds LoadingTakes = std::chrono::seconds(12);
 constexpr const char* CannotPlay =
     "This document can’t be played. It may be damaged or of a kind that this computer doesn’t know.";
 constexpr const char* NoPlayer = "Sound and film can’t be played on this computer.";
@@ -70,8 +70,8 @@ class MediaView : public DocumentView {
   // From the beginning, since nobody knows what became of the place that played.
   void refresh() override {
     stop();
-    timer_ = g_timeout_add_seconds(
-        LoadingTakes,
+    timer_ = g_timeout_add(
+        static_cast<guint>(std::min(LoadingTakes, document_.patience).count()),
         +[](gpointer data) -> gboolean {
           auto* self = static_cast<MediaView*>(data);
           self->timer_ = 0;

@@ -89,7 +89,7 @@ class OfficeView : public DocumentView {
     if (view_) return showAnew(made);
     shown_ = std::move(converting_);
     shownPath_ = made;
-    view_ = makePortableDocumentView({made, document_.name, "application/pdf", false}, events_);
+    view_ = makePortableDocumentView({made, document_.name, "application/pdf", false, document_.patience}, events_);
     adw_bin_set_child(ADW_BIN(bin_), view_->widget());
   }
 

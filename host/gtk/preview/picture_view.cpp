@@ -101,11 +101,12 @@ class PictureView : public DocumentView {
 
   void askWhole() {
     asking_ = true;
-    process_->ask("whole " + boundsWords(), [this](DecoderProcess::Answer answer) {
+    const auto answered = [this](DecoderProcess::Answer answer) {
       asking_ = false;
       if (!answer.error.empty()) return events_.failed(messageForDecoderError(answer.error));
       gotWhole(std::move(answer));
-    });
+    };
+    process_->ask("whole " + boundsWords(), answered, document_.patience);
   }
 
   void gotWhole(DecoderProcess::Answer answer) {

@@ -78,7 +78,7 @@ PortableDocumentScreen::PortableDocumentScreen(const PreviewedDocument& document
 PortableDocumentScreen::~PortableDocumentScreen() = default;
 
 void PortableDocumentScreen::load(const std::string& password) {
-  if (!nextSource_) nextSource_ = std::make_unique<PortableDocumentSource>(document_.path);
+  if (!nextSource_) nextSource_ = std::make_unique<PortableDocumentSource>(document_.path, document_.patience);
   nextSource_->open(password, [this, password](const PortableDocumentSource::Opened& result) { opened(result, password); });
 }
 

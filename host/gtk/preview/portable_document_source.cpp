@@ -41,8 +41,8 @@ std::vector<double> numbersIn(const std::string& words) {
 
 std::vector<PageSize> pageSizesIn(const std::string& words) { return sizesFrom(numbersIn(words), 0); }
 
-PortableDocumentSource::PortableDocumentSource(const std::string& path)
-    : path_(path), file_(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY)) {
+PortableDocumentSource::PortableDocumentSource(const std::string& path, std::chrono::milliseconds patience)
+    : path_(path), patience_(patience), file_(::open(path.c_str(), O_RDONLY | O_CLOEXEC | O_NONBLOCK | O_NOCTTY)) {
   if (file_) version_ = versionOf(file_.get()).value_or(FileVersion());
 }
 
@@ -74,7 +74,7 @@ void PortableDocumentSource::open(const std::string& password, std::function<voi
 }
 
 void PortableDocumentSource::ask(std::string request, Done done, std::chrono::milliseconds limit) {
-  jobs_.push_back({std::move(request), std::move(done), limit});
+  jobs_.push_back({std::move(request), std::move(done), std::min(limit, patience_)});
   if (!asking_) next();
 }
 
@@ -99,7 +99,8 @@ void PortableDocumentSource::answered(DecoderProcess::Answer answer) {
 void PortableDocumentSource::restart() {
   ++restarts_;
   start();
-  jobs_.push_front({"open " + password_, [](const DecoderProcess::Answer&) {}, OpeningTakes});
+  jobs_.push_front({"open " + password_, [](const DecoderProcess::Answer&) {},
+                    std::min<std::chrono::milliseconds>(OpeningTakes, patience_)});
 }
 
 }  // namespace vaelo

@@ -38,7 +38,8 @@ class PortableDocumentSource {
   };
   using Done = std::function<void(DecoderProcess::Answer)>;
 
-  explicit PortableDocumentSource(const std::string& path);
+  /// `patience` bounds every request.
+  PortableDocumentSource(const std::string& path, std::chrono::milliseconds patience);
   /// The open document; none when it could not be opened.
   const UniqueFd& file() const { return file_; }
   /// As it was when it was opened.
@@ -62,6 +63,7 @@ class PortableDocumentSource {
   void restart();
 
   std::string path_;
+  std::chrono::milliseconds patience_;
   UniqueFd file_;
   FileVersion version_;
   std::string password_;

@@ -20,9 +20,11 @@ constexpr const char* QueriedAttributes = G_FILE_ATTRIBUTE_STANDARD_TYPE "," G_F
 
 }  // namespace
 
-PreviewPage::PreviewPage(std::shared_ptr<PreviewController> controller, std::function<void()> headerChanged)
+PreviewPage::PreviewPage(std::shared_ptr<PreviewController> controller, std::function<void()> headerChanged,
+                         std::chrono::milliseconds patience)
     : controller_(std::move(controller)),
       headerChanged_(std::move(headerChanged)),
+      patience_(patience),
       share_([this] { return item(); }),
       facts_([this] { load(); }),
       stack_(GTK_WIDGET(g_object_ref_sink(gtk_stack_new()))),
@@ -171,7 +173,7 @@ void PreviewPage::makeView(const std::string& contentType) {
   adw_status_page_set_description(ADW_STATUS_PAGE(loading_), nullptr);
   // A label of bytes that are no UTF-8 ends the process as soon as a screen reader asks for it.
   const std::string name = takeString(g_filename_display_name(shown->lastPathComponent().c_str()));
-  const PreviewedDocument document{shown->path(), name, contentType, controller_->canEditItem(*shown)};
+  const PreviewedDocument document{shown->path(), name, contentType, controller_->canEditItem(*shown), patience_};
   viewedType_ = contentType;
   view_ = makeDocumentView(document, std::move(events));
   gtk_stack_add_child(GTK_STACK(stack_), view_->widget());

@@ -22,7 +22,8 @@ namespace vaelo {
 class PreviewPage {
  public:
   /// `headerChanged` is called when headerWidgets() would answer something else.
-  PreviewPage(std::shared_ptr<PreviewController> controller, std::function<void()> headerChanged);
+  PreviewPage(std::shared_ptr<PreviewController> controller, std::function<void()> headerChanged,
+              std::chrono::milliseconds patience = PreviewedDocument().patience);
   ~PreviewPage();
   PreviewPage(const PreviewPage&) = delete;
   PreviewPage& operator=(const PreviewPage&) = delete;
@@ -54,6 +55,7 @@ class PreviewPage {
 
   std::shared_ptr<PreviewController> controller_;
   std::function<void()> headerChanged_;
+  std::chrono::milliseconds patience_;
   ShareButton share_;
   FactsPage facts_;
   GtkWidget* stack_;

@@ -18,6 +18,14 @@ namespace vaelo {
 namespace {
 constexpr std::size_t FirstPiece = 64 * 1024;
 constexpr std::size_t LaterPiece = 1024 * 1024;
+// So many NULs in a row are no text, but a part of the file that was never written.
+constexpr std::size_t SmallestHole = 64 * 1024;
+
+void cutHole(std::string& bytes) {
+  std::size_t end = bytes.find_last_not_of('\0') + 1;
+  end += end % 2;  // a character may take two bytes, the last of them NUL
+  if (bytes.size() >= end + SmallestHole) bytes.resize(end);
+}
 }  // namespace
 
 /// On the reader's thread, but for its construction.
@@ -36,6 +44,7 @@ struct TextReader::Reading {
     if (count < 0) return failure(errno == EISDIR ? DecoderError::Unsupported : DecoderError::Unreadable);
     bytes.resize(static_cast<std::size_t>(count));
     if (first && TextDecoding::isBinary(bytes)) return failure(DecoderError::Unsupported);
+    cutHole(bytes);
     bytesRead += bytes.size();
     const bool ended = bytes.size() < wanted;
     const bool reachedMost = bytesRead >= mostBytes;
