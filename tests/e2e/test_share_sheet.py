@@ -213,6 +213,39 @@ class Wide(Share):
         self.app.wait("This item is not downloaded.")
         self.assertEqual([row[1] for row in self.rows() if row[6]], ["Copy Link"])
 
+    def test_what_has_come_meanwhile_is_opened(self):
+        app = self.app
+        document = app.drive / "Documents" / "Rates.csv"
+        promise = document.with_name(".Rates.csv.vlopromise")
+        promise.write_text("[Promise]\nName=Rates.csv\nSize=4\nModified=1770000000\nPackage=false\n")
+        self.share("Documents/Rates.csv")
+        app.wait("This item is not downloaded.")
+        self.assertEqual([row[1] for row in self.rows() if row[6]], ["Copy Link"])
+        app.key("Escape")
+        app.wait_gone("Copy Link")
+        arriving = app.desktop.scratch / "arriving"
+        arriving.write_text("a,b\n")
+        arriving.rename(document)
+        promise.unlink()
+        wait_for("the document", lambda: not any("Not downloaded" in name for name in app.names()))
+        self.press_share()
+        self.choose("Open in “Table”")
+        self.assertEqual(self.record("org.example.Table"), [str(document)])
+
+    def test_a_row_of_a_list_is_shared_from_its_menu(self):
+        app = self.app
+        app.click("Documents", "list item")
+        app.wait_title("Documents")
+        app.click("Budget 2026.csv", "list item", button=3)
+        app.wait("Share…", "menu item")
+        app.key("s")
+        app.wait("Copy Link")
+        app.wait_log("DLC Action Share")
+        self.choose("Open in “Table”")
+        self.assertEqual(self.record("org.example.Table"), [str(self.document)])
+        app.wait_gone("Copy Link")
+        app.wait_title("Documents")
+
     def test_the_sheet_goes_with_its_document(self):
         self.share()
         self.document.unlink()
