@@ -30,9 +30,7 @@ std::shared_ptr<FileInfoCell> FileInfoCell::initWithNameAndValueValueMaxLines(co
     return label;
   };
   cell->nameLabel_ = add(name, Color::gray(), NameHugging);
-  // Names line up against the values, whichever way people read.
-  const bool rightToLeft = cell->traitCollection().layoutDirection == LayoutDirection::RightToLeft;
-  cell->nameLabel_->setTextAlignment(rightToLeft ? TextAlignment::Left : TextAlignment::Right);
+  cell->alignName();
   cell->valueLabel_ = add(value, Color::black(), LayoutPriority::DefaultLow);
   cell->valueLabel_->setNumberOfLines(maxLines);
   cell->valueLabel_->setContentCompressionResistancePriority(LayoutPriority::DefaultLow, LayoutAxis::Horizontal);
@@ -41,6 +39,18 @@ std::shared_ptr<FileInfoCell> FileInfoCell::initWithNameAndValueValueMaxLines(co
     LayoutConstraint::activate(constraintsWithVisualFormat(format, bindings));
   }
   return cell;
+}
+
+// Only in a window is it known which way people read.
+void FileInfoCell::didMoveToWindow() {
+  View::didMoveToWindow();
+  alignName();
+}
+
+// Names line up against the values, whichever way people read.
+void FileInfoCell::alignName() {
+  const bool rightToLeft = traitCollection().layoutDirection == LayoutDirection::RightToLeft;
+  nameLabel_->setTextAlignment(rightToLeft ? TextAlignment::Left : TextAlignment::Right);
 }
 
 }  // namespace vaelo

@@ -20,7 +20,11 @@ class FileInfoCell : public View {
   const std::shared_ptr<Label>& nameLabel() const { return nameLabel_; }
   const std::shared_ptr<Label>& valueLabel() const { return valueLabel_; }
 
+ protected:
+  void didMoveToWindow() override;
+
  private:
+  void alignName();
   std::shared_ptr<Label> nameLabel_;
   std::shared_ptr<Label> valueLabel_;
 };

@@ -27,6 +27,7 @@ void PreviewDetailsViewController::setupViewsAndConstraints() {
   buildFileDetailsStackView();
   mainStackView_ = buildVerticalStackWithSubviewsSpacing({thumbnailView_, fileDetailsView_}, 0);
   mainStackView_->setDebugName("MainStackView");
+  mainStackView_->setAlignment(StackAlignment::Center);  // side by side neither is higher than it needs to be
   wrapperView()->addSubview(mainStackView_);
   stretchSubviewWithinViewIncludeBottom(*mainStackView_, *wrapperView(), true);
   setupPortraitConstraints();

@@ -120,6 +120,7 @@ void GtkWindowHost::makeKeyAndVisible() {
   Window::makeKeyAndVisible();
   if (const auto controller = navigation()) {
     controller->setHost(this);
+    controller->setBarHeights(0, 0);  // the bars stand beside the screens, not over them
     // What came before is not told again.
     stackChanged({}, controller->viewControllers(), false, [] {});
   }

@@ -91,6 +91,11 @@ class CairoContext : public DrawingContext {
 
 }  // namespace
 
+void drawWithCairo(cairo_t* cairo, const std::function<void(DrawingContext&)>& draw) {
+  CairoContext drawing(cairo);
+  draw(drawing);
+}
+
 double textScale() {
   constexpr double usual = 96 * 1024;
   GtkSettings* settings = gtk_settings_get_default();
@@ -131,8 +136,7 @@ ImageRef PangoGraphics::renderImage(const Size& size, const std::function<void(D
   const int height = std::max(1, static_cast<int>(std::ceil(size.height)));
   cairo_surface_t* surface = cairo_image_surface_create(CAIRO_FORMAT_ARGB32, width, height);
   cairo_t* cairo = cairo_create(surface);
-  CairoContext drawing(cairo);
-  draw(drawing);
+  drawWithCairo(cairo, draw);
   cairo_destroy(cairo);
   cairo_surface_flush(surface);
   const auto stride = static_cast<gsize>(cairo_image_surface_get_stride(surface));
@@ -145,11 +149,12 @@ ImageRef PangoGraphics::renderImage(const Size& size, const std::function<void(D
 
 ImageRef PangoGraphics::documentIcon(const std::string& fileName, const std::optional<std::string>&, IconFormat format) {
   const int size = format == IconFormat::Large ? 128 : 32;
+  const int scale = format == IconFormat::Large ? 2 : 1;  // large ones are shown at twice their size
   const std::string type = takeString(g_content_type_guess(fileName.c_str(), nullptr, 0, nullptr));
   const GRef<GIcon> icon(g_content_type_get_icon(type.c_str()));
   GtkIconTheme* theme = gtk_icon_theme_get_for_display(gdk_display_get_default());
   GtkIconPaintable* paintable =
-      gtk_icon_theme_lookup_by_gicon(theme, icon.get(), size, 1, GTK_TEXT_DIR_NONE, static_cast<GtkIconLookupFlags>(0));
+      gtk_icon_theme_lookup_by_gicon(theme, icon.get(), size, scale, GTK_TEXT_DIR_NONE, static_cast<GtkIconLookupFlags>(0));
   return std::make_shared<GtkImageData>(GDK_PAINTABLE(paintable), size, size);
 }
 

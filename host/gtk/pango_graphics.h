@@ -18,6 +18,9 @@ class PangoGraphics : public Graphics {
                         IconFormat format) override;
 };
 
+/// Calls `draw` with what draws on `cairo`.
+void drawWithCairo(cairo_t* cairo, const std::function<void(DrawingContext&)>& draw);
+
 /// How much larger than usual the user wants text.
 double textScale();
 

@@ -3,10 +3,8 @@
 
 #include "host/gtk/bar_item_widget.h"
 #include "host/gtk/host_screen.h"
-#include "host/gtk/preview/facts_page.h"
+#include "host/gtk/mirror/view_mirror.h"
 #include "host/gtk/preview/preview_page.h"
-#include "preview/preview_base_view_controller.h"
-#include "preview/preview_item_manager.h"
 
 namespace vaelo {
 
@@ -42,11 +40,10 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
     preview_ = std::make_unique<PreviewPage>(preview, [this] { showBar(); });
     gtk_widget_set_vexpand(preview_->widget(), TRUE);
     gtk_box_append(GTK_BOX(box_), preview_->widget());
-  } else if (std::dynamic_pointer_cast<PreviewBaseViewController>(screen_)) {
-    facts_ = std::make_unique<FactsPage>([this] { showFacts(); });
-    gtk_widget_set_vexpand(facts_->widget(), TRUE);
-    gtk_box_append(GTK_BOX(box_), facts_->widget());
-    showFacts();
+  } else {
+    mirror_ = std::make_unique<ViewMirror>(screen_->view());
+    gtk_widget_set_vexpand(mirror_->widget(), TRUE);
+    gtk_box_append(GTK_BOX(box_), mirror_->widget());
   }
   gtk_widget_add_css_class(toolbar_, "toolbar");
   gtk_widget_set_size_request(toolbar_, -1, 46);
@@ -63,6 +60,7 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
 
 ScreenPage::~ScreenPage() {
   preview_.reset();  // while there is a bar that it may change
+  mirror_.reset();
   g_signal_handlers_disconnect_by_data(back_, this);
   if (hostScreen_ && gtk_widget_get_parent(hostScreen_->contentWidget()) == box_) {
     gtk_box_remove(GTK_BOX(box_), hostScreen_->contentWidget());
@@ -93,20 +91,6 @@ bool ScreenPage::closeSearch() { return hostScreen_ ? hostScreen_->closeSearch()
 void ScreenPage::refresh() {
   if (hostScreen_) hostScreen_->refresh();
   if (preview_) preview_->refresh();
-  if (facts_) showFacts();
-}
-
-void ScreenPage::showFacts() {
-  const auto details = std::static_pointer_cast<PreviewBaseViewController>(screen_);
-  const std::shared_ptr<PreviewItemManager> manager = details->itemManager();
-  const std::optional<URL> shown = manager && manager->item() ? manager->item()->resolvedURL() : std::nullopt;
-  if (!shown) {
-    facts_->showNothing();
-  } else if (manager->item()->isDownloaded()) {
-    facts_->show(*shown, "");
-  } else {
-    facts_->showNotDownloaded(*shown);
-  }
 }
 
 void ScreenPage::showBar() {

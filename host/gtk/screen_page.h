@@ -11,8 +11,8 @@
 namespace vaelo {
 
 class HostScreen;
-class FactsPage;
 class PreviewPage;
+class ViewMirror;
 
 /// One page of the window: a screen's header bar, its content and its toolbar, which follow the screen. Main thread.
 class ScreenPage {
@@ -40,7 +40,6 @@ class ScreenPage {
 
  private:
   void showBar();
-  void showFacts();
   void showToolbar();
 
   ViewControllerRef screen_;
@@ -53,7 +52,7 @@ class ScreenPage {
   std::vector<GtkWidget*> barWidgets_;
   std::function<void()> goBack_;
   std::unique_ptr<PreviewPage> preview_;
-  std::unique_ptr<FactsPage> facts_;  // of the details of a document
+  std::unique_ptr<ViewMirror> mirror_;  // of a screen that has neither content nor a preview
   bool canGoBack_ = false;
   bool toolbarHidden_ = true;
   std::shared_ptr<void> barToken_;

@@ -2,6 +2,7 @@
 // The small views that the details are made of.
 #include <cmath>
 
+#include "platform/ui/window.h"
 #include "preview/constraint_utils.h"
 #include "preview/hairline_view.h"
 #include "preview/pie_progress_indicator_view.h"
@@ -55,6 +56,18 @@ TEST_F(InfoViewsTest, ACellHasANameBesideAValue) {
   EXPECT_EQ(value.contentCompressionResistancePriority(LayoutAxis::Vertical), 1000);
   EXPECT_THAT(cell->constraints(), SizeIs(6));
   EXPECT_EQ(FileInfoCell::init()->nameLabel()->text(), "");
+}
+
+TEST_F(InfoViewsTest, NamesLineUpAgainstValuesWhicheverWayPeopleRead) {
+  const auto cell = FileInfoCell::initWithNameAndValueValueMaxLines("Kind", "Text", 1);
+  TraitCollection traits;
+  traits.layoutDirection = LayoutDirection::RightToLeft;
+  window->setTraitCollection(traits);
+  const auto screen = std::make_shared<ViewController>();
+  screen->view()->addSubview(cell);
+  window->setRootViewController(screen);
+  window->makeKeyAndVisible();
+  EXPECT_EQ(cell->nameLabel()->textAlignment(), TextAlignment::Left);
 }
 
 TEST_F(InfoViewsTest, RowsComeInTheirOrderAndShareTheirColumn) {

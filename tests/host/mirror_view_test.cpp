@@ -1,0 +1,221 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+#include <adwaita.h>
+#include <gtest/gtest.h>
+
+#include "host/gtk/mirror/view_mirror.h"
+#include "host/gtk/pango_graphics.h"
+#include "platform/ui/button.h"
+#include "platform/ui/image_view.h"
+#include "platform/ui/stack_view.h"
+#include "platform/ui/text_field.h"
+#include "platform/ui/visual_format.h"
+#include "tests/support/memory_platform.h"
+
+namespace vaelo {
+namespace {
+
+/// A page as screens are: a content as high as the page in a view that scrolls, with a column of things in it.
+class MirrorViewTest : public testing::Test {
+ protected:
+  MirrorViewTest() {
+    scroll->setTranslatesAutoresizingMaskIntoConstraints(false);
+    root->addSubview(scroll);
+    for (const char* format : {"H:|[scroll]|", "V:|[scroll]|"}) {
+      LayoutConstraint::activate(constraintsWithVisualFormat(format, {{"scroll", scroll.get()}}));
+    }
+    scroll->addSubview(content);
+    column->setTranslatesAutoresizingMaskIntoConstraints(false);
+    column->setAxis(LayoutAxis::Vertical);
+    column->setAlignment(StackAlignment::Leading);
+    content->addSubview(column);
+    for (const char* format : {"H:|[column]|", "V:|[column]"}) {
+      LayoutConstraint::activate(constraintsWithVisualFormat(format, {{"column", column.get()}}));
+    }
+    label->setText("Kind");
+    column->addArrangedSubview(label);
+  }
+  ~MirrorViewTest() override {
+    if (!mirror) return;
+    gtk_window_set_child(GTK_WINDOW(window), nullptr);
+    mirror.reset();
+    gtk_window_destroy(GTK_WINDOW(window));
+  }
+
+  void show(GtkTextDirection direction = GTK_TEXT_DIR_LTR) {
+    window = (adw_init(), gtk_window_new());
+    mirror = std::make_unique<ViewMirror>(root);
+    gtk_widget_set_direction(mirror->widget(), direction);
+    gtk_window_set_child(GTK_WINDOW(window), mirror->widget());
+    gtk_window_set_default_size(GTK_WINDOW(window), 360, 400);
+    gtk_widget_show(window);
+    settle();
+  }
+  void settle() {
+    // Until a frame was drawn after the last change.
+    bool drawn = false;
+    gtk_widget_queue_draw(window);
+    g_signal_connect(gtk_widget_get_frame_clock(window), "after-paint",
+                     G_CALLBACK(+[](GdkFrameClock*, bool* flag) { *flag = true; }), &drawn);
+    while (!drawn) g_main_context_iteration(nullptr, TRUE);
+    g_signal_handlers_disconnect_by_data(gtk_widget_get_frame_clock(window), &drawn);
+  }
+  std::vector<GtkWidget*> widgets() {
+    GtkWidget* scroller = gtk_widget_get_first_child(mirror->widget());
+    GtkWidget* area = gtk_widget_get_first_child(gtk_scrolled_window_get_child(GTK_SCROLLED_WINDOW(scroller)));
+    std::vector<GtkWidget*> found;
+    for (GtkWidget* each = gtk_widget_get_first_child(area); each; each = gtk_widget_get_next_sibling(each)) {
+      found.push_back(each);
+    }
+    return found;
+  }
+  Rect placeOf(GtkWidget* widget) {
+    graphene_rect_t bounds;
+    EXPECT_TRUE(gtk_widget_compute_bounds(widget, mirror->widget(), &bounds));
+    return {static_cast<double>(bounds.origin.x), static_cast<double>(bounds.origin.y),
+            static_cast<double>(bounds.size.width), static_cast<double>(bounds.size.height)};
+  }
+  GtkAdjustment* adjustment() {
+    return gtk_scrolled_window_get_vadjustment(GTK_SCROLLED_WINDOW(gtk_widget_get_first_child(mirror->widget())));
+  }
+  std::shared_ptr<Label> addLabel(const char* text) {
+    const auto added = std::make_shared<Label>();
+    added->setText(text);
+    column->addArrangedSubview(added);
+    return added;
+  }
+
+  MemoryPlatform memory;
+  ViewRef root = std::make_shared<View>(Rect{0, 0, 100, 100});
+  std::shared_ptr<ScrollView> scroll = std::make_shared<ScrollView>();
+  ViewRef content = std::make_shared<View>(Rect{0, 0, 360, 400});
+  std::shared_ptr<StackView> column = std::make_shared<StackView>();
+  std::shared_ptr<Label> label = std::make_shared<Label>();
+  GtkWidget* window = nullptr;
+  std::unique_ptr<ViewMirror> mirror;
+};
+
+TEST_F(MirrorViewTest, WidgetsStandWhereTheLayoutPutsTheViews) {
+  const auto second = addLabel("Size");
+  column->setSpacing(10);
+  show();
+  EXPECT_EQ(root->frame().width, gtk_widget_get_width(mirror->widget()));
+  ASSERT_EQ(widgets().size(), 2U);
+  EXPECT_EQ(placeOf(widgets()[0]).x, 0);
+  EXPECT_NEAR(placeOf(widgets()[1]).midY(), second->frame().midY(), 1);
+  EXPECT_GT(second->frame().y, 10);
+}
+
+TEST_F(MirrorViewTest, RightToLeftTheColumnBeginsOnTheRight) {
+  show(GTK_TEXT_DIR_RTL);
+  EXPECT_NEAR(placeOf(widgets()[0]).maxX(), gtk_widget_get_width(mirror->widget()), 1);
+}
+
+TEST_F(MirrorViewTest, WhatChangesIsFollowed) {
+  show();
+  const double before = label->frame().width;
+  label->setText("A much longer text");
+  settle();
+  GtkWidget* text = gtk_widget_get_first_child(widgets()[0]);
+  EXPECT_STREQ(gtk_label_get_text(GTK_LABEL(text)), "A much longer text");
+  EXPECT_GT(label->frame().width, before);
+  const auto added = addLabel("Size");
+  settle();
+  ASSERT_EQ(widgets().size(), 2U);
+  added->setHidden(true);
+  settle();
+  EXPECT_FALSE(gtk_widget_get_child_visible(widgets()[1]));
+  label->removeFromSuperview();
+  settle();
+  EXPECT_EQ(widgets().size(), 1U);
+}
+
+TEST_F(MirrorViewTest, WidgetsKeepTheOrderOfTheViewsForTheKeyboard) {
+  show();
+  const auto first = std::make_shared<Label>();
+  first->setText("first");
+  column->insertSubview(first, 0);
+  column->insertArrangedSubview(first, 0);
+  settle();
+  ASSERT_EQ(widgets().size(), 2U);
+  EXPECT_STREQ(gtk_label_get_text(GTK_LABEL(gtk_widget_get_first_child(widgets()[0]))), "first");
+}
+
+TEST_F(MirrorViewTest, NothingIsLaidOutAgainWhenNothingChanged) {
+  show();
+  struct Count : ViewObserver {
+    int changes = 0;
+    void viewChanged(View&, ViewChange) override { ++changes; }
+    void animationWillBegin(View&, const Animation&) override {}
+    void animationDidEnd(View&) override {}
+    void viewWillBeDestroyed(View&) override {}
+  } count;
+  ViewObserver* following = label->observer();
+  label->setObserver(&count);
+  gtk_widget_queue_resize(mirror->widget());
+  settle();
+  EXPECT_EQ(count.changes, 0);
+  label->setObserver(following);
+}
+
+TEST_F(MirrorViewTest, WhatIsHigherThanThePageScrollsAndTellsTheModel) {
+  for (int i = 0; i < 40; ++i) addLabel("row");
+  show();
+  const double page = gtk_adjustment_get_page_size(adjustment());
+  EXPECT_GT(gtk_adjustment_get_upper(adjustment()), page);
+  gtk_adjustment_set_value(adjustment(), 25);
+  EXPECT_EQ(scroll->contentOffset().y, 25);
+  scroll->setContentOffset({0, 40});
+  settle();
+  EXPECT_EQ(gtk_adjustment_get_value(adjustment()), 40);
+  const double before = gtk_adjustment_get_upper(adjustment());
+  scroll->setContentInset({0, 0, 200, 0});
+  settle();
+  EXPECT_NEAR(gtk_adjustment_get_upper(adjustment()), before + 200, 1);
+}
+
+TEST_F(MirrorViewTest, ButtonsArePressedAndFieldsAreTypedIn) {
+  const auto button = std::make_shared<Button>(ButtonType::System);
+  button->setTitle("Open");
+  int presses = 0;
+  button->addAction(ControlEvent::TouchUpInside, [&presses] { ++presses; });
+  column->addArrangedSubview(button);
+  const auto field = std::make_shared<TextField>();
+  field->setText("Report.txt");
+  column->addArrangedSubview(field);
+  LayoutConstraint::makeConstant(*field, LayoutAttribute::Width, 200)->setActive(true);
+  show();
+  ASSERT_EQ(widgets().size(), 3U);
+  g_signal_emit_by_name(widgets()[1], "clicked");
+  EXPECT_EQ(presses, 1);
+  EXPECT_STREQ(gtk_editable_get_text(GTK_EDITABLE(widgets()[2])), "Report.txt");
+  gtk_editable_set_text(GTK_EDITABLE(widgets()[2]), "New.txt");
+  EXPECT_EQ(field->text(), "New.txt");
+}
+
+TEST_F(MirrorViewTest, SmallPicturesAreMagnifiedInSquaresAndOnlyOnce) {
+  const auto picture = std::make_shared<ImageView>(Rect{20, 100, 45, 45});
+  picture->setMagnificationFilter(MagnificationFilter::Nearest);
+  picture->setImage(PangoGraphics().renderImage({10, 10}, [](DrawingContext& context) { context.fillRect({0, 0, 5, 10}); }));
+  content->addSubview(picture);
+  show();
+  GtkWidget* widget = widgets().back();
+  EXPECT_NEAR(placeOf(widget).x, 20, 1);
+  EXPECT_NEAR(placeOf(widget).width, 45, 1);
+  GdkPaintable* shown = gtk_picture_get_paintable(GTK_PICTURE(widget));
+  EXPECT_EQ(gdk_paintable_get_intrinsic_width(shown), 50);
+  gtk_widget_queue_resize(mirror->widget());
+  settle();
+  EXPECT_EQ(gtk_picture_get_paintable(GTK_PICTURE(widget)), shown);
+}
+
+TEST_F(MirrorViewTest, AMirrorThatIsGoneLeavesTheViews) {
+  show();
+  gtk_window_set_child(GTK_WINDOW(window), nullptr);
+  mirror.reset();
+  gtk_window_destroy(GTK_WINDOW(window));
+  for (const ViewRef& view : {root, ViewRef(column), ViewRef(label)}) EXPECT_EQ(view->observer(), nullptr);
+  label->setText("nobody looks");
+}
+
+}  // namespace
+}  // namespace vaelo
