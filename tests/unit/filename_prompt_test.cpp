@@ -52,11 +52,43 @@ TEST_F(FilenamePromptTest, IsAnAlertWithAFieldTwoActionsAndAHiddenLine) {
   ASSERT_THAT(prompt->alert()->actions(), SizeIs(2));
   EXPECT_EQ(prompt->alert()->actions()[0]->title(), "Cancel");
   EXPECT_EQ(prompt->alert()->actions()[0]->style(), AlertActionStyle::Cancel);
+  EXPECT_EQ(prompt->alert()->actions()[0]->handler(), nullptr);
   EXPECT_EQ(prompt->alert()->actions()[1], prompt->defaultAction());
   EXPECT_EQ(prompt->defaultAction()->title(), "Done");
+  EXPECT_EQ(prompt->defaultAction()->style(), AlertActionStyle::Default);
+  EXPECT_EQ(prompt->defaultAction()->handler(), nullptr) << "what it does it does before it closes";
   EXPECT_EQ(prompt->alert()->contentViewController(), prompt->errMsgViewController());
   EXPECT_TRUE(errorHidden(*prompt));
   EXPECT_EQ(prompt->origFilename(), "Notes.pdf");
+}
+
+TEST_F(FilenamePromptTest, AllTextsMayBeAbsent) {
+  const auto prompt = FilenamePrompt::newWithTitleMessagePlaceholderFilenameDoneButtonTextCompletion(
+      std::nullopt, std::nullopt, std::nullopt, std::nullopt, std::nullopt, [](const std::string&, bool&) { return ""; });
+  EXPECT_EQ(prompt->alert()->title(), "");
+  EXPECT_EQ(prompt->alert()->message(), "");
+  EXPECT_EQ(prompt->textField()->text(), "");
+  EXPECT_EQ(prompt->textField()->placeholder(), "");
+  EXPECT_EQ(prompt->defaultAction()->title(), "Done");
+  EXPECT_EQ(prompt->origFilename(), std::nullopt);
+}
+
+TEST_F(FilenamePromptTest, ItsKindsDifferInTheirTextsAlone) {
+  const auto nothing = [](const std::string&, bool&) { return std::string(); };
+  const auto folder = NewFolderPrompt::newWithTitleDoneButtonTextCompletion("Title", "Create", nothing);
+  EXPECT_EQ(folder->alert()->title(), "Title");
+  EXPECT_EQ(folder->alert()->message(), "Enter a name for this folder.");
+  EXPECT_EQ(folder->textField()->placeholder(), "Folder Name");
+  EXPECT_EQ(folder->origFilename(), std::nullopt);
+  EXPECT_EQ(folder->defaultAction()->title(), "Create");
+  EXPECT_FALSE(folder->defaultAction()->enabled());
+  const auto rename = RenamePrompt::newWithFilenameCompletion("Notes.pdf", nothing);
+  EXPECT_EQ(rename->alert()->title(), "Rename Item");
+  EXPECT_EQ(rename->alert()->message(), "Enter a new name for this item.");
+  EXPECT_EQ(rename->textField()->placeholder(), "");
+  EXPECT_EQ(rename->textField()->text(), "Notes.pdf");
+  EXPECT_EQ(rename->defaultAction()->title(), "Done");
+  EXPECT_TRUE(rename->defaultAction()->enabled());
 }
 
 TEST_F(FilenamePromptTest, DoneIsEnabledAtTheStartOnlyWithAName) {
@@ -79,10 +111,18 @@ TEST_F(FilenamePromptTest, TheErrorLineIsRedAndAsHighAsItsText) {
   EXPECT_EQ(view.contentHuggingPriority(LayoutAxis::Horizontal), LayoutPriority::Required);
   EXPECT_EQ(view.contentHuggingPriority(LayoutAxis::Vertical), LayoutPriority::Required);
   ASSERT_THAT(view.constraints(), SizeIs(4));
-  EXPECT_EQ(view.constraints()[1]->firstAttribute(), LayoutAttribute::Height);
-  EXPECT_EQ(view.constraints()[1]->secondItem(), &label);
-  EXPECT_EQ(view.constraints()[2]->constant(), 16);
-  EXPECT_EQ(view.constraints()[3]->constant(), -16);
+  const LayoutAttribute attributes[] = {LayoutAttribute::Top, LayoutAttribute::Height, LayoutAttribute::Leading,
+                                        LayoutAttribute::Trailing};
+  const double constants[] = {0, 0, 16, -16};
+  for (std::size_t i = 0; i < 4; ++i) {
+    const LayoutConstraint& constraint = *view.constraints()[i];
+    EXPECT_EQ(constraint.firstAttribute(), attributes[i]);
+    EXPECT_EQ(constraint.secondAttribute(), attributes[i]);
+    EXPECT_EQ(constraint.firstItem(), i == 1 ? &view : static_cast<const View*>(&label));
+    EXPECT_EQ(constraint.secondItem(), i == 1 ? static_cast<const View*>(&label) : &view);
+    EXPECT_EQ(constraint.constant(), constants[i]);
+  }
+  EXPECT_FALSE(label.translatesAutoresizingMaskIntoConstraints());
 }
 
 TEST_F(FilenamePromptTest, TheNameIsJudgedWhileItIsTyped) {
@@ -103,6 +143,13 @@ TEST_F(FilenamePromptTest, TheNameIsJudgedWhileItIsTyped) {
   type("   ");
   EXPECT_TRUE(errorHidden(*prompt));
   EXPECT_FALSE(prompt->defaultAction()->enabled());
+  type(" .hidden");
+  EXPECT_EQ(errorLine(*prompt), "Choose a different name.") << "what counts is the name without blanks";
+  type("");
+  EXPECT_TRUE(errorHidden(*prompt));
+  EXPECT_EQ(errorLine(*prompt), "");
+  EXPECT_FALSE(prompt->defaultAction()->enabled());
+  EXPECT_FALSE(field.returnKeyEnabled());
   EXPECT_TRUE(tried.empty());
 }
 
@@ -111,6 +158,7 @@ TEST_F(FilenamePromptTest, DoneHandsOverTheTrimmedName) {
   prompt->textField()->userSetText("  Report \n");
   EXPECT_TRUE(prompt->handleDoneAction());
   EXPECT_EQ(tried, std::vector<std::string>{"Report"});
+  EXPECT_TRUE(errorHidden(*prompt)) << "what the callback says of a name that it took is nobody's business";
 }
 
 TEST_F(FilenamePromptTest, AnInvalidNameIsNotTried) {

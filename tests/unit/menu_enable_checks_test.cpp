@@ -136,6 +136,35 @@ TEST_F(MenuEnableChecksTest, AnUnknownPlaceAllowsNoNewFolder) {
   EXPECT_TRUE(MenuEnableChecks::containerHasSubfolders(outside)) << "an unknown container is taken to have some";
 }
 
+TEST_F(MenuEnableChecksTest, AnErrorCountsMoreThanTheContainerThatCameWithIt) {
+  const Error error{CloudDocumentsErrorDomain, 7, {}, "not now", {}};
+  memory.cloud.containerError = error;
+  memory.cloud.containerErrorComesWithValue = true;
+  const std::string line = "Couldn't get container for URL " + Drive.absoluteString() + ": " + error.description();
+  EXPECT_FALSE(mayMakeFolder(Drive));
+  EXPECT_EQ(log().count("ERROR", line), 1u);
+  EXPECT_FALSE(MenuEnableChecks::containerSupportsAnyDepth(*selecting(Drive, {})));
+  EXPECT_EQ(log().count("ERROR", line), 2u);
+  EXPECT_TRUE(MenuEnableChecks::containerHasSubfolders(Drive));
+}
+
+TEST_F(MenuEnableChecksTest, AListOfNoFolderAllowsNothing) {
+  const auto list = std::make_shared<DocumentListController>(std::nullopt);
+  EXPECT_FALSE(MenuEnableChecks::canEnableNewFolderForSelectedItems(*list));
+  EXPECT_TRUE(loggedStarting("ERROR", "Couldn't get container for URL "));
+  EXPECT_FALSE(MenuEnableChecks::containerSupportsAnyDepth(*list));
+}
+
+TEST_F(MenuEnableChecksTest, WhereFoldersAreLimitedOrUnknownOnlyDocumentsMove) {
+  for (const char* levels : {FolderLevelsNone, FolderLevelsOne, "Two"}) {
+    const URL top = addLibrary(levels);
+    EXPECT_FALSE(mayMove(top, {in(top, "a.txt"), folderIn(top, "Plans")})) << levels;
+    EXPECT_TRUE(mayMove(top, {in(top, "a.txt")})) << levels;
+  }
+  const URL top = addLibrary(FolderLevelsAny);
+  EXPECT_TRUE(mayMove(top, {folderIn(top, "Plans")}));
+}
+
 TEST_F(MenuEnableChecksTest, AnyDepthIsSaidOnlyWhereItIsAllowed) {
   const auto any = [this](const std::optional<std::string>& levels) {
     const URL top = addLibrary(levels);
@@ -160,8 +189,43 @@ TEST_F(MenuEnableChecksTest, OnlyRealFoldersAtTheTopCountAsSubfolders) {
   folderIn(top, "Draft.textbundle");
   EXPECT_FALSE(MenuEnableChecks::containerHasSubfolders(file));
   EXPECT_EQ(memory.record.lastOptions, 7u) << "the top level alone";
+  EXPECT_EQ(memory.record.lastKeys, (std::vector<ResourceKey>{ResourceKey::IsDirectory, ResourceKey::IsPackage}));
   folderIn(top, "Plans");
   EXPECT_TRUE(MenuEnableChecks::containerHasSubfolders(file));
+  EXPECT_TRUE(MenuEnableChecks::containerHasSubfolders(top));
+}
+
+TEST_F(MenuEnableChecksTest, TheFirstSubfolderEndsTheSearch) {
+  const URL top = addLibrary(std::nullopt);
+  folderIn(top, "Plans");
+  in(top, "Zebra.txt");
+  EXPECT_TRUE(MenuEnableChecks::containerHasSubfolders(top));
+}
+
+TEST_F(MenuEnableChecksTest, SubfoldersAreThoseOfTheContainersTop) {
+  const URL top = addLibrary(std::nullopt);
+  const URL package = folderIn(top, "Draft.textbundle");
+  folderIn(package, "assets");
+  EXPECT_FALSE(MenuEnableChecks::containerHasSubfolders(package));
+  folderIn(top, "Plans");
+  EXPECT_TRUE(MenuEnableChecks::containerHasSubfolders(package));
+}
+
+TEST_F(MenuEnableChecksTest, WhatIsNotDownloadedIsJudgedByItsMetadata) {
+  const URL top = addLibrary(std::nullopt);
+  const URL far = top.appendingPathComponent("Far");
+  memory.disk.addPromise(far.path()).values[ResourceKey::IsDirectory] = Value(true);
+  EXPECT_TRUE(MenuEnableChecks::containerHasSubfolders(top));
+  memory.disk.items.at(far.path()).values[ResourceKey::IsPackage] = Value(true);
+  EXPECT_FALSE(MenuEnableChecks::containerHasSubfolders(top));
+}
+
+TEST_F(MenuEnableChecksTest, EntriesThatCannotBeReadAreLoggedAndPassed) {
+  const URL top = addLibrary(std::nullopt);
+  folderIn(top, "Plans");
+  memory.files.enumerationError = Error{FileErrorDomain, FileErrorCode::ReadNoPermission, {}, "locked", {}};
+  EXPECT_TRUE(MenuEnableChecks::containerHasSubfolders(top));
+  EXPECT_TRUE(loggedStarting("INFO", "Error enumerating "));
 }
 
 }  // namespace

@@ -130,6 +130,13 @@ TEST_F(NavEditTest, SelectAllTakesEveryItem) {
   EXPECT_TRUE(loggedStarting("DEBUG", "Selected all 2: ("));
 }
 
+TEST_F(NavEditTest, SelectAllWithoutAListSelectsNothing) {
+  nav->pushViewController(std::make_shared<ViewController>(), false);
+  nav->selectAllItems(nullptr);
+  EXPECT_TRUE(logged("INFO", "Pressed SelectAll"));
+  EXPECT_THAT(folder->selectedItems(), ElementsAre());
+}
+
 TEST_F(NavEditTest, AListThatIsNotOnTopChangesNothing) {
   const auto other = makeList(addFolder("Other"));
   nav->initNewListController(other);
