@@ -6,6 +6,8 @@
 #include "fileops/new_folder_prompt.h"
 #include "fileops/rename_prompt.h"
 #include "fileops/ui_utils.h"
+#include "platform/ui/window.h"
+#include "tests/unit/animation_recorder.h"
 #include "tests/unit/app_fixture.h"
 
 namespace vaelo {
@@ -201,6 +203,27 @@ TEST_F(FilenamePromptTest, ReturnIsDone) {
   EXPECT_TRUE(logged("DEBUG", "textFieldShouldReturn"));
 }
 
+TEST_F(FilenamePromptTest, ReturnPutsTheKeyboardAwayBeforeTheAlertGoes) {
+  const auto prompt = make("x");
+  TextField& field = *prompt->textField();
+  field.becomeFirstResponder();
+  EXPECT_TRUE(field.pressReturn());
+  EXPECT_FALSE(field.isEditing());
+}
+
+TEST_F(FilenamePromptTest, TheAlertGoesAnimated) {
+  loadNav();
+  AnimationRecorder recorder;
+  const auto window = std::make_shared<Window>();
+  window->setPresentationHost(&recorder);
+  window->setRootViewController(nav);
+  const auto prompt = make("x");
+  nav->presentViewController(prompt->alert(), false);
+  EXPECT_TRUE(prompt->textField()->pressReturn());
+  EXPECT_EQ(recorder.dismissals, std::vector<bool>{true});
+  window->setPresentationHost(nullptr);
+}
+
 TEST_F(FilenamePromptTest, TheKeyboardThatComesTakesDonesState) {
   const auto prompt = make("x");
   TextField& field = *prompt->textField();
@@ -262,6 +285,13 @@ TEST_F(FilenamePromptTest, ARenamedBookmarkRenamesItsDocument) {
   EXPECT_NE(memory.disk.logicalItem("/home/user/Near.pdf"), nullptr);
   EXPECT_NE(memory.disk.logicalItem(bookmark.path()), nullptr);
   EXPECT_TRUE(logged("DEBUG", "Renaming bookmark " + bookmark.absoluteString() + " (" + outside.absoluteString() + ")"));
+}
+
+TEST_F(FilenamePromptTest, ABookmarkToNothingIsRenamedItself) {
+  const URL bookmark = addFile("Far.vaelobookmark");
+  memory.disk.items.at(bookmark.path()).bookmarkTarget = URL("/home/user/Gone.pdf");
+  EXPECT_EQ(UIUtils::renameItemAtURLToName(bookmark, "Near"), std::nullopt);
+  EXPECT_NE(memory.disk.logicalItem(Drive.appendingPathComponent("Near.vaelobookmark").path()), nullptr);
 }
 
 TEST_F(FilenamePromptTest, AChildScreenIsAddedBeforeItHears) {

@@ -202,6 +202,20 @@ TEST_F(MenuEnableChecksTest, TheFirstSubfolderEndsTheSearch) {
   EXPECT_TRUE(MenuEnableChecks::containerHasSubfolders(top));
 }
 
+TEST_F(MenuEnableChecksTest, AContainerWithoutATopFolderHasNoSubfolders) {
+  const URL file = in(addLibrary(std::nullopt), "a.txt");
+  library->folder.reset();
+  EXPECT_FALSE(MenuEnableChecks::containerHasSubfolders(file));
+}
+
+TEST_F(MenuEnableChecksTest, ALookupThatTellsNothingKnowsNoContainer) {
+  const URL outside = addOutsideFile("/home/user/x");
+  memory.cloud.containerLookupTellsNothing = true;
+  EXPECT_TRUE(MenuEnableChecks::containerHasSubfolders(outside));
+  EXPECT_FALSE(mayMakeFolder(outside));
+  EXPECT_TRUE(loggedStarting("ERROR", "Couldn't get container for URL " + outside.absoluteString() + ": "));
+}
+
 TEST_F(MenuEnableChecksTest, SubfoldersAreThoseOfTheContainersTop) {
   const URL top = addLibrary(std::nullopt);
   const URL package = folderIn(top, "Draft.textbundle");

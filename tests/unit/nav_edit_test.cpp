@@ -60,6 +60,7 @@ TEST_F(NavEditTest, TheToolbarHasThreeButtons) {
   EXPECT_EQ(titleOf(items[2]), "Move");
   EXPECT_EQ(titleOf(items[4]), "Delete");
   EXPECT_GT(items[0]->customView()->frame().width, 0) << "sized to fit";
+  EXPECT_EQ(std::static_pointer_cast<Button>(items[0]->customView())->type(), ButtonType::System);
   EXPECT_TRUE(items[0]->enabled());
   EXPECT_FALSE(items[2]->enabled());
   EXPECT_FALSE(items[4]->enabled());
@@ -82,6 +83,8 @@ TEST_F(NavEditTest, TheSelectionIsCountedAndJudged) {
   edit();
   const BarButtonItemRef newFolder = nav->barButtonNewFolder();
   newFolder->setEnabled(false);
+  folder->setSelectedItems({a});
+  EXPECT_EQ(bar().title(), "selected: 1");
   folder->setSelectedItems({a, b});
   EXPECT_EQ(bar().title(), "selected: 2");
   EXPECT_TRUE(logged("DEBUG", "DLC selected item count is 2"));
@@ -128,6 +131,16 @@ TEST_F(NavEditTest, SelectAllTakesEveryItem) {
   EXPECT_TRUE(logged("INFO", "Pressed SelectAll"));
   EXPECT_TRUE(logged("DEBUG", "DLC has 2 contained items"));
   EXPECT_TRUE(loggedStarting("DEBUG", "Selected all 2: ("));
+}
+
+TEST_F(NavEditTest, TheTitleDoesNotWaitForTheItems) {
+  nav = std::make_shared<NavController>();
+  nav->view();
+  const auto list = makeList(addFolder("Other"));
+  nav->pushViewController(list, false);
+  ASSERT_FALSE(nav->pickerIsAlive());
+  nav->setEditModeAndUpdateUIForViewController(true, list);
+  EXPECT_EQ(list->navigationItem().title(), "Select Items");
 }
 
 TEST_F(NavEditTest, SelectAllWithoutAListSelectsNothing) {

@@ -2,6 +2,7 @@
 #include <gmock/gmock.h>
 
 #include "app/preview_nav_controller.h"
+#include "fileops/filename_prompt.h"
 #include "platform/ui/search_controller.h"
 #include "tests/unit/nav_review_fixture.h"
 
@@ -115,6 +116,26 @@ TEST_F(NavReviewTest, WaysInDismissAtOnceAndSearchResultsAnimated) {
   topList()->startSearchWithQueryStringBecomeFirstResponder("x", true);
   nav->orbPopToURL(addFolder("Plans"));
   EXPECT_THAT(shown.dismissals, ElementsAre(true, true));
+}
+
+TEST_F(NavReviewTest, ANameIsAskedForOverWhatIsVisibleAnimated) {
+  loadShownNav();
+  const auto above = std::make_shared<ViewController>();
+  nav->presentViewController(above, false);
+  shown.changes.clear();
+  nav->showRenamePrompt(addFile("a.txt"));
+  EXPECT_EQ(shown.changes, std::vector<std::string>{"present, animated"});
+  ASSERT_NE(nav->folderPromptAlert(), nullptr);
+  EXPECT_EQ(above->presentedViewController(), nav->folderPromptAlert()->alert());
+}
+
+TEST_F(NavReviewTest, AListThatHasItsItemsHasItsLineWhenItIsShown) {
+  loadShownNav();
+  topList()->itemsLoaded({addFile("a.txt")});
+  const auto list = makeList(addFolder("Plans"));
+  list->itemsLoaded({addFile("Plans/b.txt"), addFile("Plans/c.txt")});
+  nav->pushViewController(list, false);
+  EXPECT_EQ(statusText(), nav->toolbarStatusText(2));
 }
 
 TEST_F(NavReviewTest, OnlyASearchIsDismissedForAChosenFolder) {

@@ -5,6 +5,8 @@
 #include <gmock/gmock.h>
 
 #include "platform/ui/alert_controller.h"
+#include "platform/ui/window.h"
+#include "tests/unit/animation_recorder.h"
 #include "tests/unit/app_fixture.h"
 
 namespace vaelo {
@@ -49,6 +51,16 @@ TEST_F(UIUtilsTest, AnAlertHasOneButtonThatDoesNothing) {
   EXPECT_EQ(alert->actions().front()->handler(), nullptr);
   EXPECT_TRUE(alert->performAction(alert->actions().front()));
   EXPECT_EQ(presentedAlert(), nullptr);
+}
+
+TEST_F(UIUtilsTest, AnAlertComesAnimated) {
+  AnimationRecorder recorder;
+  const auto window = std::make_shared<Window>();
+  window->setPresentationHost(&recorder);
+  window->setRootViewController(nav);
+  UIUtils::showAlertMessageParentViewController("Title", "Message", nav);
+  EXPECT_EQ(recorder.changes, std::vector<std::string>{"present, animated"});
+  window->setPresentationHost(nullptr);
 }
 
 TEST_F(UIUtilsTest, AnAlertNeedsAScreen) {
