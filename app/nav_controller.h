@@ -92,7 +92,7 @@ class NavController : public NavigationController,
   /// The Select button, the Cancel button, and a command that selects everything in the visible list.
   void beginEditMode(const BarButtonItemRef& sender);
   void endEditMode(const BarButtonItemRef& sender);
-  void selectAllItems(const BarButtonItemRef& sender);
+  void selectAllItems(const BarButtonItemRef& sender) override;
   /// The one place where the mode changes.
   void setEditModeAndUpdateUIForViewController(bool edit, const DocumentListControllerRef& list);
   void configureVisibleControllerForMode();

@@ -9,6 +9,7 @@
 #include "host/gtk/host_dialog.h"
 #include "host/gtk/host_screen.h"
 #include "platform/platform.h"
+#include "platform/ui/document_list_controller.h"
 #include "platform/ui/search_controller.h"
 
 namespace vaelo {
@@ -26,12 +27,14 @@ GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds)
   gtk_overlay_set_child(GTK_OVERLAY(overlay_), stack_.widget());
   adw_toast_overlay_set_child(ADW_TOAST_OVERLAY(toasts_), overlay_);
   adw_application_window_set_content(window_, toasts_);
+  g_menu_append(menu_, "Select _All", "win.select-all");
   g_menu_append(menu_, "_Refresh", "win.refresh");
   g_menu_append(menu_, "A_ccounts…", "app.accounts");
   g_menu_append(menu_, "_About Vaelo Drive", "app.about");
   addActions();
   stack_.onSwipedBack([this](std::size_t left) {
     if (const auto controller = navigation()) controller->userWentBackTo(left);
+    followTop();
   });
   for (const char* property : {"notify::default-width", "notify::default-height"}) {
     g_signal_connect_swapped(window_, property, G_CALLBACK(+[](GtkWindowHost* self) { self->sizeChanged(); }), this);
@@ -71,6 +74,12 @@ void GtkWindowHost::addActions() {
        nullptr,
        nullptr,
        {0, 0, 0}},
+      {"select-all",
+       [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkWindowHost*>(self)->selectAll(); },
+       nullptr,
+       nullptr,
+       nullptr,
+       {0, 0, 0}},
       {"back",
        [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkWindowHost*>(self)->goBack(); },
        nullptr,
@@ -89,6 +98,7 @@ void GtkWindowHost::addActions() {
   gtk_shortcut_controller_set_scope(GTK_SHORTCUT_CONTROLLER(shortcuts), GTK_SHORTCUT_SCOPE_GLOBAL);
   constexpr const char* keys[][2] = {{"F5|<Control>r", "win.refresh"},
                                      {"<Control>f", "win.search"},
+                                     {"<Control>a", "win.select-all"},
                                      {"<Alt>Left|Back", "win.back"},
                                      {"Escape", "win.escape"}};
   for (const auto& [trigger, action] : keys) {
@@ -142,6 +152,7 @@ void GtkWindowHost::stackChanged(const Stack&, const Stack& newStack, bool anima
     page->setCanGoBack(!widgets.empty());
     widgets.push_back(page->widget());
   }
+  followTop();
   stack_.setPages(widgets, animated, [this, newStack, done = std::move(done)] {
     std::erase_if(pages_, [&](const auto& entry) {
       return std::none_of(newStack.begin(), newStack.end(),
@@ -199,14 +210,45 @@ void GtkWindowHost::dismiss(const ViewControllerRef& presented, bool, std::funct
   if (done) done();
 }
 
+void GtkWindowHost::followTop() {
+  const auto controller = navigation();
+  const ViewControllerRef top = controller ? controller->topViewController() : nullptr;
+  topToken_.reset();
+  GAction* selects = g_action_map_lookup_action(G_ACTION_MAP(window_), "select-all");
+  g_simple_action_set_enabled(G_SIMPLE_ACTION(selects), std::dynamic_pointer_cast<DocumentListController>(top) != nullptr);
+  if (!top) return;
+  const auto follow = [this](NavigationItem& item) { stack_.setSwipesBack(!item.hidesBackButton()); };
+  topToken_ = top->navigationItem().changed().connect(follow);
+  follow(top->navigationItem());
+}
+
+void GtkWindowHost::selectAll() {
+  const auto controller = navigation();
+  const auto list =
+      controller ? std::dynamic_pointer_cast<DocumentListController>(controller->topViewController()) : nullptr;
+  // What a search found can't be selected.
+  if (!list || list->presentedViewController() || controller->presentedViewController()) return;
+  const BarButtonItemRef select = list->navigationItem().rightBarButtonItem();
+  if (!list->editing() && select) select->press();
+  controller->selectAllItems(nullptr);
+}
+
 void GtkWindowHost::goBack() {
-  if (const auto controller = navigation()) controller->popViewControllerAnimated(true);
+  const auto controller = navigation();
+  const ViewControllerRef top = controller ? controller->topViewController() : nullptr;
+  if (top && !top->navigationItem().hidesBackButton()) controller->popViewControllerAnimated(true);
 }
 
 void GtkWindowHost::escape() {
   ScreenPage* page = topPage();
   if (page && page->closeSearch()) return;
-  goBack();
+  const auto controller = navigation();
+  const ViewControllerRef top = controller ? controller->topViewController() : nullptr;
+  if (!top || !top->navigationItem().hidesBackButton()) return goBack();
+  NavigationItem& bar = top->navigationItem();
+  for (const BarButtonItemRef& item : {bar.leftBarButtonItem(), bar.rightBarButtonItem()}) {
+    if (item && item->systemItem() == SystemItem::Cancel) return item->press();
+  }
 }
 
 namespace {

@@ -44,9 +44,14 @@ class GtkWindowHost : public Window, private NavigationHost, private Presentatio
   void dismiss(const ViewControllerRef& presented, bool animated, std::function<void()> done) override;
 
   std::shared_ptr<NavigationController> navigation() const;
+  /// Unless the screen on top takes the way back away.
   void goBack();
-  /// Escape: leaves a search first, else goes back.
+  /// Escape: leaves a search first, else what can be cancelled, else goes back.
   void escape();
+  /// Selects every item of the list on top.
+  void selectAll();
+  /// Another screen is on top.
+  void followTop();
   ScreenPage* topPage() const;
   void addActions();
   void sizeChanged();
@@ -62,6 +67,7 @@ class GtkWindowHost : public Window, private NavigationHost, private Presentatio
   std::map<ViewController*, std::unique_ptr<ScreenPage>> pages_;
   std::map<ViewController*, GtkWindow*> dialogs_;
   std::map<ViewController*, std::unique_ptr<ActionSheet>> sheets_;
+  std::shared_ptr<void> topToken_;
 };
 
 }  // namespace vaelo

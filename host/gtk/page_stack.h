@@ -21,6 +21,8 @@ class PageStack {
   /// called. A call during a slide ends that slide first.
   void setPages(const std::vector<GtkWidget*>& pages, bool animated, std::function<void()> done);
   const std::vector<GtkWidget*>& pages() const { return pages_; }
+  /// Whether a swipe goes back, as it does from the beginning.
+  void setSwipesBack(bool swipes) { adw_leaflet_set_can_navigate_back(leaflet_, swipes); }
   /// Called when a swipe went back, with the number of pages that are left.
   void onSwipedBack(std::function<void(std::size_t)> handler) { swipedBack_ = std::move(handler); }
 

@@ -48,6 +48,9 @@ class NavigationController : public ViewController {
   std::shared_ptr<NavigationControllerDelegate> delegate() const { return delegate_.lock(); }
   void setDelegate(std::weak_ptr<NavigationControllerDelegate> delegate) { delegate_ = std::move(delegate); }
 
+  /// The platform's command to select all that the top screen shows. `sender` may be null.
+  virtual void selectAllItems(const BarButtonItemRef& /*sender*/) {}
+
   bool toolbarHidden() const { return toolbarHidden_; }
   void setToolbarHidden(bool hidden, bool animated = false);
   double navigationBarHeight() const { return navigationBarHeight_; }
