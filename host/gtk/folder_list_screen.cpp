@@ -18,6 +18,22 @@ GtkWidget* iconButton(const char* icon, const char* label) {
   return button;
 }
 
+int actionOf(ListCommand command) {
+  switch (command) {
+    case ListCommand::Rename:
+      return ItemAction::Rename;
+    case ListCommand::Delete:
+      return ItemAction::Delete;
+    case ListCommand::Details:
+      return ItemAction::Info;
+    case ListCommand::Share:
+      return ItemAction::Share;
+    case ListCommand::Move:
+      break;
+  }
+  return ItemAction::Move;
+}
+
 std::string titleOf(const URL& folder, CloudDocuments& drive) {
   if (drive.isDocumentsContainer(folder)) {
     const Result<CloudContainerRef> container = drive.containerForURL(folder);
@@ -67,14 +83,11 @@ void FolderListScreen::build() {
   events.activated = [this](const std::string& name) { activated(*view_, name, urlOf(name)); };
   events.itemsChanged = [this] { reportItems(); };
   events.folderRemoved = [this] { folderWasRemoved(); };
-  events.selectionChanged = [this] {
-    // Rows that went took their selection along before they were reported.
-    if (reportedRevision_ != view_->model().revision()) reportItems();
-    userSelected(view_->model().selectedRows());
-  };
+  events.selectionChanged = [this] { reportSelection(); };
   events.contextRequested = [this](const std::string& name, GtkWidget* over, const GdkRectangle& at) {
-    offerActions(urlOf(name), over, at);
+    offerActions(urlOf(name), name, over, at);
   };
+  events.offersBySwipe = [this](ListCommand command) { return offers(command); };
   events.commanded = [this](ListCommand command, const std::string& name, GtkWidget* over, const GdkRectangle& at) {
     commanded(command, urlOf(name), over, at);
   };
@@ -91,10 +104,28 @@ void FolderListScreen::followEditing(DocumentListChange change) {
   if (editing() && reportedRevision_ == view_->model().revision()) view_->setSelectedRows(selection());
 }
 
-void FolderListScreen::offerActions(const URL& url, GtkWidget* over, const GdkRectangle& at) {
+void FolderListScreen::reportSelection() {
+  // Rows that went took their selection along before they were reported.
+  if (reportedRevision_ != view_->model().revision()) reportItems();
+  userSelected(view_->model().selectedRows());
+}
+
+void FolderListScreen::beginSelecting(const std::string& row) {
+  const BarButtonItemRef select = navigationItem().rightBarButtonItem();
+  if (editing() || !select) return;
+  select->press();
+  if (!editing()) return;
+  view_->setSelection({row});
+  reportSelection();
+}
+
+void FolderListScreen::offerActions(const URL& url, const std::optional<std::string>& row, GtkWidget* over,
+                                    const GdkRectangle& at) {
   if (editing()) return;
-  showItemActionsMenu(over, at, availableActions(), [self = sharedSelf(this), url, over, at](int action) {
+  const bool selects = row && navigationItem().rightBarButtonItem();
+  showItemActionsMenu(over, at, availableActions(), selects, [self = sharedSelf(this), url, row, over, at](int action) {
     if (action == TagsEntry) return showTagsPopover(over, at, url, self->tags_);
+    if (action == SelectEntry) return self->beginSelecting(*row);
     // What is opened is what a peek has prepared; what can't be peeked at, as a link, is opened as by a tap.
     if (action == ItemAction::FirmpressPop && !self->viewControllerForPreviewing(url)) return self->userSelectedItem(url);
     self->perform(action, url, over, at);
@@ -112,6 +143,8 @@ void FolderListScreen::perform(int action, const URL& url, GtkWidget* over, cons
   userChoseAction(action, url, anchor_, [] {});
 }
 
+bool FolderListScreen::offers(ListCommand command) const { return availableActions() & 1U << actionOf(command); }
+
 void FolderListScreen::commanded(ListCommand command, const URL& url, GtkWidget* over, const GdkRectangle& at) {
   if (editing()) {
     // The toolbar's buttons act on what is selected: new folder, move and delete, with spaces between.
@@ -124,11 +157,7 @@ void FolderListScreen::commanded(ListCommand command, const URL& url, GtkWidget*
     if (button->enabled()) button->press();
     return;
   }
-  const int action = command == ListCommand::Rename    ? ItemAction::Rename
-                     : command == ListCommand::Delete  ? ItemAction::Delete
-                     : command == ListCommand::Details ? ItemAction::Info
-                                                       : ItemAction::Move;
-  if (availableActions() & 1U << action) perform(action, url, over, at);
+  if (offers(command)) perform(actionOf(command), url, over, at);
 }
 
 void FolderListScreen::fill() { view_->setFolder(presentedURL()->path()); }
@@ -237,8 +266,9 @@ void FolderListScreen::showSearch(const std::shared_ptr<SearchController>& searc
     FolderViewEvents events;
     events.activated = [this](const std::string& path) { activated(*results_, path, URL(path)); };
     events.contextRequested = [this](const std::string& path, GtkWidget* over, const GdkRectangle& at) {
-      offerActions(URL(path), over, at);
+      offerActions(URL(path), std::nullopt, over, at);
     };
+    events.offersBySwipe = [this](ListCommand command) { return offers(command); };
     events.commanded = [this](ListCommand command, const std::string& path, GtkWidget* over, const GdkRectangle& at) {
       commanded(command, URL(path), over, at);
     };

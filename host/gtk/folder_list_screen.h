@@ -2,6 +2,8 @@
 #pragma once
 
 #include <memory>
+#include <optional>
+#include <string>
 
 #include "host/gtk/folder_search.h"
 #include "host/gtk/host_screen.h"
@@ -49,7 +51,11 @@ class FolderListScreen : public DocumentListController, public HostScreen {
   void build();
   /// The row `name` of `view`, which stands for `url`.
   void activated(FolderView& view, const std::string& name, const URL& url);
-  void offerActions(const URL& url, GtkWidget* over, const GdkRectangle& at);
+  /// The menu of an item; `row` names its row in the folder's own list, where several can be selected.
+  void offerActions(const URL& url, const std::optional<std::string>& row, GtkWidget* over, const GdkRectangle& at);
+  bool offers(ListCommand command) const;
+  void beginSelecting(const std::string& row);
+  void reportSelection();
   void perform(int action, const URL& url, GtkWidget* over, const GdkRectangle& at);
   void commanded(ListCommand command, const URL& url, GtkWidget* over, const GdkRectangle& at);
   /// Keeps check marks and selection in step with the model.

@@ -15,10 +15,14 @@ struct Entry {
 };
 
 // What a person does most comes first, and what can't be undone last.
-constexpr Entry Entries[] = {
-    {ItemAction::FirmpressPop, "_Open"}, {ItemAction::Share, "_Share…"}, {ItemAction::Info, "_Info"},
-    {ItemAction::Rename, "_Rename…"},    {TagsEntry, "_Tags…"},          {ItemAction::Move, "_Move…"},
-    {ItemAction::Delete, "_Delete…"}};
+constexpr Entry Entries[] = {{ItemAction::FirmpressPop, "_Open"},
+                             {ItemAction::Share, "_Share…"},
+                             {ItemAction::Info, "_Info"},
+                             {ItemAction::Rename, "_Rename…"},
+                             {TagsEntry, "_Tags…"},
+                             {ItemAction::Move, "_Move…"},
+                             {SelectEntry, "Se_lect"},
+                             {ItemAction::Delete, "_Delete…"}};
 
 using Chosen = std::function<void(int)>;
 
@@ -41,11 +45,16 @@ void choose(GSimpleAction*, GVariant* parameter, gpointer data) {
 
 }  // namespace
 
-void showItemActionsMenu(GtkWidget* over, const GdkRectangle& at, unsigned available, std::function<void(int)> chosen) {
+void showItemActionsMenu(GtkWidget* over, const GdkRectangle& at, unsigned available, bool selects,
+                         std::function<void(int)> chosen) {
+  const auto offered = [available, selects](int entry) {
+    if (entry == TagsEntry) return true;
+    return entry == SelectEntry ? selects : (available & 1U << entry) != 0;
+  };
   GMenu* menu = g_menu_new();
   GMenu* section = g_menu_new();
   for (const Entry& entry : Entries) {
-    if (entry.action != TagsEntry && !(available & 1U << entry.action)) continue;
+    if (!offered(entry.action)) continue;
     if (entry.action == ItemAction::Delete) {
       g_menu_append_section(menu, nullptr, G_MENU_MODEL(section));
       g_object_unref(section);

@@ -7,12 +7,15 @@
 
 namespace vaelo {
 
-/// The code of the host's own entry beside those of ItemAction: the item's tags.
+/// The codes of the host's own entries beside those of ItemAction: the item's tags, and the item as the first of a
+/// selection.
 inline constexpr int TagsEntry = 1000;
+inline constexpr int SelectEntry = 1001;
 
 /// Offers the actions of one item in a menu that points at `at`, in the coordinates of `over`. `available` has bit n for the
-/// code n of ItemAction; the tags are always offered. `chosen` gets the code, once, after the menu closed; nothing when the
-/// user changes their mind. Main thread.
-void showItemActionsMenu(GtkWidget* over, const GdkRectangle& at, unsigned available, std::function<void(int)> chosen);
+/// code n of ItemAction; the tags are always offered, to select when `selects` says so. `chosen` gets the code, once, after
+/// the menu closed; nothing when the user changes their mind. Main thread.
+void showItemActionsMenu(GtkWidget* over, const GdkRectangle& at, unsigned available, bool selects,
+                         std::function<void(int)> chosen);
 
 }  // namespace vaelo

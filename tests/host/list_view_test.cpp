@@ -26,6 +26,7 @@ class FolderViewTest : public testing::Test {
                       .readFailed = [this](int error) { error_ = error; },
                       .refreshWanted = nullptr,
                       .commanded = nullptr,
+                      .offersBySwipe = nullptr,
                       .contextRequested = nullptr});
     window_ = gtk_window_new();
     gtk_window_set_default_size(GTK_WINDOW(window_), 400, 500);

@@ -23,6 +23,7 @@ struct Row {
   PangoLayout* name;
   PangoLayout* second;
   bool blank;  // drew nothing, being far from what is seen
+  float uncovered;
 };
 
 struct RowClass {
@@ -151,11 +152,8 @@ bool isNear(Row* row) {
   return bounds.origin.y < 1.5F * page && bounds.origin.y + bounds.size.height > -0.5F * page;
 }
 
-void snapshotRow(GtkWidget* widget, GtkSnapshot* snapshot) {
+void drawContent(GtkWidget* widget, GtkSnapshot* snapshot) {
   Row* row = rowOf(widget);
-  if (!row->item) return;
-  row->blank = !isNear(row);
-  if (row->blank) return;
   FolderItem& item = folderItemOf(row->item);
   makeLayouts(row);
   RowContext& context = *row->context;
@@ -212,6 +210,25 @@ void snapshotRow(GtkWidget* widget, GtkSnapshot* snapshot) {
     if (hasSecond) drawLayout(snapshot, row->second, left(start, textWidth), top + nameHeight, textWidth, dim);
   }
   context.drawn(item);
+}
+
+void snapshotRow(GtkWidget* widget, GtkSnapshot* snapshot) {
+  Row* row = rowOf(widget);
+  if (!row->item) return;
+  row->blank = !isNear(row);
+  if (row->blank) return;
+  if (row->uncovered <= 0) return drawContent(widget, snapshot);
+  const auto width = static_cast<float>(gtk_widget_get_width(widget));
+  const auto height = static_cast<float>(gtk_widget_get_height(widget));
+  const bool rtl = gtk_widget_get_direction(widget) == GTK_TEXT_DIR_RTL;
+  const graphene_rect_t covered = GRAPHENE_RECT_INIT(rtl ? row->uncovered : 0, 0, width - row->uncovered, height);
+  const graphene_point_t aside = GRAPHENE_POINT_INIT(rtl ? row->uncovered : -row->uncovered, 0);
+  gtk_snapshot_push_clip(snapshot, &covered);
+  gtk_snapshot_save(snapshot);
+  gtk_snapshot_translate(snapshot, &aside);
+  drawContent(widget, snapshot);
+  gtk_snapshot_restore(snapshot);
+  gtk_snapshot_pop(snapshot);
 }
 
 void measure(GtkWidget* widget, GtkOrientation orientation, int, int* minimum, int* natural, int*, int*) {
@@ -281,6 +298,7 @@ GtkWidget* folderRowNew(RowContext& context) {
 
 void folderRowSetItem(GtkWidget* widget, GObject* item) {
   Row* row = rowOf(widget);
+  if (row->context && row->context->itemChanges) row->context->itemChanges(widget);
   if (row->item) {
     FolderItem& before = folderItemOf(row->item);
     if (before.row == widget) before.row = nullptr;
@@ -310,6 +328,18 @@ void folderRowItemChanged(GtkWidget* widget) {
   gtk_widget_queue_draw(widget);
 }
 
+bool folderRowMarkIsAt(GtkWidget* widget, double x) {
+  const RowContext* context = rowOf(widget)->context;
+  if (!context || !context->editing || context->grid) return false;
+  const bool rtl = gtk_widget_get_direction(widget) == GTK_TEXT_DIR_RTL;
+  return (rtl ? gtk_widget_get_width(widget) - x : x) < Margin + MarkSize + Gap;
+}
+
+void folderRowSetUncovered(GtkWidget* widget, double pixels) {
+  rowOf(widget)->uncovered = static_cast<float>(pixels);
+  gtk_widget_queue_draw(widget);
+}
+
 void folderRowsScrolled(RowContext& context) {
   for (GtkWidget* row : context.rows) {
     if (rowOf(row)->blank) gtk_widget_queue_draw(row);
@@ -317,5 +347,12 @@ void folderRowsScrolled(RowContext& context) {
 }
 
 GtkWidget* folderRowAt(GtkWidget* widget) { return gtk_widget_get_ancestor(widget, rowGetType()); }
+
+GtkWidget* folderRowIn(GtkWidget* widget) {
+  if (!widget) return nullptr;
+  if (GtkWidget* row = folderRowAt(widget)) return row;
+  GtkWidget* child = gtk_widget_get_first_child(widget);
+  return child ? folderRowAt(child) : nullptr;
+}
 
 }  // namespace vaelo

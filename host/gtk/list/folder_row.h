@@ -18,7 +18,8 @@ struct RowContext {
   bool editing = false;  ///< check marks are shown
   IconTable* icons = nullptr;
   std::function<bool(const FolderItem&)> isSelected;
-  std::function<void(FolderItem&)> drawn;  ///< the item is on screen or about to be
+  std::function<void(FolderItem&)> drawn;           ///< the item is on screen or about to be
+  std::function<void(GtkWidget* row)> itemChanges;  ///< the row is about to show another item, or nothing
   std::unordered_set<GtkWidget*> rows;
 };
 
@@ -34,11 +35,17 @@ void folderRowSetItem(GtkWidget* row, GObject* item);
 GObject* folderRowItem(GtkWidget* row);
 /// The item's details or kind changed.
 void folderRowItemChanged(GtkWidget* row);
+/// Whether a place that far from the row's left edge is at its check mark; never in a grid.
+bool folderRowMarkIsAt(GtkWidget* row, double x);
+/// Moves what the row shows towards its start, so that nothing is drawn on so many pixels at its end.
+void folderRowSetUncovered(GtkWidget* row, double pixels);
 /// The list scrolled or grew: rows that didn't draw while far away look again.
 void folderRowsScrolled(RowContext& context);
 /// The context goes. A row that GTK still holds on to, as while it handles a press, shows nothing any more.
 void folderRowsPart(RowContext& context);
 /// The row at or above `widget`, or null.
 GtkWidget* folderRowAt(GtkWidget* widget);
+/// The same, or the row in `widget`, which may be a list's own item around one, or null.
+GtkWidget* folderRowIn(GtkWidget* widget);
 
 }  // namespace vaelo

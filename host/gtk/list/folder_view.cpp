@@ -72,6 +72,7 @@ FolderView::FolderView()
   makeList();
   connectKeys();
   connectContextGestures();
+  connectDrags();
   // Whoever comes back to a list may have changed what its rows count.
   g_signal_connect_swapped(pages_, "map", G_CALLBACK(+[](FolderView* self) { self->allDetailsAreOld(); }), this);
 }
@@ -81,6 +82,8 @@ FolderView::~FolderView() {
   g_signal_handlers_disconnect_by_data(pages_, this);
   g_signal_handlers_disconnect_by_data(adjustment(), this);
   g_signal_handlers_disconnect_by_data(list_, this);
+  swipe_.reset();
+  markDrag_.reset();
   gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scroller_), nullptr);
   folderRowsPart(context_);
   g_object_unref(pages_);
@@ -98,6 +101,8 @@ void FolderView::makePages() {
                    this);
   const auto look = [](FolderView* self) { folderRowsScrolled(self->context_); };
   g_signal_connect_swapped(adjustment(), "value-changed", G_CALLBACK(+look), this);
+  g_signal_connect_swapped(adjustment(), "value-changed", G_CALLBACK(+[](FolderView* self) { self->swipe_->close(); }),
+                           this);
   g_signal_connect_swapped(adjustment(), "changed", G_CALLBACK(+look), this);
 
   spinner_ = gtk_spinner_new();
@@ -159,6 +164,7 @@ void FolderView::setEditing(bool editing) {
   if (editing == context_.editing) return;
   context_.editing = editing;
   lastPressed_.clear();
+  swipe_->close();
   model_.setSelectable(editing);
   setRubberband();
   if (!editing) setSelection({});
@@ -349,7 +355,7 @@ void FolderView::showPage() {
 }
 
 void FolderView::pressed(guint position) {
-  if (position >= model_.itemCount()) return;
+  if (swipe_->takesPress() || position >= model_.itemCount()) return;
   if (context_.editing) {
     const auto begin = std::exchange(extends_, false) ? model_.indexOf(lastPressed_) : std::nullopt;
     if (begin) {

@@ -14,13 +14,15 @@
 #include "host/gtk/list/folder_monitor.h"
 #include "host/gtk/list/folder_row.h"
 #include "host/gtk/list/icon_table.h"
+#include "host/gtk/list/mark_drag.h"
+#include "host/gtk/list/row_swipe.h"
 #include "host/gtk/list/type_ahead.h"
 #include "host/gtk/list/worker.h"
 
 namespace vaelo {
 
-/// What a key means for a row, or for the selected ones while editing.
-enum class ListCommand { Rename, Delete, Details, Move };
+/// What a key or a swipe means for a row, or a key for the selected ones while editing.
+enum class ListCommand { Rename, Delete, Details, Move, Share };
 
 /// What a FolderView tells its owner. All on the main thread; unset ones are not called. Names are bytes as they stand in
 /// the folder (for promises the item's name), or the paths of supplied entries.
@@ -39,6 +41,8 @@ struct FolderViewEvents {
   std::function<void()> refreshWanted;
   /// F2, Delete, Alt+Return or Control+M on a row, at a place in `view`'s coordinates; while editing, `name` may be empty.
   std::function<void(ListCommand command, const std::string& name, GtkWidget* view, const GdkRectangle& at)> commanded;
+  /// Whether a finger that swipes a row is offered the command; unset: rows don't move.
+  std::function<bool(ListCommand command)> offersBySwipe;
   /// A secondary click, a long press or the menu key on a row, at a place in `view`'s coordinates.
   std::function<void(const std::string& name, GtkWidget* view, const GdkRectangle& at)> contextRequested;
 };
@@ -114,6 +118,8 @@ class FolderView {
   void lookUpChanges();
   void pressed(guint position);
   bool keyPressed(guint key, GdkModifierType modifiers);
+  void connectDrags();
+  std::vector<RowSwipe::Button> swipeButtons(const FolderItem& item);
   void requestContext(double x, double y);
   void requestContextAtFocus();
   bool command(guint key, GdkModifierType modifiers);
@@ -157,6 +163,8 @@ class FolderView {
   AdwStatusPage* errorPage_;
   guint spinnerTimer_ = 0;
   gint64 lastPull_ = 0;
+  std::unique_ptr<RowSwipe> swipe_;
+  std::unique_ptr<MarkDrag> markDrag_;
 };
 
 }  // namespace vaelo

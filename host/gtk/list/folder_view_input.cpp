@@ -1,19 +1,13 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 // Keys and gestures of FolderView.
+#include <glib/gi18n.h>
+
 #include <array>
 
 #include "host/gtk/list/folder_view.h"
 
 namespace vaelo {
 namespace {
-
-/// The row below a list's own item widget, or null.
-GtkWidget* rowInside(GtkWidget* widget) {
-  if (!widget) return nullptr;
-  if (GtkWidget* row = folderRowAt(widget)) return row;
-  GtkWidget* child = gtk_widget_get_first_child(widget);
-  return child ? folderRowAt(child) : nullptr;
-}
 
 FolderItem* itemOfRow(GtkWidget* row) {
   GObject* item = row ? folderRowItem(row) : nullptr;
@@ -26,7 +20,7 @@ FolderItem* FolderView::focusedItem() const {
   GtkRoot* root = gtk_widget_get_root(list_);
   GtkWidget* focus = root ? gtk_root_get_focus(root) : nullptr;
   if (!focus || focus == list_ || !gtk_widget_is_ancestor(focus, list_)) return nullptr;
-  return itemOfRow(rowInside(focus));
+  return itemOfRow(folderRowIn(focus));
 }
 
 void FolderView::connectKeys() {
@@ -42,6 +36,7 @@ void FolderView::connectKeys() {
 }
 
 bool FolderView::keyPressed(guint key, GdkModifierType modifiers) {
+  swipe_->close();
   const bool plain = !(modifiers & (GDK_CONTROL_MASK | GDK_ALT_MASK | GDK_SUPER_MASK | GDK_META_MASK));
   if (key == GDK_KEY_F5) {
     refresh();
@@ -50,6 +45,10 @@ bool FolderView::keyPressed(guint key, GdkModifierType modifiers) {
   if (key == GDK_KEY_Menu || (key == GDK_KEY_F10 && (modifiers & GDK_SHIFT_MASK))) {
     requestContextAtFocus();
     return true;
+  }
+  // The window knows more of it than the list, whose own key it is as well.
+  if (key == GDK_KEY_a && (modifiers & gtk_accelerator_get_default_mod_mask()) == GDK_CONTROL_MASK) {
+    return gtk_widget_activate_action(widget(), "win.select-all", nullptr);
   }
   if (command(key, modifiers)) return true;
   const gint64 now = g_get_monotonic_time();
@@ -77,9 +76,10 @@ void FolderView::connectContextGestures() {
   // The list tells of presses without their modifiers.
   GtkGesture* any = gtk_gesture_click_new();
   gtk_event_controller_set_propagation_phase(GTK_EVENT_CONTROLLER(any), GTK_PHASE_CAPTURE);
-  const auto note = [](GtkGesture* gesture, int, double, double, FolderView* self) {
+  const auto note = [](GtkGesture* gesture, int, double x, double y, FolderView* self) {
     const GdkModifierType held = gtk_event_controller_get_current_event_state(GTK_EVENT_CONTROLLER(gesture));
     self->extends_ = held & GDK_SHIFT_MASK;
+    self->swipe_->pressedAt(x, y);
   };
   g_signal_connect(any, "pressed", G_CALLBACK(+note), this);
   gtk_widget_add_controller(scroller_, GTK_EVENT_CONTROLLER(any));
@@ -94,6 +94,8 @@ void FolderView::connectContextGestures() {
   // In the capture phase, so that it can keep the row from taking the same press for an activation.
   gtk_event_controller_set_propagation_phase(GTK_EVENT_CONTROLLER(press), GTK_PHASE_CAPTURE);
   g_signal_connect(press, "pressed", G_CALLBACK(+[](GtkGesture* gesture, double x, double y, FolderView* self) {
+                     // Whoever selects may think before the finger goes on.
+                     if (self->context_.editing) return;
                      gtk_gesture_set_state(gesture, GTK_EVENT_SEQUENCE_CLAIMED);
                      self->requestContext(x, y);
                    }),
@@ -101,8 +103,34 @@ void FolderView::connectContextGestures() {
   gtk_widget_add_controller(scroller_, GTK_EVENT_CONTROLLER(press));
 }
 
+void FolderView::connectDrags() {
+  swipe_ = std::make_unique<RowSwipe>(scroller_, context_, [this](FolderItem& item) { return swipeButtons(item); });
+  markDrag_ = std::make_unique<MarkDrag>(scroller_, context_, model_);
+}
+
+std::vector<RowSwipe::Button> FolderView::swipeButtons(const FolderItem& item) {
+  std::vector<RowSwipe::Button> buttons;
+  if (!events_.offersBySwipe) return buttons;
+  const std::string name = item.name;
+  if (events_.contextRequested) {
+    buttons.push_back({"view-more-horizontal-symbolic", _("More"), nullptr,
+                       [this, name](const GdkRectangle& at) { events_.contextRequested(name, scroller_, at); }});
+  }
+  const auto add = [&](ListCommand command, const char* icon, const char* label, const char* style) {
+    if (!events_.offersBySwipe(command)) return;
+    buttons.push_back({icon, label, style, [this, name, command](const GdkRectangle& at) {
+                         const FolderItem* shown = model_.liveItem(name);
+                         const auto row = shown ? placeOf(*shown) : std::nullopt;
+                         events_.commanded(command, name, scroller_, row.value_or(at));
+                       }});
+  };
+  add(ListCommand::Share, "emblem-shared-symbolic", _("Share"), "suggested-action");
+  add(ListCommand::Delete, "user-trash-symbolic", _("Delete"), "destructive-action");
+  return buttons;
+}
+
 void FolderView::requestContext(double x, double y) {
-  FolderItem* item = itemOfRow(rowInside(gtk_widget_pick(scroller_, x, y, GTK_PICK_DEFAULT)));
+  FolderItem* item = itemOfRow(folderRowIn(gtk_widget_pick(scroller_, x, y, GTK_PICK_DEFAULT)));
   if (!item || !events_.contextRequested) return;
   const GdkRectangle at{static_cast<int>(x), static_cast<int>(y), 1, 1};
   events_.contextRequested(std::string(item->name), scroller_, at);

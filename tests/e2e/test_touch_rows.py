@@ -1,0 +1,129 @@
+# SPDX-License-Identifier: GPL-3.0-or-later
+"""Fingers on the rows of a list: swipes that uncover buttons, a long press, and a drag down the check marks."""
+import unittest
+
+from harness import pause, wait_for
+from touch_display import BEGIN, END, TouchApp
+
+LONG_PRESS = 0.8
+
+
+class Rows(unittest.TestCase):
+    environment = {}
+    towards_start = -1
+
+    def setUp(self):
+        def prepare(app):
+            app.drive.mkdir(parents=True)
+            (app.data / "account.ini").write_text("[Account]\nName=x\nToken=ab\nSignedIn=true\n")
+            (app.drive / "Plans").mkdir()
+            for i in range(1, 7):
+                (app.drive / f"Note {i}.txt").write_text(f"{i}")
+        self.app = TouchApp(size=(400, 720), screen=(800, 740), prepare=prepare, **self.environment)
+        self.addCleanup(self.app.close)
+        self.app.wait("Note 1.txt", "list item")
+        self.drive = self.app.drive
+        self.screen = self.app.desktop.screen
+
+    def swipe(self, item, length, seconds=0.4):
+        """A finger that begins in the middle of the row and moves so far towards the row's start."""
+        x, y = self.app.place(self.app.wait(item, "list item"))
+        x -= self.towards_start * 100
+        self.screen.drag((x, y), (x + self.towards_start * length, y + 3), seconds)
+
+    def uncovered(self):
+        return [row[1] for row in self.app.accessibility.showing() if row[0] == "push button" and row[3] > 46 and
+                row[1] in ("More", "Share", "Delete")]
+
+    def hold(self, item):
+        x, y = self.app.place(self.app.wait(item, "list item"))
+        self.screen.touch(BEGIN, x, y)
+        pause(LONG_PRESS)
+        self.screen.touch(END, x, y)
+
+
+class Swipes(Rows):
+    def test_delete_asks_and_deletes(self):
+        app = self.app
+        self.swipe("Note 3.txt", 180)
+        wait_for("the buttons", lambda: self.uncovered() == ["More", "Share", "Delete"])
+        app.tap("Delete", "push button")
+        app.wait("\"Note 3.txt\" will be permanently deleted")
+        app.tap("Delete from Vaelo Drive", "push button")
+        wait_for("the file to go", lambda: not (self.drive / "Note 3.txt").exists())
+        app.wait_gone("Note 3.txt")
+        self.assertEqual(self.uncovered(), [])
+
+    def test_share_and_more_lead_on(self):
+        app = self.app
+        self.swipe("Note 2.txt", 180)
+        app.tap("More", "push button")
+        app.wait("Rename…", "menu item")
+        app.key("Escape")
+        app.wait_gone("Rename…")
+        self.swipe("Note 2.txt", 180)
+        app.tap("Share", "push button")
+        app.wait_log("Activity (share) action: ")
+
+    def test_a_tap_elsewhere_covers_them_and_opens_nothing(self):
+        app = self.app
+        self.swipe("Note 1.txt", 180)
+        wait_for("the buttons", self.uncovered)
+        app.tap("Plans", "list item")
+        wait_for("the buttons to go", lambda: not self.uncovered())
+        app.wait_title("Vaelo Drive")
+        app.tap("Plans", "list item")
+        app.wait_title("Plans")
+
+    def test_one_row_at_a_time_and_back_by_a_swipe(self):
+        self.swipe("Note 1.txt", 180)
+        wait_for("the buttons", self.uncovered)
+        self.swipe("Note 2.txt", 180)
+        wait_for("one row's buttons", lambda: self.uncovered() == ["More", "Share", "Delete"])
+        self.swipe("Note 2.txt", -150)
+        wait_for("the buttons to go", lambda: not self.uncovered())
+        self.app.wait_title("Vaelo Drive")
+
+    def test_a_short_swipe_turns_back_and_a_flick_goes_on(self):
+        self.swipe("Note 1.txt", 60, seconds=0.8)
+        wait_for("the buttons to go", lambda: not self.uncovered())
+        self.app.wait_title("Vaelo Drive")
+        self.swipe("Note 1.txt", 80, seconds=0.12)
+        wait_for("the buttons", lambda: self.uncovered() == ["More", "Share", "Delete"])
+
+
+class SwipesFromTheRight(Rows):
+    environment = {"LC_ALL": "C.UTF-8", "LANGUAGE": "ar"}
+    towards_start = 1
+
+    def test_the_buttons_are_at_the_rows_end(self):
+        self.swipe("Note 3.txt", 180)
+        rows = wait_for("the buttons", lambda: [row for row in self.app.accessibility.showing() if row[0] == "push button" and
+                                                row[3] > 46 and row[2] < 220 and row[3] < 600])
+        self.assertEqual(len(rows), 3)
+
+
+class Selecting(Rows):
+    def test_a_long_press_offers_to_begin_and_its_menu_stays(self):
+        app = self.app
+        self.hold("Note 4.txt")
+        app.wait("Select", "menu item")
+        app.key("l")
+        app.wait_title("1 Item Selected")
+        app.tap("Note 5.txt", "list item")
+        app.wait_title("2 Items Selected")
+
+    def test_a_finger_along_the_marks_sets_them_and_clears_them(self):
+        app = self.app
+        app.tap("Select", "push button")
+        app.wait_title("Select Items")
+        _, y = app.place(app.wait("Note 2.txt", "list item"))
+        _, to_y = app.place(app.wait("Note 5.txt", "list item"))
+        self.screen.drag((22, y), (22, to_y), 0.5)
+        app.wait_title("4 Items Selected")
+        self.screen.drag((22, to_y), (22, y + (to_y - y) // 2 + 10), 0.5)
+        app.wait_title("2 Items Selected")
+
+
+if __name__ == "__main__":
+    unittest.main()
