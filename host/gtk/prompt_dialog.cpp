@@ -7,6 +7,8 @@
 
 #include "host/gtk/mirrored_field.h"
 #include "host/gtk/mirrored_text.h"
+#include "platform/platform.h"
+#include "platform/ui/keyboard_notice.h"
 
 namespace vaelo {
 
@@ -159,6 +161,8 @@ GtkWindow* showPromptDialog(const std::shared_ptr<AlertController>& alert, GtkWi
   auto* dialog = new PromptDialog(alert, over);
   gtk_window_present(dialog->window());
   alert->textFields().front()->becomeFirstResponder();
+  // Whether a keyboard lies on the screen or on the table: its return key begins as enabled as the action it stands for.
+  Platform::current().notifications.post({KeyboardWillShowNotification, KeyboardNotice().userInfo()});
   if (shown) shown();
   return dialog->window();
 }
