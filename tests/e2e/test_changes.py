@@ -45,6 +45,28 @@ class Names(ItemsWindow):
         app.wait_gone("Enter a new name for this item.")
         self.assertEqual(content(self.drive), before)
 
+    def test_done_and_return_work_for_a_valid_name_alone(self):
+        app = self.app
+        app.click("Select", "push button")
+        app.click("New Folder", "push button")
+        app.wait("Enter a name for this folder.")
+
+        def done():
+            return app.find("Create", "push button")[6]
+        self.assertFalse(done())
+        app.key("Return")
+        app.type(".hidden")
+        app.wait("Choose a different name.")
+        self.assertFalse(done())
+        app.key("Return")
+        app.key("ctrl+a")
+        app.type("  Letters ")
+        wait_for("Create to be enabled", done)
+        self.assertNotIn("textFieldShouldReturn", app.log())
+        app.key("Return")
+        self.on_disk("Letters")
+        app.wait_log("textFieldShouldReturn")
+
     def test_a_rename_is_taken_back(self):
         self.rename("Report.txt", "Summary.txt")
         self.on_disk("Summary.txt")
@@ -212,6 +234,46 @@ class Keys(ItemsWindow):
         self.delete_for_good()
         self.on_disk("Third.txt", False)
         self.on_disk("Report.txt")
+
+    def test_shift_selects_up_to_the_press(self):
+        app = self.app
+        self.choose("Plans")
+        x, y = app.place(app.wait("Third.txt", "list item"))
+        app.mouse("keydown", "shift", "mousemove", "--sync", str(x), str(y), "click", "1", "keyup", "shift")
+        app.wait_title("4 Items Selected")
+
+    def test_control_a_selects_all_and_escape_ends_the_selecting(self):
+        app = self.app
+        self.focus("Report.txt")
+        app.key("ctrl+a")
+        app.wait_title("6 Items Selected")
+        app.wait_log("================= Pressed SelectAll")
+        app.key("Escape")
+        app.wait_title("Vaelo Drive")
+        app.wait_log("================= Pressed Cancel (end edit)")
+        # The focus is in the header bar now.
+        app.click("Select", "push button")
+        app.wait_title("Select Items")
+        app.key("ctrl+a")
+        app.wait_title("6 Items Selected")
+
+    def test_the_menu_of_an_item_begins_the_selecting_with_it(self):
+        self.menu("Second.txt", "l")
+        self.app.wait_title("1 Item Selected")
+        self.app.click("Third.txt", "list item")
+        self.app.wait_title("2 Items Selected")
+
+    def test_selecting_keeps_the_folder(self):
+        app = self.app
+        app.click("Plans", "list item")
+        app.wait_title("Plans")
+        app.click("Select", "push button")
+        app.wait_title("Select Items")
+        app.key("alt+Left")
+        app.click("Cancel", "push button")
+        app.wait_title("Plans")
+        app.key("alt+Left")
+        app.wait_title("Vaelo Drive")
 
     def test_a_drag_selects_what_it_passes(self):
         app = self.app
