@@ -2,6 +2,8 @@
 """Fingers on the rows of a list: swipes that uncover buttons, a long press, and a drag down the check marks."""
 import unittest
 
+from PIL import Image
+
 from harness import pause, wait_for
 from touch_display import BEGIN, END, TouchApp
 
@@ -95,6 +97,20 @@ class Swipes(Rows):
 class SwipesFromTheRight(Rows):
     environment = {"LC_ALL": "C.UTF-8", "LANGUAGE": "ar"}
     towards_start = 1
+
+    def test_names_stand_beside_their_icons(self):
+        (self.drive / "\u05e9\u05dc\u05d5\u05dd.txt").write_text("read from the right")
+        row = self.app.wait("\u05e9\u05dc\u05d5\u05dd", "list item")
+        for row in (row, self.app.wait("Plans", "list item")):
+            x, y = self.app.place(row)
+            left, width = x - row[4] // 2, row[4]
+
+            def inked(start, end):
+                picture = Image.open(self.app.screenshot()).convert("L")
+                part = picture.crop((left + start, y - row[5] // 2 + 4, left + end, y + row[5] // 2 - 4))
+                lightest, darkest = reversed(part.getextrema())
+                return lightest - darkest > 60
+            wait_for(f"“{row[1]}” at its place", lambda: inked(width - 140, width - 60) and not inked(0, width // 2))
 
     def test_the_buttons_are_at_the_rows_end(self):
         self.swipe("Note 3.txt", 180)

@@ -68,10 +68,10 @@ PangoLayout* makeLayout(GtkWidget* widget, const std::string& text, bool small, 
     pango_layout_set_attributes(layout, attributes);
     pango_attr_list_unref(attributes);
   }
-  // Text stands at the row's start, whichever way the name itself is read.
+  // Text stands at the row's start, whichever way the name itself is read: "left" is where the row begins, but for a text
+  // that is read from the right it is where the row ends.
   const bool readRtl = pango_layout_get_direction(layout, 0) == PANGO_DIRECTION_RTL;
-  const bool against = readRtl != (gtk_widget_get_direction(widget) == GTK_TEXT_DIR_RTL);
-  pango_layout_set_alignment(layout, centered ? PANGO_ALIGN_CENTER : against ? PANGO_ALIGN_RIGHT : PANGO_ALIGN_LEFT);
+  pango_layout_set_alignment(layout, centered ? PANGO_ALIGN_CENTER : readRtl ? PANGO_ALIGN_RIGHT : PANGO_ALIGN_LEFT);
   return layout;
 }
 
