@@ -3,6 +3,8 @@
 
 #include <functional>
 #include <memory>
+#include <string>
+#include <vector>
 
 #include "tests/support/memory_dispatch_queue.h"
 #include "tests/support/memory_operation_queue.h"
@@ -23,10 +25,18 @@ class MemoryQueues : public Queues {
     return std::make_shared<MemoryOperationQueue>(clock_, name, quality);
   }
   std::unique_ptr<TimerSource> makeTimer(std::shared_ptr<DispatchQueue> queue, std::chrono::nanoseconds interval,
-                                         std::chrono::nanoseconds, Block handler) override {
+                                         std::chrono::nanoseconds leeway, Block handler) override {
+    timers.push_back({queue ? queue->label() : "", interval, leeway});
     return std::make_unique<MemoryTimer>(queue ? std::move(queue) : makeSerialQueue("timer"), interval, std::move(handler));
   }
   Date now() override { return clock_->date(); }
+
+  struct AskedTimer {
+    std::string queue;  ///< its label
+    std::chrono::nanoseconds interval;
+    std::chrono::nanoseconds leeway;
+  };
+  std::vector<AskedTimer> timers;  ///< all that were asked for
 
   /// Where a test wants other queues, with real threads.
   std::function<std::shared_ptr<OperationQueue>(const std::string&, QualityOfService)> makesOperationQueue;

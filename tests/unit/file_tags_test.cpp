@@ -73,6 +73,72 @@ TEST_F(FileTagsTest, LabelsBeyondTheTableAreGreyAndNamesMayRepeat) {
   EXPECT_EQ(FileTags::tagColorsByTag().at("Twice"), Color::systemGreen());
 }
 
+TEST_F(FileTagsTest, TheTableEndsAtSeven) {
+  store(2, {tag("Seven", 7), tag("Eight", 8), tag("Most", ~std::uint64_t{0})});
+  EXPECT_EQ(FileTags::tagColorsByTag().at("Seven"), Color::systemOrange());
+  EXPECT_EQ(FileTags::tagColorsByTag().at("Eight"), FileTags::_tagBlipColors()[0]);
+  EXPECT_EQ(FileTags::tagColorsByTag().at("Most"), FileTags::_tagBlipColors()[0]);
+}
+
+TEST_F(FileTagsTest, ALabelThatIsNoNumberOfTheTableIsNoColour) {
+  const auto named = [](const char* name, Value label) { return Value(Dictionary{{"n", name}, {"l", std::move(label)}}); };
+  store(2, {Value(Dictionary{{"n", "Without"}}), named("Negative", Value(std::int64_t{-1})), named("Text", Value("6")),
+            named("List", Value(Array{})), named("Signed", Value(std::int64_t{6})), named("Real", Value(6.9))});
+  const auto colors = FileTags::tagColorsByTag();
+  for (const char* name : {"Without", "Negative", "Text", "List"}) {
+    EXPECT_EQ(colors.at(name), FileTags::_tagBlipColors()[0]) << name;
+  }
+  EXPECT_EQ(colors.at("Signed"), Color::systemRed());
+  EXPECT_EQ(colors.at("Real"), Color::systemRed());
+}
+
+TEST_F(FileTagsTest, ListsOfOtherKindsHoldNoTags) {
+  for (const Value& list :
+       {Value("Work"), Value(std::uint64_t{2}), Value(Dictionary{{"n", "Work"}}), Value(Array{}), Value()}) {
+    store(2, {tag("Before", 6)});
+    memory.syncedStore.values["RoverTagDict"] =
+        Value(Dictionary{{"RoverTagDictVersion", Value(std::uint64_t{2})}, {"RoverTags", list}});
+    memory.log.clear();
+    FileTags::_tagColorsDidChange();
+    EXPECT_THAT(FileTags::allTags(), IsEmpty()) << "none is left from before";
+    EXPECT_THAT(FileTags::tagColorsByTag(), IsEmpty());
+    EXPECT_FALSE(memory.log.has("WARNING", "Rover tag dictionary is empty")) << "it holds its version";
+  }
+}
+
+TEST_F(FileTagsTest, VersionsOfOtherKindsAreReadAsNumbers) {
+  const auto accepts = [this](Value version) {
+    memory.syncedStore.values["RoverTagDict"] =
+        Value(Dictionary{{"RoverTagDictVersion", std::move(version)}, {"RoverTags", Value(Array{tag("Work", 6)})}});
+    FileTags::_tagColorsDidChange();
+    return !FileTags::allTags().empty();
+  };
+  EXPECT_TRUE(accepts(Value(std::int64_t{2})));
+  EXPECT_TRUE(accepts(Value(2.0)));
+  memory.log.clear();
+  EXPECT_FALSE(accepts(Value("2")));
+  EXPECT_TRUE(memory.log.has("DEBUG", "Rover tag dictionary has incorrect version (0, should be 2)"));
+  EXPECT_FALSE(accepts(Value(std::int64_t{-2})));
+  EXPECT_TRUE(memory.log.has("DEBUG", "Rover tag dictionary has incorrect version (18446744073709551614, should be 2)"));
+}
+
+TEST_F(FileTagsTest, TenThousandTagsAndNamesOfControlCharactersAreKept) {
+  Array tags;
+  for (int i = 0; i < 10'000; ++i) {
+    tags.push_back(tag(("Tag " + std::to_string(i)).c_str(), static_cast<std::uint64_t>(i % 8)));
+  }
+  const std::string odd("a\nb\0\x1b[31m\x7f", 10);
+  tags.push_back(Value(Dictionary{{"n", Value(odd)}, {"l", Value(std::uint64_t{4})}}));
+  store(2, std::move(tags));
+  const std::vector<std::string> names = FileTags::allTags();
+  ASSERT_EQ(names.size(), 10'001u);
+  EXPECT_EQ(names[9'999], "Tag 9999");
+  EXPECT_EQ(names[10'000], odd);
+  const auto colors = FileTags::tagColorsByTag();
+  EXPECT_EQ(colors.at("Tag 9999"), Color::systemOrange()) << "9999 is 7 more than 1249 times 8";
+  EXPECT_EQ(colors.at(odd), Color::systemBlue());
+}
+
 TEST_F(FileTagsTest, WhatIsNoNamedTagIsPassedOver) {
   store(2, {Value("text"), Value(Dictionary{{"l", Value(std::uint64_t{2})}}), tag("Work", 6)});
   EXPECT_THAT(FileTags::allTags(), ElementsAre("Work"));
@@ -135,6 +201,26 @@ TEST_F(ColorBlendTest, NoColourATransparentOneAndAnUnknownModeChangeNothing) {
   EXPECT_EQ(blend(d, s, "exclusion"), d);
 }
 
+// Epsilon is 1.19e-7.
+TEST_F(ColorBlendTest, AnAlphaIsNothingUpToEpsilonOnEitherSide) {
+  for (const char* mode : {CompositingFilter::SourceOver, CompositingFilter::Multiply}) {
+    EXPECT_EQ(blend(d, s.withAlpha(1.1e-7), mode), d);
+    EXPECT_EQ(blend(d, s.withAlpha(-1.1e-7), mode), d);
+    EXPECT_FALSE(blend(d, s.withAlpha(1.3e-7), mode) == d);
+    EXPECT_FALSE(blend(d, s.withAlpha(-0.5), mode) == d);
+  }
+  // 0.5 + 0.5 * (1e-7 - 1) = 5e-8
+  expectNear(blend(d.withAlpha(1e-7 - 1), s, CompositingFilter::SourceOver), 1, 1, 1, 5e-8);
+}
+
+TEST_F(ColorBlendTest, AllButSourceOverKeepTheBackdropsAlpha) {
+  for (const char* mode : {CompositingFilter::Multiply, CompositingFilter::Screen, CompositingFilter::Overlay,
+                           CompositingFilter::Darken, CompositingFilter::Lighten, CompositingFilter::ColorDodge,
+                           CompositingFilter::ColorBurn, CompositingFilter::PlusLighter, CompositingFilter::PlusDarker}) {
+    EXPECT_EQ(blend(d.withAlpha(0.25), s, mode).alpha, 0.25) << mode;
+  }
+}
+
 TEST_F(ColorBlendTest, SourceOver) {
   // alpha 0.5 + 0.5 * 0.5 = 0.75; red (0.25 + 0.05) / 0.75, green (0.125 + 0.125) / 0.75, blue (0.5 + 0.2) / 0.75
   expectNear(vlo_colorBlendedWithColor(d, s), 0.4, 1.0 / 3, 0.7 / 0.75, 0.75);
@@ -159,7 +245,15 @@ TEST_F(ColorBlendTest, OverlayDarkenLighten) {
   expectNear(blend(d, s, CompositingFilter::Lighten), 0.35, 0.5, 0.9, 0.5);
 }
 
+// d decides: 2 * 0.8 * 0.2; 1 - 2 * 0.7 * 0.4; 2 * 0.4 * 0.3
+TEST_F(ColorBlendTest, OverlayIsDecidedByTheBackdrop) {
+  expectNear(blend({0.2, 0.6, 0.3, 1}, {0.8, 0.3, 0.4, 1}, CompositingFilter::Overlay), 0.32, 0.44, 0.24, 1);
+}
+
 TEST_F(ColorBlendTest, DodgeAndBurnHaveTheirGuardsAndNoClamps) {
+  // 0.9 / (1 - 0.5); 0.9 / (1 - 2); s of 1e-8 is none
+  const Color bright = blend({0.9, 0.9, 0.9, 1}, {0.5, 2, 1e-8, 1}, CompositingFilter::ColorDodge);
+  expectNear(bright, 1.8, -0.9, 1, 1);
   // dodge: 0.2 / 0.5 = 0.4, 0.5 / 0.75, 0.8 / 0 = infinity (the guard looks at s)
   const Color dodged = blend(d, s, CompositingFilter::ColorDodge);
   EXPECT_NEAR(dodged.red, 0.3, 1e-12);
@@ -177,6 +271,19 @@ TEST_F(ColorBlendTest, PlusLighterAndPlusDarker) {
   // t = 1; u = (0.5 - 0.5 s) + (0.5 - d): 0.25 + 0.3, 0.375 + 0, 0 - 0.3 -> 0; out 1 - u / 0.5 clamped
   expectNear(blend(d, s, CompositingFilter::PlusDarker), 0, 0.25, 1, 0.5);
   expectNear(blend(d.withAlpha(0), s, CompositingFilter::PlusDarker), 0, 0, 0, 0);
+}
+
+TEST_F(ColorBlendTest, PlusDarkerClampsAtEachStep) {
+  // t: 1 + 1 is 1; u = 0.2 + 0.3, 0.9 + 0.8 is 1, 0 + 0; out = t - u
+  expectNear(blend({0.7, 0.2, 1, 1}, {0.8, 0.1, 1, 1}, CompositingFilter::PlusDarker), 0.5, 0, 1, 1);
+  // t = 0.7; u = 0 + 0.4 - 0.8 is 0
+  expectNear(blend({0.8, 0.8, 0.8, 0.4}, {1, 1, 1, 0.3}, CompositingFilter::PlusDarker), 0.7, 0.7, 0.7, 0.4);
+  // A = 2: t is 1; u = (1 - 0.1) + (2 - 1.2) = 1.7 is 1; 1 - 1 / 2
+  expectNear(blend({1.2, 1.2, 1.2, 2}, {0.1, 0.1, 0.1, 1}, CompositingFilter::PlusDarker), 0.5, 0.5, 0.5, 2);
+  // An alpha below epsilon is none: t - 0 / A would be 0.5.
+  expectNear(blend({0.8, 0.8, 0.8, 1e-8}, {1, 1, 1, 0.5}, CompositingFilter::PlusDarker), 0, 0, 0, 1e-8);
+  // t = 0, which ends it: 0 - 0.5 / -0.5 would be 1.
+  expectNear(blend({-1, -1, -1, -0.5}, {1, 1, 1, 0.5}, CompositingFilter::PlusDarker), 0, 0, 0, -0.5);
 }
 
 }  // namespace

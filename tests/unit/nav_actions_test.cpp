@@ -19,8 +19,10 @@ class NavActionsTest : public AppFixture {
     log().clear();
   }
   void act(int action, const URL& url) {
-    nav->documentListControllerPerformActionURLOriginatingViewCompletion(topList(), action, url, row,
-                                                                         [this] { ++completions; });
+    nav->documentListControllerPerformActionURLOriginatingViewCompletion(topList(), action, url, row, [this] {
+      ++completions;
+      if (whenCompleted) whenCompleted();
+    });
   }
   std::shared_ptr<MemoryDocumentInteraction> sheet() { return memory.screens.interactions.back(); }
   bool banner(const std::string& label) { return logged("INFO", "================= " + label); }
@@ -28,6 +30,7 @@ class NavActionsTest : public AppFixture {
   const URL file = addFile("a.txt");
   const std::shared_ptr<View> row = std::make_shared<View>(Rect{5, 6, 300, 50});
   int completions = 0;
+  std::function<void()> whenCompleted;
 };
 
 TEST_F(NavActionsTest, DeleteAsksAtTheRowAndCompletesWithTheAnswer) {
@@ -36,10 +39,18 @@ TEST_F(NavActionsTest, DeleteAsksAtTheRowAndCompletesWithTheAnswer) {
   ASSERT_NE(presentedAlert(), nullptr);
   EXPECT_EQ(presentedAlert()->popoverAnchor()->sourceView.lock(), row);
   EXPECT_EQ(completions, 0);
-  EXPECT_TRUE(nav->performActionCompletionBlock());
+  ASSERT_TRUE(nav->performActionCompletionBlock());
   presentedAlert()->performAction(presentedAlert()->actions().at(0));
   EXPECT_EQ(completions, 1);
   EXPECT_EQ(memory.disk.logicalItem(file.path()), nullptr);
+}
+
+TEST_F(NavActionsTest, DeletingOneItemLeavesEditModeAsItIs) {
+  nav->setEditModeAndUpdateUIForViewController(true, topList());
+  act(ItemAction::Delete, file);
+  presentedAlert()->performAction(presentedAlert()->actions().at(0));
+  EXPECT_EQ(memory.disk.logicalItem(file.path()), nullptr);
+  EXPECT_TRUE(nav->editMode());
 }
 
 TEST_F(NavActionsTest, ARefusedDeleteCompletesAtOnce) {
@@ -56,6 +67,9 @@ TEST_F(NavActionsTest, MoreIsAnErrorThatCompletesNothing) {
 }
 
 TEST_F(NavActionsTest, InfoShowsTheDetails) {
+  whenCompleted = [this] {
+    EXPECT_NE(std::dynamic_pointer_cast<PreviewDetailsViewController>(nav->topViewController()), nullptr);
+  };
   act(ItemAction::Info, file);
   EXPECT_TRUE(banner("DLC Action Info"));
   EXPECT_TRUE(logged("INFO", "Info action: " + file.absoluteString()));
@@ -65,6 +79,7 @@ TEST_F(NavActionsTest, InfoShowsTheDetails) {
 }
 
 TEST_F(NavActionsTest, RenameAsksAndCompletesMeanwhile) {
+  whenCompleted = [this] { EXPECT_NE(presentedAlert(), nullptr); };
   act(ItemAction::Rename, file);
   EXPECT_TRUE(banner("DLC Action Rename"));
   EXPECT_TRUE(logged("INFO", "Rename action: " + file.absoluteString()));
@@ -73,6 +88,7 @@ TEST_F(NavActionsTest, RenameAsksAndCompletesMeanwhile) {
 }
 
 TEST_F(NavActionsTest, MoveOffersFolders) {
+  whenCompleted = [this] { EXPECT_NE(nav->presentedViewController(), nullptr); };
   addFolder("Plans");
   act(ItemAction::Move, file);
   EXPECT_TRUE(banner("DLC Action Move"));
@@ -83,7 +99,27 @@ TEST_F(NavActionsTest, MoveOffersFolders) {
   EXPECT_EQ(completions, 1);
 }
 
+TEST_F(NavActionsTest, MoveAsksForANewFolderInTheFolderOfTheList) {
+  const auto library = memory.cloud.addContainer("org~example~Notes", "Notes");
+  const URL top = *library->documentsFolderURL();
+  const URL note = top.appendingPathComponent("a.txt");
+  memory.disk.add(note.path());
+  memory.cloud.movesAreFree = false;
+  nav->pushViewController(makeList(top), false);
+  act(ItemAction::Move, note);
+  EXPECT_EQ(completions, 1);
+  const auto& prompt = nav->folderPromptAlert();
+  ASSERT_NE(prompt, nullptr);
+  prompt->textField()->userSetText("New");
+  EXPECT_TRUE(prompt->alert()->performAction(prompt->defaultAction()));
+  EXPECT_NE(memory.disk.logicalItem(top.path() + "/New/a.txt"), nullptr);
+}
+
 TEST_F(NavActionsTest, ShareCompletesFirstAndPointsAtTheRow) {
+  whenCompleted = [this] {
+    EXPECT_TRUE(memory.screens.interactions.empty());
+    whenCompleted = nullptr;
+  };
   act(ItemAction::Share, file);
   EXPECT_TRUE(banner("DLC Action Share (share sheet)"));
   EXPECT_TRUE(banner("Show Share Sheet (nav)"));
@@ -93,9 +129,20 @@ TEST_F(NavActionsTest, ShareCompletesFirstAndPointsAtTheRow) {
   EXPECT_EQ(sheet()->fromView, row);
   EXPECT_EQ(sheet()->fromRect, (Rect{0, 25, 300, 0}));
   EXPECT_EQ(nav->documentInteractionController(), sheet());
-  EXPECT_TRUE(nav->performActionCompletionBlock());
+  EXPECT_EQ(sheet()->delegate.lock(), nav);
+  EXPECT_FALSE(loggedStarting("INFO", "URL resolved to "));
   sheet()->dismissMenu();
   EXPECT_EQ(completions, 1) << "the sheet's end completes nothing";
+  ASSERT_TRUE(nav->performActionCompletionBlock());
+  nav->performActionCompletionBlock()();
+  EXPECT_EQ(completions, 2) << "it is the row's that is kept";
+}
+
+// The middle of 50 points that begin at 100 is at 125.
+TEST_F(NavActionsTest, TheSheetPointsIntoAScrolledRow) {
+  row->setBounds({40, 100, 300, 50});
+  nav->showDICUrlCompletion(row, Value(file), {});
+  EXPECT_EQ(sheet()->fromRect, (Rect{40, 125, 300, 0}));
 }
 
 TEST_F(NavActionsTest, WithoutARowTheSheetBelongsToTheWindow) {
@@ -109,12 +156,16 @@ TEST_F(NavActionsTest, OnlyItemsAreShared) {
   EXPECT_TRUE(logged("WARNING", "showDIC: url is wrong class: String"));
   EXPECT_TRUE(memory.screens.interactions.empty());
   EXPECT_EQ(completions, 0);
+  EXPECT_FALSE(nav->performActionCompletionBlock()) << "nothing goes on";
+  EXPECT_TRUE(logged("INFO", "showDIC: text"));
 }
 
 TEST_F(NavActionsTest, ALibraryIsSharedByItsName) {
   const auto library = memory.cloud.addContainer("org~example~Notes", "My Notes");
   nav->showDICUrlCompletion(row, Value(*library->documentsFolderURL()), {});
   EXPECT_EQ(sheet()->name(), "My Notes");
+  nav->showDICUrlCompletion(row, Value(addFile("Letter.txt")), {});
+  EXPECT_EQ(sheet()->name(), "Letter.txt");
 }
 
 TEST_F(NavActionsTest, ABookmarkIsSharedAsItsDocument) {
@@ -127,8 +178,10 @@ TEST_F(NavActionsTest, ABookmarkIsSharedAsItsDocument) {
 }
 
 TEST_F(NavActionsTest, PopCompletesFirst) {
+  whenCompleted = [this] { EXPECT_EQ(topList()->presentedURL(), Drive); };
   act(ItemAction::FirmpressPop, addFolder("Plans"));
   EXPECT_TRUE(banner("DLC Action Firmpress Pop"));
+  EXPECT_TRUE(loggedStarting("INFO", "Preview action: "));
   EXPECT_EQ(completions, 1);
   EXPECT_EQ(topList()->presentedURL()->lastPathComponent(), "Plans");
 }

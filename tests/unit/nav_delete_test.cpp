@@ -2,6 +2,8 @@
 // The deletion of items and libraries, from the question to what went wrong.
 #include <gmock/gmock.h>
 
+#include "fileops/ui_utils.h"
+#include "platform/ui/alert_controller.h"
 #include "tests/unit/app_fixture.h"
 
 namespace vaelo {
@@ -19,8 +21,10 @@ class NavDeleteTest : public AppFixture {
   }
   void ask(const std::vector<URL>& urls, const ViewRef& view = nullptr,
            const std::shared_ptr<DocumentListController>& list = nullptr) {
-    nav->showWarningAndDeleteURLsUsingViewWithDocumentListControllerFinishedCompletion(urls, view, list,
-                                                                                       [this] { ++finished; });
+    nav->showWarningAndDeleteURLsUsingViewWithDocumentListControllerFinishedCompletion(urls, view, list, [this] {
+      ++finished;
+      if (whenFinished) whenFinished();
+    });
   }
   void answer(bool yes) {
     const auto sheet = presentedAlert();
@@ -30,6 +34,7 @@ class NavDeleteTest : public AppFixture {
   bool isThere(const URL& url) { return memory.disk.logicalItem(url.path()) != nullptr; }
 
   int finished = 0;
+  std::function<void()> whenFinished;
 };
 
 TEST_F(NavDeleteTest, OneDocumentIsNamedInStraightQuotes) {
@@ -75,6 +80,53 @@ TEST_F(NavDeleteTest, TheSheetPointsAtTheViewOrTheButton) {
   EXPECT_EQ(presentedAlert()->popoverAnchor()->sourceView.lock(), nullptr);
 }
 
+// The middle of 40 points that begin at 100 is at 120.
+TEST_F(NavDeleteTest, TheSheetPointsIntoAScrolledView) {
+  const auto view = std::make_shared<View>(Rect{5, 6, 200, 40});
+  view->setBounds({30, 100, 200, 40});
+  ask({addFile("a.txt")}, view);
+  EXPECT_EQ(presentedAlert()->popoverAnchor()->sourceRect, (Rect{30, 120, 200, 0}));
+}
+
+TEST_F(NavDeleteTest, TheAnswerComesWithTheActionThatWasChosen) {
+  const URL file = addFile("a.txt");
+  for (const std::size_t index : {std::size_t{0}, std::size_t{1}}) {
+    AlertActionRef chosen;
+    std::optional<bool> cancelled;
+    UIUtils::showDeleteWarningAlertHasContainerViewControllerUsingViewUsingButtonCompletion(
+        {file}, false, nav, nullptr, nullptr, [&](const AlertActionRef& action, bool gaveUp) {
+          chosen = action;
+          cancelled = gaveUp;
+        });
+    const auto sheet = presentedAlert();
+    sheet->performAction(sheet->actions().at(index));
+    EXPECT_EQ(chosen, sheet->actions().at(index));
+    EXPECT_EQ(cancelled, index == 1);
+  }
+}
+
+TEST_F(NavDeleteTest, NoItemsAreGivenUpWithoutAnAction) {
+  int answers = 0;
+  UIUtils::showDeleteWarningAlertHasContainerViewControllerUsingViewUsingButtonCompletion(
+      {}, false, nav, nullptr, nullptr, [&](const AlertActionRef& action, bool gaveUp) {
+        ++answers;
+        EXPECT_EQ(action, nullptr);
+        EXPECT_TRUE(gaveUp);
+      });
+  EXPECT_EQ(answers, 1);
+  EXPECT_EQ(UIUtils::messageForDeletePrompt({}),
+            "items: 0 will be permanently deleted from Vaelo Drive on all your devices. This action cannot be undone.");
+}
+
+TEST_F(NavDeleteTest, AnItemWhoseNameIsEmptyIsNotAskedFor) {
+  const URL file = addFile("a.txt");
+  memory.disk.items.at(file.path()).values[ResourceKey::LocalizedName] = Value("");
+  ASSERT_NE(DRItem::initWithURL(file), nullptr);
+  ask({file});
+  EXPECT_EQ(presentedAlert(), nullptr);
+  EXPECT_EQ(finished, 0);
+}
+
 TEST_F(NavDeleteTest, NoItemsAndNamelessOnesAskNothing) {
   ask({});
   EXPECT_EQ(presentedAlert(), nullptr);
@@ -95,11 +147,13 @@ TEST_F(NavDeleteTest, MixedSelectionsAreRefusedSilently) {
 
 TEST_F(NavDeleteTest, SpecialFoldersAreRefusedAloud) {
   const URL desktop = addFolder("Desktop");
+  whenFinished = [this] { EXPECT_EQ(presentedAlert(), nullptr) << "the alert comes after"; };
   ask({desktop});
   EXPECT_EQ(finished, 1);
   EXPECT_TRUE(logged("WARNING", "Not deleting special folder: (" + desktop.absoluteString() + ")"));
   ASSERT_NE(presentedAlert(), nullptr);
   EXPECT_THAT(presentedAlert()->actions(), SizeIs(1));
+  EXPECT_EQ(presentedAlert()->title(), "This can’t be done with this item.");
   EXPECT_TRUE(isThere(desktop));
 }
 
@@ -120,6 +174,10 @@ TEST_F(NavDeleteTest, ConfirmedItemsGoAndEditModeEnds) {
   nav->setEditModeAndUpdateUIForViewController(true, topList());
   ask({file}, nullptr, topList());
   EXPECT_EQ(finished, 0) << "only after the answer";
+  whenFinished = [&] {
+    EXPECT_FALSE(isThere(file));
+    EXPECT_FALSE(nav->editMode());
+  };
   answer(true);
   EXPECT_FALSE(isThere(file));
   EXPECT_FALSE(nav->editMode());
@@ -143,12 +201,19 @@ TEST_F(NavDeleteTest, EveryItemIsTriedAndFailuresAreToldOnce) {
   const URL third = addFile("c.txt");
   ask({first, second, third});
   memory.disk.items.at(first.path()).isLocked = memory.disk.items.at(second.path()).isLocked = true;
+  whenFinished = [&] {
+    EXPECT_FALSE(isThere(third));
+    EXPECT_EQ(presentedAlert(), nullptr) << "failures are told last";
+  };
   answer(true);
   EXPECT_FALSE(isThere(third));
   ASSERT_NE(presentedAlert(), nullptr);
   EXPECT_EQ(presentedAlert()->title(), "not deleted: 2");
   EXPECT_EQ(presentedAlert()->message(), "");
-  EXPECT_TRUE(loggedStarting("WARNING", "Failed to delete URL " + first.absoluteString() + ": "));
+  const Error locked = memoryError(FileErrorCode::WriteNoPermission, first.path());
+  EXPECT_TRUE(logged("WARNING", "Failed to delete URL " + first.absoluteString() + ": " + locked.description()));
+  EXPECT_TRUE(loggedStarting("WARNING", "Failed to delete URL " + second.absoluteString() + ": "));
+  EXPECT_EQ(finished, 1);
 }
 
 TEST_F(NavDeleteTest, OneFailureIsToldInItsOwnWords) {
@@ -157,7 +222,8 @@ TEST_F(NavDeleteTest, OneFailureIsToldInItsOwnWords) {
   memory.disk.items.at(file.path()).isLocked = true;
   answer(true);
   ASSERT_NE(presentedAlert(), nullptr);
-  EXPECT_NE(presentedAlert()->title(), "Error exception");
+  EXPECT_EQ(presentedAlert()->title(), "It can't be used");
+  EXPECT_EQ(presentedAlert()->message(), "");
   EXPECT_EQ(finished, 1);
 }
 
@@ -171,7 +237,17 @@ TEST_F(NavDeleteTest, ALibraryIsEmptiedByItsService) {
   ask({*library->documentsFolderURL()});
   answer(true);
   EXPECT_EQ(presentedAlert()->title(), "No such luck");
-  EXPECT_TRUE(loggedStarting("WARNING", "Failed to delete container org~example~Notes: "));
+  EXPECT_TRUE(logged("WARNING", "Failed to delete container org~example~Notes: " + library->deletionError->description()));
+}
+
+TEST_F(NavDeleteTest, ALibraryThatFailsDoesNotStopTheNext) {
+  const auto first = memory.cloud.addContainer("org~example~Drawings", "Drawings");
+  const auto second = memory.cloud.addContainer("org~example~Notes", "Notes");
+  first->deletionError = Error{CloudDocumentsErrorDomain, 3, {}, "No such luck", {}};
+  ask({Drive, *first->documentsFolderURL(), *second->documentsFolderURL()});
+  answer(true);
+  EXPECT_EQ(second->deletions, 1);
+  EXPECT_EQ(presentedAlert()->title(), "not deleted: 2") << "the drive's own counts as well";
 }
 
 TEST_F(NavDeleteTest, TheDrivesOwnContainerIsNeverDeleted) {
@@ -193,6 +269,27 @@ TEST_F(NavDeleteTest, ALibraryThatCannotBeFoundIsAFailure) {
   EXPECT_TRUE(loggedStarting("WARNING", "No container for URL " + url.absoluteString() + ": "));
   EXPECT_EQ(presentedAlert()->title(), "Error exception");
   EXPECT_EQ(library->deletions, 0);
+}
+
+TEST_F(NavDeleteTest, AnErrorBesideALibraryAndALibraryWithoutAnIdentifierAreFailures) {
+  const auto library = memory.cloud.addContainer("org~example~Notes", "Notes");
+  const URL url = *library->documentsFolderURL();
+  ask({url});
+  memory.cloud.containerError = Error{CloudDocumentsErrorDomain, 1, {}, "lost", {}};
+  memory.cloud.containerErrorComesWithValue = true;
+  answer(true);
+  EXPECT_TRUE(
+      logged("WARNING", "No container for URL " + url.absoluteString() + ": " + memory.cloud.containerError->description()));
+  EXPECT_EQ(presentedAlert()->title(), "Error exception");
+  nav->dismissViewControllerAnimated(false);
+  memory.cloud.containerError.reset();
+  ask({url});
+  const auto nameless = std::make_shared<MemoryContainer>("", "Notes", url);
+  memory.cloud.containerOfEverything = nameless;
+  answer(true);
+  EXPECT_TRUE(logged("WARNING", "No container for URL " + url.absoluteString() + ": (null)"));
+  EXPECT_EQ(presentedAlert()->title(), "Error exception");
+  EXPECT_EQ(library->deletions + nameless->deletions, 0);
 }
 
 TEST_F(NavDeleteTest, TheToolbarsButtonDeletesTheSelection) {

@@ -57,7 +57,7 @@ TEST_F(NavMoveTest, AnExistingNameKeepsThePromptOpen) {
   EXPECT_FALSE(pressDone());
   EXPECT_EQ(presentedAlert(), prompt()->alert());
   EXPECT_EQ(errorLine(), "Name is already taken");
-  EXPECT_TRUE(loggedStarting("INFO", "Item exists at path: "));
+  EXPECT_TRUE(logged("INFO", "Item exists at path: " + there.absoluteString() + "/"));
   EXPECT_FALSE(memory.disk.hasFolder(there.path()));
 }
 
@@ -67,8 +67,19 @@ TEST_F(NavMoveTest, AFolderThatCannotBeMadeSaysWhy) {
   nav->showNewFolderPromptDuringMoveItemsToMove(folder, {});
   type("Plans");
   EXPECT_FALSE(pressDone());
-  EXPECT_FALSE(errorLine().empty());
+  EXPECT_EQ(errorLine(), "It can't be used");
   EXPECT_EQ(presentedAlert(), prompt()->alert());
+}
+
+TEST_F(NavMoveTest, WithoutAListNothingIsAskedFor) {
+  nav->setViewControllers({std::make_shared<ViewController>()}, false);
+  nav->promtForNewFolderAndCreate();
+  nav->showMoveTargetForSelectedItems();
+  EXPECT_EQ(nav->presentedViewController(), nullptr);
+  EXPECT_TRUE(logged("INFO", "Pressed NewFolder"));
+  EXPECT_TRUE(logged("INFO", "Pressed Move"));
+  EXPECT_FALSE(logged("INFO", "================= Show New Folder Prompt (nav, during move)"));
+  EXPECT_FALSE(loggedStarting("INFO", "Prompting for Move Target"));
 }
 
 TEST_F(NavMoveTest, WithoutAFolderThereIsNoPrompt) {
@@ -86,12 +97,59 @@ TEST_F(NavMoveTest, MoveLeavesEditModeAndOffersFolders) {
   nav->showMoveTargetForSelectedItems();
   EXPECT_FALSE(nav->editMode());
   EXPECT_TRUE(logged("INFO", "================= Pressed Move"));
+  EXPECT_TRUE(logged("INFO", "Pressed Move"));
   EXPECT_TRUE(logged("INFO", "Prompting for Move Target, 1 items"));
   ASSERT_NE(picker(), nullptr);
   EXPECT_THAT(picker()->itemsToMove(), ElementsAre(file));
   EXPECT_EQ(picker()->delegate(), nav);
+  EXPECT_FALSE(picker()->allowsCrossContainer()) << "there is no other library";
   EXPECT_EQ(picker()->modalPresentationStyle(), PresentationStyle::OverCurrentContext);
   EXPECT_TRUE(logged("DEBUG", "Presented moveTarget"));
+}
+
+TEST_F(NavMoveTest, AnEmptyLibraryOffersTheOthers) {
+  const auto library = memory.cloud.addContainer("org~example~Notes", "Notes");
+  const URL top = *library->documentsFolderURL();
+  const URL file = top.appendingPathComponent("a.txt");
+  memory.disk.add(file.path());
+  ASSERT_TRUE(vlo_canCrossZoneMoveURLs({file}));
+  nav->showMoveTargetForItemsInFolder({file}, top);
+  EXPECT_EQ(prompt(), nullptr);
+  ASSERT_NE(picker(), nullptr);
+  EXPECT_TRUE(picker()->allowsCrossContainer());
+}
+
+TEST_F(NavMoveTest, ThePickerIsGoneBeforeAnythingMoves) {
+  const URL file = addFile("a.txt");
+  const URL folder = addFolder("Plans");
+  nav->showMoveTargetForItemsInFolder({file}, Drive);
+  int accesses = 0;
+  memory.coordination.beforeAccessor = [&] {
+    ++accesses;
+    EXPECT_EQ(nav->presentedViewController(), nullptr);
+  };
+  picker()->userSelected(folder);
+  memory.coordination.beforeAccessor = nullptr;
+  EXPECT_EQ(accesses, 1);
+  EXPECT_TRUE(isThere(folder.appendingPathComponent("a.txt")));
+}
+
+TEST_F(NavMoveTest, AMovedFolderIsNamedWithoutASlash) {
+  const URL plans = addFolder("Plans");
+  const URL trips = addFolder("Trips");
+  EXPECT_THAT(nav->moveItemsToDirectoryToDirectory({trips}, plans), IsEmpty());
+  EXPECT_TRUE(logged("DEBUG", "Moving dest1: '" + plans.absoluteString() + "Trips'"));
+}
+
+TEST_F(NavMoveTest, ErrorsComeInTheOrderOfTheItems) {
+  const URL folder = addFolder("Plans");
+  addFile("Plans/b.txt");
+  const URL a = addFile("a.txt");
+  memory.disk.items.at(a.path()).isLocked = true;
+  const std::vector<Error> errors = nav->moveItemsToDirectoryToDirectory({a, addFile("b.txt")}, folder);
+  ASSERT_THAT(errors, SizeIs(2));
+  EXPECT_EQ(errors[0].code, FileErrorCode::WriteNoPermission);
+  EXPECT_EQ(errors[1].code, FileErrorCode::WriteFileExists);
 }
 
 TEST_F(NavMoveTest, SpecialFoldersAreNotMoved) {
@@ -99,6 +157,7 @@ TEST_F(NavMoveTest, SpecialFoldersAreNotMoved) {
   nav->showMoveTargetForItemsInFolder({addFile("a.txt"), documents}, Drive);
   EXPECT_EQ(picker(), nullptr);
   EXPECT_TRUE(loggedStarting("WARNING", "Not moving items with special folder: ("));
+  EXPECT_TRUE(isThere(documents));
   EXPECT_FALSE(loggedStarting("INFO", "Prompting for Move Target"));
   ASSERT_NE(presentedAlert(), nullptr);
 }
@@ -130,7 +189,7 @@ TEST_F(NavMoveTest, AMoveIntoANewFolderThatFailsKeepsThePromptAndTheFolder) {
   memory.disk.items.at(file.path()).isLocked = true;
   type("New");
   EXPECT_FALSE(pressDone());
-  EXPECT_FALSE(errorLine().empty());
+  EXPECT_EQ(errorLine(), "It can't be used");
   EXPECT_TRUE(memory.disk.hasFolder(Drive.appendingPathComponent("New").path()));
   EXPECT_FALSE(pressDone());
   EXPECT_EQ(errorLine(), "Name is already taken");

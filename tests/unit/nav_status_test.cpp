@@ -8,12 +8,6 @@ namespace {
 
 using NavStatusTest = AppFixture;
 
-class QuotaListener : public QuotaFetcherDelegate {
- public:
-  void quotaFetcherDidUpdateValue(QuotaFetcher&, std::uint64_t freeBytes) override { values.push_back(freeBytes); }
-  std::vector<std::uint64_t> values;
-};
-
 TEST_F(NavStatusTest, TheLineIsCentredInTheToolbar) {
   loadNav();
   const auto& items = topList()->toolbarItems();
@@ -61,6 +55,15 @@ TEST_F(NavStatusTest, FreeSpaceIsCountedIn1024s) {
   nav->quotaFetcherDidUpdateValue(*nav->quotaFetcher(), 7 * 1024);
   EXPECT_EQ(nav->quotaAvailableString(), "7 KB (7) available");
   EXPECT_EQ(nav->toolbarStatusText(1), "items: 1, 7 KB (7) available");
+  // 1010 * 1024: the number has no grouping, which would end it after the 1.
+  nav->quotaFetcherDidUpdateValue(*nav->quotaFetcher(), 1'034'240);
+  EXPECT_EQ(nav->quotaAvailableString(), "1,010 KB (1010) available");
+  // 1.5 * 1024 * 1024 * 1024
+  nav->quotaFetcherDidUpdateValue(*nav->quotaFetcher(), 1'610'612'736);
+  EXPECT_EQ(nav->quotaAvailableString(), "1.5 GB (1.5) available");
+  // 2^64 - 1 is 16 EB but for a byte.
+  nav->quotaFetcherDidUpdateValue(*nav->quotaFetcher(), ~std::uint64_t{0});
+  EXPECT_EQ(nav->quotaAvailableString(), "16 EB (16) available");
 }
 
 TEST_F(NavStatusTest, AFetchedValueReachesTheLine) {
@@ -71,7 +74,10 @@ TEST_F(NavStatusTest, AFetchedValueReachesTheLine) {
   EXPECT_EQ(nav->quotaBytes(), 5'368'709'120u);
   EXPECT_EQ(nav->quotaFetcher()->freeBytes(), 5'368'709'120u);
   EXPECT_EQ(statusText(), nav->toolbarStatusText(1));
-  EXPECT_TRUE(loggedStarting("DEBUG", "updated quota at "));
+  ASSERT_TRUE(nav->lastQuotaFetch().has_value());
+  EXPECT_EQ(*nav->lastQuotaFetch(), platform().queues.now());
+  EXPECT_TRUE(
+      logged("DEBUG", "updated quota at " + Value(*nav->lastQuotaFetch()).description() + ": 5368709120 bytes avail"));
 }
 
 TEST_F(NavStatusTest, SigningOutForgetsTheBytesButNotThatTheyWereKnown) {
@@ -124,78 +130,25 @@ TEST_F(NavStatusTest, EditModeShowsWhatIsSelectedAndHidesTheWayBack) {
   EXPECT_EQ(topList()->toolbarItems(), statusBarOf(*topList())->toolbarItems());
 }
 
-TEST_F(NavStatusTest, TheFetcherAsksAtOnceAndThenEveryInterval) {
-  const auto fetcher = QuotaFetcher::init();
-  const auto listener = std::make_shared<QuotaListener>();
-  setFreeBytes(7);
-  fetcher->setDelegate(listener);
-  fetcher->runWithInterval(300);
-  runAllQueues();
-  EXPECT_EQ(quotaFetches(), 1);
-  EXPECT_EQ(listener->values, std::vector<std::uint64_t>{7});
-  advance(std::chrono::seconds(299));
-  EXPECT_EQ(quotaFetches(), 1);
-  advance(std::chrono::seconds(2));
-  EXPECT_EQ(quotaFetches(), 2);
-  fetcher->fetchNow();
-  runAllQueues();
-  EXPECT_EQ(quotaFetches(), 3);
+TEST_F(NavStatusTest, AListBelowIsUpdatedItself) {
+  loadNav();
+  const auto root = topList();
+  root->itemsLoaded({addFile("a.txt"), addFile("b.txt")});
+  nav->pushViewController(makeList(addFolder("Plans")), false);
+  statusBarOf(*root)->setStatusText("");
+  nav->updateStatusUI(root);
+  EXPECT_EQ(statusBarOf(*root)->labelsView()->primaryLabel()->text(), "items: 2");
 }
 
-TEST_F(NavStatusTest, ASecondIntervalReplacesTheFirst) {
-  const auto fetcher = QuotaFetcher::init();
-  fetcher->runWithInterval(10);
-  fetcher->runWithInterval(100);
-  runAllQueues();
-  const int before = quotaFetches();
-  advance(std::chrono::seconds(99));
-  EXPECT_EQ(quotaFetches(), before);
-}
-
-TEST_F(NavStatusTest, ADroppedFetcherAsksNoMore) {
-  auto fetcher = QuotaFetcher::init();
-  fetcher->runWithInterval(10);
-  runAllQueues();
-  const int before = quotaFetches();
-  fetcher = nullptr;
-  advance(std::chrono::seconds(60));
-  EXPECT_EQ(quotaFetches(), before);
-}
-
-TEST_F(NavStatusTest, NothingIsFetchedInTheBackground) {
-  const auto fetcher = QuotaFetcher::init();
-  resignActive();
-  EXPECT_FALSE(fetcher->canFetch());
-  EXPECT_TRUE(logged("INFO", "Got WillResignActiveNotification (quota)"));
-  fetcher->performFetch();
-  runAllQueues();
-  EXPECT_EQ(quotaFetches(), 0);
-  EXPECT_TRUE(logged("DEBUG", "Not fetching quota: backgrounded."));
-  becomeActive();
-  EXPECT_TRUE(fetcher->canFetch());
-  EXPECT_TRUE(logged("INFO", "Got DidBecomeActiveNotification (quota)"));
-}
-
-TEST_F(NavStatusTest, NothingIsFetchedWithoutAnAccount) {
-  signOut();
-  const auto fetcher = QuotaFetcher::init();
-  bool completed = false;
-  fetcher->fetchUserQuotaWithCompletion([&completed](std::int64_t, const std::optional<Error>&) { completed = true; });
-  runAllQueues();
-  EXPECT_FALSE(completed);
-  EXPECT_TRUE(logged("INFO", "Not fetching quota. Ubiquity is not enabled"));
-}
-
-TEST_F(NavStatusTest, AFailedFetchKeepsThePreviousValue) {
-  const auto fetcher = QuotaFetcher::init();
-  const auto listener = std::make_shared<QuotaListener>();
-  fetcher->setDelegate(listener);
-  const Error error{CloudDocumentsErrorDomain, 3, {}, "offline", {}};
-  failQuota(error);
-  fetcher->performFetch();
-  runAllQueues();
-  EXPECT_TRUE(listener->values.empty());
-  EXPECT_TRUE(logged("WARNING", "can't update quota: " + error.description()));
+TEST_F(NavStatusTest, UpdatingTheLineUpdatesItsOfferAndNoTitle) {
+  setOffer(2);
+  loadNav();
+  topList()->itemsLoaded({});
+  statusBarOf(*topList())->showUpgradeOffer(nullptr);
+  topList()->navigationItem().setTitle("Drive");
+  nav->updateStatusUI(nullptr);
+  EXPECT_EQ(statusBarOf(*topList())->labelsView()->quotaButton()->offer(), nav->upgradeOffer());
+  EXPECT_EQ(topList()->navigationItem().title(), "Drive");
 }
 
 }  // namespace
