@@ -22,6 +22,7 @@ class MemoryDocumentInteraction : public DocumentInteractionController {
   // Where the menu was last shown from.
   Rect fromRect;
   ViewRef fromView;
+  bool wasAnimated = false;
   BarButtonItemRef fromButton;
   std::weak_ptr<DocumentInteractionControllerDelegate> delegate;
 
@@ -34,10 +35,11 @@ class MemoryDocumentInteraction : public DocumentInteractionController {
   std::string name() const override { return name_; }
   void setName(std::string name) override { name_ = std::move(name); }
   void setDelegate(std::weak_ptr<DocumentInteractionControllerDelegate> told) override { delegate = std::move(told); }
-  bool presentOptionsMenuFromRect(const Rect& rect, const ViewRef& view, bool) override {
+  bool presentOptionsMenuFromRect(const Rect& rect, const ViewRef& view, bool animated) override {
     record_.calls.push_back("menu " + url_.path());
     fromRect = rect;
     fromView = view;
+    wasAnimated = animated;
     return hasSomethingToOffer;
   }
   bool presentOptionsMenuFromBarButtonItem(const BarButtonItemRef& item, bool) override {

@@ -59,11 +59,44 @@ TEST_F(DriveStatusLabelViewTest, TheButtonIsHiddenExactlyWhileThereIsRoomInTheAc
   EXPECT_TRUE(button->hidden());
 }
 
+// (360 - 25) / 2 = 167.5
+TEST_F(DriveStatusLabelViewTest, LayoutMeasuresTheLineAgain) {
+  view->setPrimaryLabelText("1234567890");
+  label->setText("12345");
+  layOut(360, 46);
+  EXPECT_EQ(label->frame().x, 167.5);
+  EXPECT_EQ(label->frame().size(), (Size{25, 11}));
+}
+
 // x: (360 - 50) / 2 = 155. y: the block is the label alone, (46 - 11) / 2 - 1 = 16.5, a whole pixel at two pixels a point.
 TEST_F(DriveStatusLabelViewTest, ALineAloneIsCentredAndRaisedByAPoint) {
   view->setPrimaryLabelText("1234567890");
   layOut(360, 46);
   EXPECT_EQ(label->frame(), (Rect{155, 16.5, 50, 11}));
+}
+
+// Without a gap: 0 + (16.5 + 11) - 6 = 21.5.
+TEST_F(DriveStatusLabelViewTest, AHiddenButtonStandsCloseUnderTheLine) {
+  view->setPrimaryLabelText("1234567890");
+  layOut(360, 46);
+  EXPECT_EQ(button->frame(), (Rect{156.5, 21.5, 47, 29}));
+}
+
+// A line that keeps its 11 points without a text counts for none in the block, but its bottom and the gap of 2.75 are where
+// they are. Alone: (46 - 0) / 2 - 1 = 22. With the button: (46 - 2.75 - 17) / 2 - 1 = 12.125, so 12; button y 2.75 + 12 + 11
+// - 6 = 19.75, so 20.
+TEST_F(DriveStatusLabelViewTest, ALineWithoutATextIsNoPartOfTheBlock) {
+  struct TallLabel : Label {
+    Size sizeThatFits(const Size&) const override { return {0, 11}; }
+  };
+  const auto tall = std::make_shared<TallLabel>();
+  view->setPrimaryLabel(tall);
+  layOut(360, 46);
+  EXPECT_EQ(tall->frame(), (Rect{180, 22, 0, 11}));
+  view->showLowQuota(true);
+  layOut(360, 46);
+  EXPECT_EQ(tall->frame(), (Rect{180, 12, 0, 11}));
+  EXPECT_EQ(button->frame(), (Rect{156.5, 20, 47, 29}));
 }
 
 // Gap 11 / 4 = 2.75; block 2.75 + 17 + 11 = 30.75. Label y: (46 - 30.75) / 2 - 1 = 6.625, in half points 6.5. Button: 47 x

@@ -127,6 +127,7 @@ TEST_F(NavActionsTest, ShareCompletesFirstAndPointsAtTheRow) {
   EXPECT_TRUE(logged("INFO", "showDIC: " + file.absoluteString()));
   EXPECT_EQ(completions, 1);
   EXPECT_EQ(sheet()->fromView, row);
+  EXPECT_TRUE(sheet()->wasAnimated);
   EXPECT_EQ(sheet()->fromRect, (Rect{0, 25, 300, 0}));
   EXPECT_EQ(nav->documentInteractionController(), sheet());
   EXPECT_EQ(sheet()->delegate.lock(), nav);
@@ -197,6 +198,10 @@ TEST_F(NavActionsTest, AnUnknownActionIsAnErrorThatCompletes) {
 TEST_F(NavActionsTest, TheShortFormComesFromTheWindow) {
   nav->documentListControllerPerformActionURL(topList(), ItemAction::Share, file);
   EXPECT_EQ(sheet()->fromView, nav->view());
+  // Unlike without a row, it is the window's own middle.
+  const Rect bounds = nav->view()->bounds();
+  EXPECT_GT(bounds.width, 0);
+  EXPECT_EQ(sheet()->fromRect, (Rect{0, bounds.height / 2, bounds.width, 0}));
 }
 
 }  // namespace

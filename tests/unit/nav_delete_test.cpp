@@ -166,6 +166,7 @@ TEST_F(NavDeleteTest, CancelKeepsEverythingAsItIs) {
   EXPECT_TRUE(nav->editMode());
   EXPECT_EQ(finished, 1);
   EXPECT_TRUE(logged("INFO", "Delete: Cancel pressed"));
+  EXPECT_EQ(userActions().back(), "Delete was Cancelled (nav)");
   EXPECT_TRUE(logged("INFO", "================= Delete was Cancelled (nav)"));
 }
 
