@@ -21,7 +21,10 @@ FolderPicker::FolderPicker(std::shared_ptr<DocumentTargetSelectionController> pi
     : picker_(std::move(picker)), drive_(drive) {
   build(over);
   FolderViewEvents events;
-  events.activated = [this](const std::string& path) { goTo(URL(path, true)); };
+  // Until a folder shows, the rows are those of the one before: a second tap would walk to a folder beside it.
+  events.activated = [this](const std::string& path) {
+    if (shown_) goTo(URL(path, true));
+  };
   view_.setEvents(std::move(events));
   view_.setEmptyText("No folders here", "");
   // Within one library the way begins at its top; across libraries at the drive's root, which lists them.
@@ -118,7 +121,9 @@ std::string FolderPicker::titleOf(const URL& folder) const {
 
 void FolderPicker::goTo(const URL& folder) {
   way_.push_back(folder);
+  shown_ = false;
   gtk_widget_set_sensitive(move_, FALSE);
+  gtk_widget_set_sensitive(newFolder_, FALSE);
   const bool libraries = picker_->allowsCrossContainer() && way_.size() == 1;
   worker_.run([this, folder, libraries, items = picker_->itemsToMove(), &drive = drive_]() -> std::function<void()> {
     MoveTarget target = moveTargetAt(folder, items, libraries, drive);
@@ -139,7 +144,9 @@ void FolderPicker::goUp() {
 void FolderPicker::show(const URL& folder, MoveTarget target) {
   adw_window_title_set_title(ADW_WINDOW_TITLE(title_), titleOf(folder).c_str());
   gtk_widget_set_visible(back_, way_.size() > 1);
+  shown_ = true;
   gtk_widget_set_sensitive(move_, target.refusal.empty());
+  gtk_widget_set_sensitive(newFolder_, target.takesFolders);
   gtk_label_set_text(GTK_LABEL(refusal_), target.refusal.c_str());
   gtk_widget_set_visible(refusal_, !target.refusal.empty());
   view_.setEntries(std::move(target.folders));
@@ -147,9 +154,11 @@ void FolderPicker::show(const URL& folder, MoveTarget target) {
 }
 
 void FolderPicker::choose() {
-  const auto kept = picker_;
-  const URL folder = way_.back();
-  kept->userSelected(folder);
+  gtk_widget_set_sensitive(move_, FALSE);
+  // Not inside of the press: a long move runs the main loop, which takes this picker away.
+  Platform::current().queues.main().async([kept = picker_, folder = way_.back()] {
+    if (kept->presentingViewController()) kept->userSelected(folder);
+  });
 }
 
 void FolderPicker::askForNewFolder() {
@@ -189,6 +198,7 @@ void FolderPicker::makeFolder(const std::string& name) {
       error = FileUtils::mkdir(made);
     }
     return [this, made, error] {
+      if (way_.back() != made.deletingLastPathComponent()) return;  // the user has walked on
       if (!error) {
         goTo(made);
         return;

@@ -37,7 +37,8 @@ class FolderPicker {
 
   std::shared_ptr<DocumentTargetSelectionController> picker_;
   CloudDocuments& drive_;
-  std::vector<URL> way_;  ///< the folders down to the one that shows
+  std::vector<URL> way_;  ///< the folders down to the one that shows, or is about to
+  bool shown_ = false;    ///< the last of them is what shows
   GtkWidget* window_ = nullptr;
   GtkWidget* back_ = nullptr;
   GtkWidget* title_ = nullptr;

@@ -1,8 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/move_targets.h"
 
-#include <algorithm>
 #include <cstring>
+#include <unordered_set>
 
 #include "host/gtk/list/folder_reader.h"
 #include "host/support/glib_ptr.h"
@@ -12,15 +12,19 @@ namespace vaelo {
 
 namespace {
 
-bool isOneOf(const std::string& path, const std::vector<URL>& items) {
-  return std::any_of(items.begin(), items.end(), [&path](const URL& item) { return item.path() == path; });
-}
-
 /// Whether the container lets folders be put at this depth; 0 is its top.
 bool takesFolders(const CloudContainer& container, std::size_t depth) {
   const std::optional<std::string> levels = container.supportedFolderLevels();
   if (!levels || *levels == FolderLevelsAny) return true;
   return *levels == FolderLevelsOne && depth == 0;
+}
+
+bool canHoldNewFolder(const URL& folder) {
+  CloudContainerRef container;
+  std::vector<std::string> components;
+  const bool isUnknown =
+      FileUtils::containerAndRelativePathforURLContainerRelativePathComponents(folder, &container, &components).has_value();
+  return !isUnknown && container && takesFolders(*container, components.size());
 }
 
 std::string refusalOf(const URL& folder, const std::vector<URL>& items) {
@@ -55,11 +59,14 @@ MoveTarget moveTargetAt(const URL& folder, const std::vector<URL>& items, bool l
     target.refusal = std::string("This folder can’t be read: ") + std::strerror(reading.errorNumber);
     return target;
   }
+  target.takesFolders = canHoldNewFolder(folder);
+  std::unordered_set<std::string> moved;
+  for (const URL& item : items) moved.insert(item.path());
   for (std::size_t i = 0; i < reading.snapshot->size(); ++i) {
     if (reading.snapshot->kind(i) != EntryKind::Folder) continue;
     const std::string name(reading.snapshot->name(i));
     const std::string path = folder.appendingPathComponent(name).path();
-    if (isOneOf(path, items)) continue;
+    if (moved.contains(path)) continue;
     target.folders.push_back({takeString(g_filename_display_name(name.c_str())), path, EntryKind::Folder, ""});
   }
   if (!libraries) return target;

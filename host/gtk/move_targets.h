@@ -15,6 +15,7 @@ struct MoveTarget {
   std::vector<FolderEntry> folders;  ///< where one can go on from here
   /// Why the items can't be put here; empty when they can.
   std::string refusal;
+  bool takesFolders = false;  ///< whether a new folder can be made here
 };
 
 /// Looks at a folder as a place for items: the folders in it, without those that are moved, and whether the container takes
