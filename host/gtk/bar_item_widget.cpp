@@ -57,6 +57,8 @@ GtkWidget* makeBarItemWidget(const BarButtonItemRef& item) {
   }
 
   GtkWidget* button = gtk_button_new();
+  // A text that is edited would end at the press and be taken, before Cancel is heard.
+  gtk_widget_set_focus_on_click(button, FALSE);
   g_object_set_data(G_OBJECT(button), ItemKey, item.get());
   const SystemLook look = system ? lookOf(*system) : SystemLook{nullptr, nullptr};
   if (look.icon) {

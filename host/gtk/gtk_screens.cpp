@@ -16,7 +16,7 @@
 namespace vaelo {
 
 WindowRef GtkScreens::makeWindow(const Rect& bounds) {
-  auto window = std::make_shared<GtkWindowHost>(application_, bounds);
+  auto window = std::make_shared<GtkWindowHost>(application_, bounds, tags_);
   window_ = window;
   return window;
 }

@@ -14,9 +14,11 @@
 
 namespace vaelo {
 
-GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds)
+GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds, DriveSyncedStore& tags)
     : Window(bounds),
       window_(ADW_APPLICATION_WINDOW(adw_application_window_new(application))),
+      tags_(tags),
+      keyboard_(widget(), Platform::current().notifications),
       toasts_(adw_toast_overlay_new()),
       overlay_(gtk_overlay_new()),
       menu_(g_menu_new()) {
@@ -86,6 +88,15 @@ void GtkWindowHost::addActions() {
        nullptr,
        nullptr,
        {0, 0, 0}},
+      {"tags",
+       [](GSimpleAction*, GVariant*, gpointer self) {
+         ScreenPage* page = static_cast<GtkWindowHost*>(self)->topPage();
+         if (page) page->showTags();
+       },
+       nullptr,
+       nullptr,
+       nullptr,
+       {0, 0, 0}},
       {"escape",
        [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkWindowHost*>(self)->escape(); },
        nullptr,
@@ -99,6 +110,7 @@ void GtkWindowHost::addActions() {
   constexpr const char* keys[][2] = {{"F5|<Control>r", "win.refresh"},
                                      {"<Control>f", "win.search"},
                                      {"<Control>a", "win.select-all"},
+                                     {"<Control>t", "win.tags"},
                                      {"<Alt>Left|Back", "win.back"},
                                      {"Escape", "win.escape"}};
   for (const auto& [trigger, action] : keys) {
@@ -144,7 +156,7 @@ void GtkWindowHost::stackChanged(const Stack&, const Stack& newStack, bool anima
     std::unique_ptr<ScreenPage>& page = pages_[screen.get()];
     if (!page) {
       page = std::make_unique<ScreenPage>(
-          screen, [this] { goBack(); }, G_MENU_MODEL(menu_));
+          screen, [this] { goBack(); }, G_MENU_MODEL(menu_), tags_);
       if (makeBanner_) page->setBanner(makeBanner_());
       page->setToolbarHidden(!controller || controller->toolbarHidden());
       page->setNarrow(traitCollection().horizontalSizeClass == SizeClass::Compact);
@@ -316,6 +328,7 @@ void GtkWindowHost::sizeChanged() {
     page->setNarrow(traitCollection().horizontalSizeClass == SizeClass::Compact);
   }
   resize(Size{static_cast<double>(width), static_cast<double>(height)}, false);
+  keyboard_.windowResized(width, height);
 }
 
 }  // namespace vaelo

@@ -7,6 +7,7 @@
 #include <map>
 #include <memory>
 
+#include "host/gtk/keyboard_area.h"
 #include "host/gtk/page_stack.h"
 #include "host/gtk/screen_page.h"
 #include "platform/ui/navigation_controller.h"
@@ -15,13 +16,15 @@
 namespace vaelo {
 
 class ActionSheet;
+class DriveSyncedStore;
 class FolderPicker;
 
 /// The application's window on the display: one page for each screen of the root navigation controller's stack, alerts over
 /// it, and the keys and buttons that go back, search and refresh. Main thread.
 class GtkWindowHost : public Window, private NavigationHost, private PresentationHost {
  public:
-  GtkWindowHost(GtkApplication* application, const Rect& bounds);
+  /// `tags` outlives it.
+  GtkWindowHost(GtkApplication* application, const Rect& bounds, DriveSyncedStore& tags);
   ~GtkWindowHost() override;
 
   void makeKeyAndVisible() override;
@@ -58,6 +61,8 @@ class GtkWindowHost : public Window, private NavigationHost, private Presentatio
   TraitCollection traitsFor(int width, int height) const;
 
   AdwApplicationWindow* window_;
+  DriveSyncedStore& tags_;
+  KeyboardArea keyboard_;
   GtkWidget* toasts_;
   GtkWidget* overlay_;
   GMenu* menu_;

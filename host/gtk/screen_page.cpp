@@ -2,13 +2,15 @@
 #include "host/gtk/screen_page.h"
 
 #include "host/gtk/bar_item_widget.h"
+#include "host/gtk/details_tags.h"
 #include "host/gtk/host_screen.h"
 #include "host/gtk/mirror/view_mirror.h"
 #include "host/gtk/preview/preview_page.h"
+#include "preview/preview_details_view_controller.h"
 
 namespace vaelo {
 
-ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, GMenuModel* menu)
+ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, GMenuModel* menu, DriveSyncedStore& tags)
     : screen_(std::move(screen)),
       hostScreen_(dynamic_cast<HostScreen*>(screen_.get())),
       box_(GTK_WIDGET(g_object_ref_sink(gtk_box_new(GTK_ORIENTATION_VERTICAL, 0)))),
@@ -44,6 +46,9 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
     mirror_ = std::make_unique<ViewMirror>(screen_->view());
     gtk_widget_set_vexpand(mirror_->widget(), TRUE);
     gtk_box_append(GTK_BOX(box_), mirror_->widget());
+    if (const auto details = std::dynamic_pointer_cast<PreviewDetailsViewController>(screen_)) {
+      tags_ = std::make_unique<DetailsTags>(details, mirror_->widget(), tags);
+    }
   }
   gtk_widget_add_css_class(toolbar_, "toolbar");
   gtk_widget_set_size_request(toolbar_, -1, 46);
@@ -60,6 +65,7 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
 
 ScreenPage::~ScreenPage() {
   preview_.reset();  // while there is a bar that it may change
+  tags_.reset();
   mirror_.reset();
   g_signal_handlers_disconnect_by_data(back_, this);
   if (hostScreen_ && gtk_widget_get_parent(hostScreen_->contentWidget()) == box_) {
@@ -87,6 +93,10 @@ void ScreenPage::setBanner(GtkWidget* banner) { gtk_box_insert_child_after(GTK_B
 bool ScreenPage::toggleSearch() { return hostScreen_ ? hostScreen_->toggleSearch() : preview_ && preview_->toggleFind(); }
 
 bool ScreenPage::closeSearch() { return hostScreen_ ? hostScreen_->closeSearch() : preview_ && preview_->closeFind(); }
+
+void ScreenPage::showTags() {
+  if (tags_) tags_->showTags();
+}
 
 void ScreenPage::refresh() {
   if (hostScreen_) hostScreen_->refresh();

@@ -10,6 +10,8 @@
 
 namespace vaelo {
 
+class DetailsTags;
+class DriveSyncedStore;
 class HostScreen;
 class PreviewPage;
 class ViewMirror;
@@ -17,8 +19,9 @@ class ViewMirror;
 /// One page of the window: a screen's header bar, its content and its toolbar, which follow the screen. Main thread.
 class ScreenPage {
  public:
-  /// `goBack` is what the back button does; `menu` is shown at the end of the header bar (a reference is taken).
-  ScreenPage(ViewControllerRef screen, std::function<void()> goBack, GMenuModel* menu);
+  /// `goBack` is what the back button does; `menu` is shown at the end of the header bar (a reference is taken). `tags`
+  /// outlives it.
+  ScreenPage(ViewControllerRef screen, std::function<void()> goBack, GMenuModel* menu, DriveSyncedStore& tags);
   ~ScreenPage();
   ScreenPage(const ScreenPage&) = delete;
   ScreenPage& operator=(const ScreenPage&) = delete;
@@ -29,6 +32,8 @@ class ScreenPage {
   /// The search in the page's folder or document: opens or closes it; closes it; false when there is nothing to do.
   bool toggleSearch();
   bool closeSearch();
+  /// The menu of the tags of the document whose details are shown; without one nothing happens.
+  void showTags();
   /// Reads what is shown anew.
   void refresh();
   /// A widget between header and content; the page owns it.
@@ -53,6 +58,7 @@ class ScreenPage {
   std::function<void()> goBack_;
   std::unique_ptr<PreviewPage> preview_;
   std::unique_ptr<ViewMirror> mirror_;  // of a screen that has neither content nor a preview
+  std::unique_ptr<DetailsTags> tags_;
   bool canGoBack_ = false;
   bool toolbarHidden_ = true;
   std::shared_ptr<void> barToken_;
