@@ -185,7 +185,7 @@ class NavController : public NavigationController,
   bool openInDefaultApp(const std::shared_ptr<DRItem>& item);
   void showInfo(const URL& url);
   void makeEditToolbar(const DocumentListControllerRef& list);
-  BarButtonItemRef editButton(const char* title, void (NavController::*action)());
+  BarButtonItemRef editButton(const std::string& title, void (NavController::*action)());
   /// Deletes what was confirmed; how many failed, and the last error that there was.
   struct Failures {
     std::int32_t count = 0;

@@ -82,16 +82,16 @@ void NavController::configureToolbar(const DocumentListControllerRef& list) {
 }
 
 void NavController::makeEditToolbar(const DocumentListControllerRef& list) {
-  barButtonNewFolder_ = editButton("New Folder", &NavController::promtForNewFolderAndCreate);
-  barButtonMoveItem_ = editButton("Move", &NavController::showMoveTargetForSelectedItems);
-  barButtonDeleteItem_ = editButton("Delete", &NavController::showWarningAndDeleteDocument);
+  barButtonNewFolder_ = editButton(localized("New Folder"), &NavController::promtForNewFolderAndCreate);
+  barButtonMoveItem_ = editButton(localized("Move"), &NavController::showMoveTargetForSelectedItems);
+  barButtonDeleteItem_ = editButton(localized("Delete"), &NavController::showWarningAndDeleteDocument);
   const BarButtonItemRef space = BarButtonItem::system(SystemItem::FlexibleSpace);
   list->setToolbarItems({barButtonNewFolder_, space, barButtonMoveItem_, space, barButtonDeleteItem_});
 }
 
-BarButtonItemRef NavController::editButton(const char* title, void (NavController::*action)()) {
+BarButtonItemRef NavController::editButton(const std::string& title, void (NavController::*action)()) {
   const auto button = std::make_shared<Button>(ButtonType::System);
-  button->setTitle(localized(title));
+  button->setTitle(title);
   button->sizeToFit();
   button->addAction(ControlEvent::TouchUpInside, [weak = weakSelf(this), action] {
     if (const auto self = weak.lock()) (self.get()->*action)();

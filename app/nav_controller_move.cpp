@@ -120,7 +120,7 @@ void NavController::showNewFolderPromptDuringMoveItemsToMove(const std::optional
     return newFolderEntered(weak, folder, items, name, accepted);
   };
   folderPromptAlert_ =
-      NewFolderPrompt::newWithTitleDoneButtonTextCompletion(title, localized(moves ? "Move" : "Create"), entered);
+      NewFolderPrompt::newWithTitleDoneButtonTextCompletion(title, moves ? localized("Move") : localized("Create"), entered);
   presentViewController(folderPromptAlert_->alert(), true);
 }
 

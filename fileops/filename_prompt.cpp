@@ -95,7 +95,8 @@ void FilenamePrompt::folderPromptTextFieldChanged(TextField& field) {
   } else if (name.empty()) {
     updateErrorMessage("");
   } else {
-    updateErrorMessage(localized(name.front() == '.' ? "Choose a different name." : "Character not allowed in filename"));
+    updateErrorMessage(name.front() == '.' ? localized("Choose a different name.")
+                                           : localized("Character not allowed in filename"));
   }
   setDoneButtonEnabled(valid);
 }

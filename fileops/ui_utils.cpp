@@ -13,7 +13,7 @@ std::string localized(const char* key) { return Platform::current().formatting.l
 
 std::string wordsOf(const std::optional<Error>& error) {
   if (error && error->localizedDescription) return *error->localizedDescription;
-  if (error && error->localizedFailureReason) return *error->localizedFailureReason;
+  if (error && error->localizedFailureReason) return localized(error->localizedFailureReason->c_str());
   return localized("Error exception");
 }
 

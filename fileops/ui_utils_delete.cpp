@@ -37,11 +37,13 @@ std::optional<std::string> UIUtils::messageForDeletePrompt(const std::vector<URL
   const std::shared_ptr<DRItem> item = DRItem::initWithURL(urls.front());
   const std::string name = item ? item->localizedName().value_or("") : "";
   if (name.empty()) return std::nullopt;
-  const std::string format = formatting.localizedString(
+  const std::string format =
       item->isContainer()
-          ? "The %@ app library, and all its documents, will be permanently deleted from Vaelo Drive on all your devices. "
-            "This action cannot be undone."
-          : "\"%@\" will be permanently deleted from Vaelo Drive on all your devices. This action cannot be undone.");
+          ? formatting.localizedString(
+                "The %@ app library, and all its documents, will be permanently deleted from Vaelo Drive on all your "
+                "devices. This action cannot be undone.")
+          : formatting.localizedString(
+                "\"%@\" will be permanently deleted from Vaelo Drive on all your devices. This action cannot be undone.");
   return formatting.filled(format, {name});
 }
 

@@ -1,9 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "app/main.h"
 
-#include <libintl.h>
-
-#include <clocale>
+#include <gtk/gtk.h>
 
 #include "host/desktop/restoration_store.h"
 #include "host/gtk/change_toasts.h"
@@ -11,11 +9,11 @@
 #include "host/gtk/gtk_screens.h"
 #include "host/host_platform.h"
 #include "host/support/graphics_device.h"
+#include "host/support/message_catalogue.h"
 
 int main(int argc, char** argv) {
-  std::setlocale(LC_ALL, "");
-  bind_textdomain_codeset("vaelo-drive", "UTF-8");
-  textdomain("vaelo-drive");
+  vaelo::useMessageCatalogue();
+  gtk_disable_setlocale();
   vaelo::drawWithoutGLWhereItIsEmulated();
   const vaelo::HostFolders folders = vaelo::HostFolders::fromEnvironment();
   vaelo::HostPlatform platform(folders);

@@ -63,16 +63,16 @@ void FileInfoStackView::setItem(const std::shared_ptr<DRItem>& item) {
     removeArrangedSubview(row);
     row->removeFromSuperview();
   }
-  const auto add = [this](const char* name, const std::optional<std::string>& value, int maxLines = 1) {
-    return value ? addCellValueMaxLines(localized(name), *value, maxLines) : nullptr;
+  const auto add = [this](const std::string& name, const std::optional<std::string>& value, int maxLines = 1) {
+    return value ? addCellValueMaxLines(name, *value, maxLines) : nullptr;
   };
-  add("Kind", item_->localizedTypeDescription());
-  add("Size", item_->friendlyFileSize());
-  add("Where", item_->url() ? FileUtils::displayableLocationForURL(*item_->url()) : std::nullopt, WhereLines);
-  creationDateCell_ = add("Created", item_->friendlyCreationDate(DateStyle::Long));
-  modifiedDateCell_ = add("Modified", item_->friendlyContentModificationDate(DateStyle::Long));
+  add(localized("Kind"), item_->localizedTypeDescription());
+  add(localized("Size"), item_->friendlyFileSize());
+  add(localized("Where"), item_->url() ? FileUtils::displayableLocationForURL(*item_->url()) : std::nullopt, WhereLines);
+  creationDateCell_ = add(localized("Created"), item_->friendlyCreationDate(DateStyle::Long));
+  modifiedDateCell_ = add(localized("Modified"), item_->friendlyContentModificationDate(DateStyle::Long));
   if (std::optional<AttributedString> tags = buildTagsWithImagesStringFont(*item_, FileInfoCell::font())) {
-    add("Tags", "")->valueLabel()->setAttributedText(std::move(tags));
+    add(localized("Tags"), "")->valueLabel()->setAttributedText(std::move(tags));
   }
 }
 

@@ -6,6 +6,7 @@
 #include <memory>
 
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -50,7 +51,7 @@ bool launchApplication(GAppInfo* app, const std::vector<std::string>& uris, GApp
     return true;
   }
   if (!hasProgram(app)) {
-    failed("It is no longer installed.");
+    failed(_("It is no longer installed."));
     return false;
   }
   GError* error = nullptr;

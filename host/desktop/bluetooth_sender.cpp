@@ -2,6 +2,7 @@
 #include "host/desktop/bluetooth_sender.h"
 
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -22,10 +23,10 @@ bool BluetoothSender::isAvailable() { return !program().empty(); }
 bool BluetoothSender::send(const std::string& path, GAppLaunchContext* context, LaunchFailed failed) {
   const std::string found = program();
   if (found.empty()) {
-    failed("This desktop can’t send by Bluetooth.");
+    failed(_("This desktop can’t send by Bluetooth."));
     return false;
   }
-  return launchProgram({found, path}, "Bluetooth", context, std::move(failed));
+  return launchProgram({found, path}, _("Bluetooth"), context, std::move(failed));
 }
 
 }  // namespace vaelo

@@ -9,6 +9,7 @@
 #include <cstdio>
 
 #include "host/drive/promise_file.h"
+#include "host/support/texts.h"
 #include "host/support/unique_fd.h"
 
 namespace vaelo {
@@ -98,13 +99,13 @@ bool CopyOut::mayGoThere(GError** error) {
   const char* fromID = g_file_info_get_attribute_string(from.get(), G_FILE_ATTRIBUTE_ID_FILE);
   const char* toID = to ? g_file_info_get_attribute_string(to.get(), G_FILE_ATTRIBUTE_ID_FILE) : nullptr;
   if (g_file_equal(source_.get(), destination_.get()) || (fromID && g_strcmp0(fromID, toID) == 0)) {
-    return fail(error, G_IO_ERROR_EXISTS, "That is the item itself.");
+    return fail(error, G_IO_ERROR_EXISTS, _("That is the item itself."));
   }
   if (g_file_has_prefix(destination_.get(), source_.get())) {
-    return fail(error, G_IO_ERROR_WOULD_RECURSE, "A folder can’t be copied into itself.");
+    return fail(error, G_IO_ERROR_WOULD_RECURSE, _("A folder can’t be copied into itself."));
   }
   if (to && g_file_info_get_file_type(to.get()) == G_FILE_TYPE_DIRECTORY) {
-    return fail(error, G_IO_ERROR_EXISTS, "There is a folder of that name, which is left as it is.");
+    return fail(error, G_IO_ERROR_EXISTS, _("There is a folder of that name, which is left as it is."));
   }
   replaces_ = to != nullptr;
   return true;
@@ -167,7 +168,7 @@ bool CopyOut::putInPlace(GFile* made, GError** error) {
   if (!replaces_ && from && to) {
     // Says no, in one step, when something came there meanwhile.
     if (renameat2(AT_FDCWD, from, AT_FDCWD, to, RENAME_NOREPLACE) == 0) return true;
-    if (errno == EEXIST) return fail(error, G_IO_ERROR_EXISTS, "Something of that name has come there meanwhile.");
+    if (errno == EEXIST) return fail(error, G_IO_ERROR_EXISTS, _("Something of that name has come there meanwhile."));
     // Some file systems know no such step; the call below looks first then.
   }
   const auto flags = static_cast<GFileCopyFlags>(G_FILE_COPY_NO_FALLBACK_FOR_MOVE | G_FILE_COPY_NOFOLLOW_SYMLINKS |

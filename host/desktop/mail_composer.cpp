@@ -2,6 +2,7 @@
 #include "host/desktop/mail_composer.h"
 
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 #include "platform/url.h"
 
 namespace vaelo {
@@ -56,7 +57,7 @@ std::string MailComposer::mailtoLink(const std::string& attachment) {
 bool MailComposer::compose(const std::string& path, GAppLaunchContext* context, LaunchFailed failed) {
   const GRef<GAppInfo> program = mailProgram();
   if (!program) {
-    failed("No mail program is installed.");
+    failed(_("No mail program is installed."));
     return false;
   }
   const char* line = g_app_info_get_commandline(program.get());

@@ -6,6 +6,7 @@
 
 #include "host/drive/small_file.h"
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -87,7 +88,7 @@ Result<ActivityRecord> readActivityFile(const std::string& path, Date now) {
   if (*since > now + clockDifference) return refused("the activity is from the future");
   record.since = *since;
   record.deviceName = shownName(keyFileBytes(keys, group, "Device").value_or(""));
-  if (record.deviceName.empty()) record.deviceName = "another device";
+  if (record.deviceName.empty()) record.deviceName = _("another device");
   gchar** names = g_key_file_get_keys(keys, infoGroup, nullptr, nullptr);
   for (gchar** name = names; name && *name; ++name) {
     if (const auto value = keyFileBytes(keys, infoGroup, *name)) record.userInfo[*name] = *value;

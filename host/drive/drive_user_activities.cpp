@@ -155,13 +155,13 @@ class DriveUserActivities::Publisher : public CurrentActivity {
   std::optional<OtherActivity> readOther(const std::string& name, std::string& reason) {
     const std::string id = name.ends_with(suffix) ? name.substr(0, name.size() - suffix.size()) : "";
     if (!isDeviceID(id)) {
-      reason = "not the name of a device's file";
+      reason = "not the name of a device's file";  // not for people
       return std::nullopt;
     }
     Result<ActivityRecord> record = readActivityFile(folder() + "/" + name, queues_.now());
     if (!record) {
       if (record.error->code != FileErrorCode::ReadNoSuchFile) {
-        reason = record.error->localizedFailureReason.value_or("it can't be read");
+        reason = record.error->localizedFailureReason.value_or("it can't be read");  // not for people
       }
       return std::nullopt;
     }

@@ -12,20 +12,22 @@
 
 #include "host/drive/cloud_container.h"
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 #include "host/support/unique_fd.h"
 
 namespace vaelo {
 
 namespace {
 
-constexpr const char* welcomeName = "Welcome to Vaelo Drive.md";
+constexpr const char* welcomeName = N_("Welcome to Vaelo Drive");  // the name of a file: without "/"
+// TRANSLATORS: this is Markdown: "#" begins a heading, "-" a point of a list.
 constexpr const char* welcomeText =
-    "# Welcome to Vaelo Drive\n\n"
-    "This is your drive. Put documents and folders here, and find them on every device of yours.\n\n"
-    "- Touch a document to look at it.\n"
-    "- Hold a finger on an item to see what can be done with it.\n"
-    "- Pull the list down to refresh it.\n\n"
-    "You may delete this document whenever you like.\n";
+    N_("# Welcome to Vaelo Drive\n\n"
+       "This is your drive. Put documents and folders here, and find them on every device of yours.\n\n"
+       "- Touch a document to look at it.\n"
+       "- Hold a finger on an item to see what can be done with it.\n"
+       "- Pull the list down to refresh it.\n\n"
+       "You may delete this document whenever you like.\n");
 constexpr std::string_view suffix = ".ini";
 
 /// From the kernel, so that no two processes of this or another device can come to the same.
@@ -133,7 +135,7 @@ std::optional<Error> LocalAccounts::makeDrive(const std::string& mirror) const {
   }
   // A drive that outlived its account file is the user's; nothing is put into it.
   if (!isEmptyFolder(drive)) return std::nullopt;
-  auto failed = writeSmallFile(drive + "/" + welcomeName, welcomeText, false);
+  auto failed = writeSmallFile(drive + "/" + _(welcomeName) + ".md", _(welcomeText), false);
   if (failed && !isThere(failed)) return failed;
   failed = writeSmallFile(drive + "/" + ContainerManifestName, "[Container]\nName=Vaelo Drive\n", false);
   if (failed && !isThere(failed)) return failed;

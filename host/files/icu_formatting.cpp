@@ -2,12 +2,14 @@
 #include "host/files/icu_formatting.h"
 
 #include <glib.h>
-#include <libintl.h>
+#include <unicode/plurrule.h>
 
 #include <cmath>
 #include <iterator>
 
 #include "host/files/user_locale.h"
+#include "host/support/message_catalogue.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -20,12 +22,13 @@ struct CountTexts {
 };
 
 constexpr CountTexts Counts[] = {
-    {".DICT.ITEMS.%d", "%@ item", "%@ items"},
-    {".DICT.ITEMS_SELECTED.%d", "%@ Item Selected", "%@ Items Selected"},
-    {".DICT.MOVE_ITEMS.%d", "Move %@ Item", "Move %@ Items"},
-    {".DICT.CANNOT_MOVE_ITEMS.%d", "%@ item can’t be moved.", "%@ items can’t be moved."},
-    {".DICT.CANNOT_DELETE_ITEMS.%d", "%@ item can’t be deleted.", "%@ items can’t be deleted."},
-    {".DICT.AVAILABLE.%g", "%2$@ available", "%2$@ available"},
+    {".DICT.ITEMS.%d", NP_("%@ item", "%@ items")},
+    {".DICT.ITEMS_SELECTED.%d", NP_("%@ Item Selected", "%@ Items Selected")},
+    {".DICT.MOVE_ITEMS.%d", NP_("Move %@ Item", "Move %@ Items")},
+    {".DICT.CANNOT_MOVE_ITEMS.%d", NP_("%@ item can’t be moved.", "%@ items can’t be moved.")},
+    {".DICT.CANNOT_DELETE_ITEMS.%d", NP_("%@ item can’t be deleted.", "%@ items can’t be deleted.")},
+    // TRANSLATORS: %1$@ is a number that may have a fraction, %2$@ the same with its unit, as in "5.25 GB available".
+    {".DICT.AVAILABLE.%g", NP_("%2$@ available", "%2$@ available")},
 };
 
 /// The text for a counted key by its English forms; any other key is its own English text.
@@ -36,18 +39,34 @@ std::string textFor(const std::string& key, std::uint64_t count) {
   return gettext(key.c_str());
 }
 
+/// A count whose plural form is that of the number: gettext's rules know whole numbers alone.
+std::uint64_t countLike(double number) {
+  constexpr std::uint64_t genitive = 2;  // where fractions have a form of their own, it is the one after two: "1,5 файла"
+  constexpr int enough = 102;            // counts, among which each form is met
+  if (number >= 0 && number < 1e15 && number == std::floor(number)) return static_cast<std::uint64_t>(number);
+  UErrorCode status = U_ZERO_ERROR;
+  const std::unique_ptr<icu::PluralRules> rules(icu::PluralRules::forLocale(icu::Locale(messageLocale().c_str()), status));
+  if (U_FAILURE(status) || !rules) return genitive;
+  const icu::UnicodeString form = rules->select(number);
+  for (int count = 0; count < enough; ++count) {
+    if (rules->select(count) == form) return static_cast<std::uint64_t>(count);
+  }
+  return genitive;
+}
+
 struct Amount {
   double number;
   int fractionDigits;
-  const char* unit;  ///< null for bytes
+  const char* format;  ///< with the unit; null for bytes
 };
 
 Amount amountOf(std::uint64_t bytes, ByteCountStyle style) {
   struct Unit {
-    const char* name;
+    const char* format;
     int fractionDigits;
   };
-  constexpr Unit units[] = {{nullptr, 0}, {"KB", 0}, {"MB", 1}, {"GB", 2}, {"TB", 2}, {"PB", 2}, {"EB", 2}};
+  constexpr Unit units[] = {{nullptr, 0},     {N_("%@ KB"), 0}, {N_("%@ MB"), 1}, {N_("%@ GB"), 2},
+                            {N_("%@ TB"), 2}, {N_("%@ PB"), 2}, {N_("%@ EB"), 2}};
   const double base = style == ByteCountStyle::Binary ? 1024 : 1000;
   auto number = static_cast<double>(bytes);
   std::size_t at = 0;
@@ -57,7 +76,7 @@ Amount amountOf(std::uint64_t bytes, ByteCountStyle style) {
     number /= base;
     ++at;
   }
-  return {number, units[at].fractionDigits, units[at].name};
+  return {number, units[at].fractionDigits, units[at].format};
 }
 
 icu::DateFormat::EStyle icuStyle(DateStyle style) {
@@ -102,8 +121,8 @@ std::string IcuFormatting::byteCount(std::uint64_t bytes, ByteCountStyle style, 
     return g_ascii_formatd(digits, sizeof digits, "%.12g", std::round(amount.number * scale) / scale);
   }
   const std::string number = localizedNumber(amount.number, amount.fractionDigits);
-  if (amount.unit == nullptr) return filled(ngettext("%@ byte", "%@ bytes", static_cast<unsigned long>(bytes)), {number});
-  return filled(gettext("%@ %@"), {number, gettext(amount.unit)});
+  if (!amount.format) return filled(ngettext("%@ byte", "%@ bytes", static_cast<unsigned long>(bytes)), {number});
+  return filled(gettext(amount.format), {number});
 }
 
 std::string IcuFormatting::localizedDate(Date date, DateStyle dateStyle, DateStyle timeStyle) {
@@ -132,7 +151,7 @@ std::string IcuFormatting::localizedCount(const std::string& key, std::int64_t c
 std::string IcuFormatting::localizedAmount(const std::string& key, double number, const std::string& text) {
   char digits[G_ASCII_DTOSTR_BUF_SIZE];
   g_ascii_formatd(digits, sizeof digits, "%g", number);
-  return filled(textFor(key, number == 1 ? 1 : 2), {digits, text});
+  return filled(textFor(key, countLike(number)), {digits, text});
 }
 
 std::string IcuFormatting::filled(const std::string& format, const std::vector<std::string>& arguments) {

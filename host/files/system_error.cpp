@@ -1,12 +1,11 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/files/system_error.h"
 
-#include <libintl.h>
-
 #include <cerrno>
 #include <climits>
 
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -17,28 +16,28 @@ const char* wordsFor(int number) {
   switch (number) {
     case ENOENT:
     case ENOTDIR:
-      return gettext("The file “%s” doesn’t exist any more.");
+      return _("The file “%s” doesn’t exist any more.");
     case EACCES:
     case EPERM:
-      return gettext("You don’t have permission to use “%s”.");
+      return _("You don’t have permission to use “%s”.");
     case EEXIST:
     case ENOTEMPTY:
-      return gettext("An item named “%s” already exists.");
+      return _("An item named “%s” already exists.");
     case ENAMETOOLONG:
-      return gettext("“%s” lies too deep in its folders.");
+      return _("“%s” lies too deep in its folders.");
     case EILSEQ:
-      return gettext("The disk can’t keep the name “%s”.");
+      return _("The disk can’t keep the name “%s”.");
     case ENOSPC:
     case EDQUOT:
-      return gettext("There is not enough space for “%s”. Delete something and try again.");
+      return _("There is not enough space for “%s”. Delete something and try again.");
     case EROFS:
-      return gettext("“%s” is on a disk that can only be read.");
+      return _("“%s” is on a disk that can only be read.");
     case ELOOP:
-      return gettext("The links of “%s” run in a circle.");
+      return _("The links of “%s” run in a circle.");
     case EBUSY:
-      return gettext("“%s” is being changed by another program. Try again later.");
+      return _("“%s” is being changed by another program. Try again later.");
     default:
-      return gettext("“%s” can’t be used.");
+      return _("“%s” can’t be used.");
   }
 }
 
@@ -49,9 +48,8 @@ std::string wordsForLongName(const std::string& name) {
     do --length;
     while (length > 0 && (static_cast<unsigned char>(name[length]) & 0xC0) == 0x80);
   }
-  std::string words = ngettext("The name is too long by %s character.", "The name is too long by %s characters.", excess);
-  if (const std::size_t at = words.find("%s"); at != std::string::npos) words.replace(at, 2, std::to_string(excess));
-  return words;
+  return filled(ngettext("The name is too long by %s character.", "The name is too long by %s characters.", excess),
+                {numberText(static_cast<std::int64_t>(excess))});
 }
 
 }  // namespace
@@ -69,11 +67,7 @@ Error describedError(int number, const std::string& path, FileAccess access) {
       return error;
     }
   }
-  std::string words = wordsFor(number);
-  const std::string name = takeString(g_filename_display_basename(path.c_str()));
-  // Not printf: a translation must not be able to ask for more than the name.
-  if (const std::size_t at = words.find("%s"); at != std::string::npos) words.replace(at, 2, name);
-  error.localizedDescription = std::move(words);
+  error.localizedDescription = filled(wordsFor(number), {takeString(g_filename_display_basename(path.c_str()))});
   return error;
 }
 

@@ -2,7 +2,6 @@
 #include "host/gtk/accounts_page.h"
 
 #include <adwaita.h>
-#include <glib/gi18n.h>
 
 #include <functional>
 #include <memory>
@@ -12,6 +11,7 @@
 #include "host/drive/local_accounts.h"
 #include "host/gtk/list/worker.h"
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 #include "platform/platform.h"
 
 namespace vaelo {
@@ -23,7 +23,7 @@ std::string messageFor(const Error& error) {
   if (error.code == FileErrorCode::WriteFileExists) return _("There is an account of this name already.");
   if (error.code == FileErrorCode::NoSuchFile) return _("This account is no longer on the device.");
   if (error.code == FileErrorCode::WriteOutOfSpace) return _("There is no space left on the disk.");
-  return error.localizedFailureReason.value_or(error.description());
+  return translated(error.localizedFailureReason.value_or(error.description()));
 }
 
 /// Lives as long as its window.
@@ -104,7 +104,8 @@ class AccountsPage {
     adw_action_row_set_subtitle(ADW_ACTION_ROW(row), isIn ? _("Signed in") : _("Signed out"));
     GtkWidget* button = gtk_button_new_with_label(isIn ? _("Sign Out") : _("Sign In"));
     gtk_widget_set_valign(button, GTK_ALIGN_CENTER);
-    const std::string spoken = std::string(gtk_button_get_label(GTK_BUTTON(button))) + ": " + name;
+    // TRANSLATORS: what a button's name is read aloud as: what it does, and the account's name.
+    const std::string spoken = filled(_("%s: %s"), {gtk_button_get_label(GTK_BUTTON(button)), name});
     gtk_accessible_update_property(GTK_ACCESSIBLE(button), GTK_ACCESSIBLE_PROPERTY_LABEL, spoken.c_str(), -1);
     struct Press {
       AccountsPage* page;

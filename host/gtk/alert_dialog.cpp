@@ -4,6 +4,7 @@
 #include <adwaita.h>
 
 #include "host/gtk/prompt_dialog.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -47,7 +48,7 @@ GtkWindow* showAlertDialog(const std::shared_ptr<AlertController>& alert, GtkWin
 
 void showMessage(GtkWindow* over, const std::string& title, const std::string& text) {
   GtkWidget* dialog = adw_message_dialog_new(over, title.c_str(), text.c_str());
-  adw_message_dialog_add_response(ADW_MESSAGE_DIALOG(dialog), "close", "OK");
+  adw_message_dialog_add_response(ADW_MESSAGE_DIALOG(dialog), "close", _("OK"));
   gtk_window_present(GTK_WINDOW(dialog));
 }
 

@@ -4,6 +4,7 @@
 #include <memory>
 
 #include "host/gtk/framed_view.h"
+#include "host/support/texts.h"
 #include "platform/ui/button.h"
 
 namespace vaelo {
@@ -18,15 +19,15 @@ struct SystemLook {
 SystemLook lookOf(SystemItem item) {
   switch (item) {
     case SystemItem::Cancel:
-      return {nullptr, "Cancel"};
+      return {nullptr, _("Cancel")};
     case SystemItem::Done:
-      return {nullptr, "Done"};
+      return {nullptr, _("Done")};
     case SystemItem::Trash:
-      return {"user-trash-symbolic", "Delete"};
+      return {"user-trash-symbolic", _("Delete")};
     case SystemItem::Action:
-      return {"emblem-shared-symbolic", "Share"};
+      return {"emblem-shared-symbolic", _("Share")};
     case SystemItem::Organize:
-      return {"folder-symbolic", "Move"};
+      return {"folder-symbolic", _("Move")};
     case SystemItem::FlexibleSpace:
     case SystemItem::FixedSpace:
       break;

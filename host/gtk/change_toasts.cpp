@@ -1,11 +1,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/change_toasts.h"
 
-#include <libintl.h>
-
 #include "host/gtk/gtk_screens.h"
 #include "host/gtk/gtk_window.h"
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -16,24 +15,7 @@ constexpr unsigned UndoSeconds = 8;
 std::string shown(const std::string& name) { return takeString(g_filename_display_name(name.c_str())); }
 std::string nameOf(const URL& url) { return shown(url.lastPathComponent()); }
 
-/// Fills "%s" and "%lu" one after the other: a translation can't ask for more than there is.
-std::string filled(std::string text, std::initializer_list<std::string> values) {
-  std::size_t at = 0;
-  for (const std::string& value : values) {
-    at = text.find('%', at);
-    if (at == std::string::npos) break;
-    const std::size_t length = text.compare(at, 3, "%lu") == 0 ? 3 : 2;
-    text.replace(at, length, value);
-    at += value.size();
-  }
-  return text;
-}
-
-std::string number(std::size_t value) { return std::to_string(value); }
-
-std::string counted(const char* one, const char* many, std::size_t count) {
-  return filled(ngettext(one, many, count), {number(count)});
-}
+std::string number(std::size_t value) { return numberText(static_cast<std::int64_t>(value)); }
 
 void forget(AdwToast*& toast) {
   if (!toast) return;
@@ -66,12 +48,12 @@ std::string ChangeToasts::folderName(const URL& folder) const {
 }
 
 std::string ChangeToasts::textFor(const MoveHistory::Batch& batch) const {
-  if (batch.size() > 1) return counted("Moved %lu item", "Moved %lu items", batch.size());
+  if (batch.size() > 1) return filled(ngettext("Moved %s item", "Moved %s items", batch.size()), {number(batch.size())});
   const URL& from = batch.front().from;
   const URL& to = batch.front().to;
   const URL folder = to.deletingLastPathComponent();
-  if (from.deletingLastPathComponent() == folder) return filled(gettext("Renamed to “%s”"), {nameOf(to)});
-  return filled(gettext("Moved “%s” to “%s”"), {nameOf(to), folderName(folder)});
+  if (from.deletingLastPathComponent() == folder) return filled(_("Renamed to “%s”"), {nameOf(to)});
+  return filled(_("Moved “%s” to “%s”"), {nameOf(to), folderName(folder)});
 }
 
 void ChangeToasts::offerUndo(const std::shared_ptr<const MoveHistory::Batch>& batch) {
@@ -79,7 +61,7 @@ void ChangeToasts::offerUndo(const std::shared_ptr<const MoveHistory::Batch>& ba
   if (!window) return;
   forget(undo_);
   AdwToast* toast = window->showToast(
-      textFor(*batch), gettext("Undo"), [this, batch] { undo(*batch); }, UndoSeconds);
+      textFor(*batch), _("Undo"), [this, batch] { undo(*batch); }, UndoSeconds);
   g_set_weak_pointer(&undo_, toast);
 }
 
@@ -89,7 +71,8 @@ void ChangeToasts::undo(const MoveHistory::Batch& batch) {
     const Error& error = errors.front();
     say(error.localizedDescription ? *error.localizedDescription : error.description());
   } else if (!errors.empty()) {
-    say(counted("%lu item can’t be put back.", "%lu items can’t be put back.", errors.size()));
+    say(filled(ngettext("%s item can’t be put back.", "%s items can’t be put back.", errors.size()),
+               {number(errors.size())}));
   }
 }
 
@@ -102,32 +85,33 @@ void ChangeToasts::removalWent(const TreeRemovals::News& news) {
     case Stage::Waiting: {
       forget(removal_);
       const std::string text =
-          filled(ngettext("Deleting “%s” and its %lu item…", "Deleting “%s” and its %lu items…", news.total - 1),
+          filled(ngettext("Deleting “%s” and its %s item…", "Deleting “%s” and its %s items…", news.total - 1),
                  {name, number(news.total - 1)});
       AdwToast* toast = window->showToast(
-          text, gettext("Cancel"), [this] { drive_.removals().cancel(); }, 0);
+          text, _("Cancel"), [this] { drive_.removals().cancel(); }, 0);
       g_set_weak_pointer(&removal_, toast);
       return;
     }
     case Stage::Removing:
       if (!removal_) return;  // the user has closed it
-      gtk_label_set_text(
-          GTK_LABEL(adw_toast_get_custom_title(removal_)),
-          filled(gettext("Deleting “%s”: %lu of %lu items…"), {name, number(news.removed), number(news.total)}).c_str());
+      gtk_label_set_text(GTK_LABEL(adw_toast_get_custom_title(removal_)),
+                         filled(ngettext("Deleting “%s”: %s of %s item…", "Deleting “%s”: %s of %s items…", news.total),
+                                {name, number(news.removed), number(news.total)})
+                             .c_str());
       return;
     case Stage::Removed:
       forget(removal_);
       return;
     case Stage::PutBack:
       forget(removal_);
-      say(news.removed == 0 ? filled(gettext("“%s” is back, with everything in it."), {nameOf(URL(news.place))})
-                            : filled(ngettext("“%s” is back. %lu of its items was deleted already.",
-                                              "“%s” is back. %lu of its items were deleted already.", news.removed),
+      say(news.removed == 0 ? filled(_("“%s” is back, with everything in it."), {nameOf(URL(news.place))})
+                            : filled(ngettext("“%s” is back. %s of its items was deleted already.",
+                                              "“%s” is back. %s of its items were deleted already.", news.removed),
                                      {nameOf(URL(news.place)), number(news.removed)}));
       return;
     case Stage::Failed:
       forget(removal_);
-      say(filled(gettext("“%s” can’t be deleted entirely. What is left of it is back."), {name}));
+      say(filled(_("“%s” can’t be deleted entirely. What is left of it is back."), {name}));
       return;
   }
 }

@@ -3,6 +3,8 @@
 
 #include <utility>
 
+#include "host/support/texts.h"
+
 namespace vaelo {
 
 namespace {
@@ -68,7 +70,7 @@ void ContinueOffer::resolve() {
           const auto self = weak.lock();
           if (!self || !self->offered_ || self->offered_->activity != offer.activity) return;
           if (!url.value) return self->show(std::nullopt, std::nullopt);
-          self->show(offer, "Continue from " + offer.deviceName + ": " + self->nameOf_(*url.value));
+          self->show(offer, filled(_("Continue from %s: %s"), {offer.deviceName, self->nameOf_(*url.value)}));
         });
       });
 }
@@ -126,8 +128,8 @@ GtkWidget* makeContinueBanner(const std::shared_ptr<ContinueOffer>& offer) {
   gtk_widget_set_size_request(dismiss, TouchSize, TouchSize);
   gtk_widget_set_valign(dismiss, GTK_ALIGN_CENTER);
   gtk_widget_add_css_class(dismiss, "flat");
-  gtk_widget_set_tooltip_text(dismiss, "Dismiss");
-  gtk_accessible_update_property(GTK_ACCESSIBLE(dismiss), GTK_ACCESSIBLE_PROPERTY_LABEL, "Dismiss", -1);
+  gtk_widget_set_tooltip_text(dismiss, _("Dismiss"));
+  gtk_accessible_update_property(GTK_ACCESSIBLE(dismiss), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Dismiss"), -1);
   for (const auto set :
        {gtk_widget_set_margin_start, gtk_widget_set_margin_end, gtk_widget_set_margin_top, gtk_widget_set_margin_bottom}) {
     set(box, 6);

@@ -2,21 +2,21 @@
 #include "host/gtk/drive_unavailable_screen.h"
 
 #include <adwaita.h>
-#include <glib/gi18n.h>
 
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
 namespace {
 
 std::string reasonOf(const std::optional<Error>& setUpFailure) {
-  if (!setUpFailure) return "No account is signed in on this device. Sign in to see your documents.";
+  if (!setUpFailure) return _("No account is signed in on this device. Sign in to see your documents.");
   if (setUpFailure->code == FileErrorCode::WriteOutOfSpace) {
-    return "There is no space left on the disk to set up your drive. Make room, then start Vaelo Drive again.";
+    return _("There is no space left on the disk to set up your drive. Make room, then start Vaelo Drive again.");
   }
   const std::string reason = setUpFailure->localizedFailureReason.value_or(setUpFailure->description());
-  return "Your drive can’t be set up: " + reason + ". Start Vaelo Drive again once this is mended.";
+  return filled(_("Your drive can’t be set up: %s. Start Vaelo Drive again once this is mended."), {translated(reason)});
 }
 
 }  // namespace
@@ -25,7 +25,7 @@ DriveUnavailableController::DriveUnavailableController(const std::optional<Error
     : page_(GTK_WIDGET(g_object_ref_sink(adw_status_page_new()))) {
   adw_status_page_set_icon_name(ADW_STATUS_PAGE(page_),
                                 setUpFailure ? "drive-harddisk-symbolic" : "network-offline-symbolic");
-  adw_status_page_set_title(ADW_STATUS_PAGE(page_), "Vaelo Drive is not available");
+  adw_status_page_set_title(ADW_STATUS_PAGE(page_), _("Vaelo Drive is not available"));
   const std::string reason = takeString(g_markup_escape_text(reasonOf(setUpFailure).c_str(), -1));
   adw_status_page_set_description(ADW_STATUS_PAGE(page_), reason.c_str());
   if (!setUpFailure) {

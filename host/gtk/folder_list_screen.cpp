@@ -5,6 +5,7 @@
 
 #include "host/gtk/item_actions_menu.h"
 #include "host/gtk/tags_popover.h"
+#include "host/support/texts.h"
 #include "platform/platform.h"
 
 namespace vaelo {
@@ -219,14 +220,14 @@ void FolderListScreen::activated(FolderView& view, const std::string& name, cons
 }
 
 std::vector<GtkWidget*> FolderListScreen::headerWidgets() {
-  GtkWidget* search = iconButton("system-search-symbolic", "Search");
+  GtkWidget* search = iconButton("system-search-symbolic", _("Search"));
   gtk_actionable_set_action_name(GTK_ACTIONABLE(search), "win.search");
-  GtkWidget* mode = iconButton("view-grid-symbolic", "View as grid");
+  GtkWidget* mode = iconButton("view-grid-symbolic", _("View as grid"));
   g_signal_connect(mode, "clicked", G_CALLBACK(+[](GtkButton* button, FolderListScreen* self) {
                      FolderView& view = self->folderView();
                      const bool grid = view.mode() != FolderView::Mode::Grid;
                      view.setMode(grid ? FolderView::Mode::Grid : FolderView::Mode::List);
-                     const char* label = grid ? "View as list" : "View as grid";
+                     const char* label = grid ? _("View as list") : _("View as grid");
                      gtk_button_set_icon_name(button, grid ? "view-list-symbolic" : "view-grid-symbolic");
                      gtk_widget_set_tooltip_text(GTK_WIDGET(button), label);
                      gtk_accessible_update_property(GTK_ACCESSIBLE(button), GTK_ACCESSIBLE_PROPERTY_LABEL, label, -1);
@@ -253,8 +254,8 @@ void FolderListScreen::showSearch(const std::shared_ptr<SearchController>& searc
   if (!searchBar_) {
     searchBar_ = gtk_search_bar_new();
     searchEntry_ = gtk_search_entry_new();
-    gtk_accessible_update_property(GTK_ACCESSIBLE(searchEntry_), GTK_ACCESSIBLE_PROPERTY_LABEL, "Search below this folder",
-                                   -1);
+    gtk_accessible_update_property(GTK_ACCESSIBLE(searchEntry_), GTK_ACCESSIBLE_PROPERTY_LABEL,
+                                   _("Search below this folder"), -1);
     GtkWidget* clamp = adw_clamp_new();
     gtk_widget_set_hexpand(clamp, TRUE);
     adw_clamp_set_child(ADW_CLAMP(clamp), searchEntry_);
@@ -262,7 +263,7 @@ void FolderListScreen::showSearch(const std::shared_ptr<SearchController>& searc
     gtk_box_prepend(GTK_BOX(content_), searchBar_);
     results_ = std::make_unique<FolderView>();
     gtk_stack_add_child(GTK_STACK(stack_), results_->widget());
-    results_->setEmptyText("Nothing found", "No item below this folder has such a name.");
+    results_->setEmptyText(_("Nothing found"), _("No item below this folder has such a name."));
     FolderViewEvents events;
     events.activated = [this](const std::string& path) { activated(*results_, path, URL(path)); };
     events.contextRequested = [this](const std::string& path, GtkWidget* over, const GdkRectangle& at) {

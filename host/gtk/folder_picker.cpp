@@ -3,6 +3,7 @@
 
 #include "fileops/ui_utils.h"
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 #include "items/file_utils.h"
 #include "platform/platform.h"
 
@@ -26,7 +27,7 @@ FolderPicker::FolderPicker(std::shared_ptr<DocumentTargetSelectionController> pi
     if (shown_) goTo(URL(path, true));
   };
   view_.setEvents(std::move(events));
-  view_.setEmptyText("No folders here", "");
+  view_.setEmptyText(_("No folders here"), "");
   // Within one library the way begins at its top; across libraries at the drive's root, which lists them.
   std::optional<URL> top = drive_.defaultContainerURL();
   if (!picker_->allowsCrossContainer() && !picker_->itemsToMove().empty()) {
@@ -49,7 +50,7 @@ void FolderPicker::build(GtkWindow* over) {
   window_ = adw_window_new();
   gtk_window_set_transient_for(GTK_WINDOW(window_), over);
   gtk_window_set_modal(GTK_WINDOW(window_), TRUE);
-  gtk_window_set_title(GTK_WINDOW(window_), "Move");
+  gtk_window_set_title(GTK_WINDOW(window_), _("Move"));
   int width = 0;
   int height = 0;
   gtk_window_get_default_size(over, &width, &height);
@@ -58,21 +59,21 @@ void FolderPicker::build(GtkWindow* over) {
   GtkWidget* header = adw_header_bar_new();
   adw_header_bar_set_show_end_title_buttons(ADW_HEADER_BAR(header), FALSE);
   adw_header_bar_set_show_start_title_buttons(ADW_HEADER_BAR(header), FALSE);
-  GtkWidget* cancel = gtk_button_new_with_label("Cancel");
+  GtkWidget* cancel = gtk_button_new_with_label(_("Cancel"));
   gtk_actionable_set_action_name(GTK_ACTIONABLE(cancel), "window.close");
   adw_header_bar_pack_start(ADW_HEADER_BAR(header), cancel);
   back_ = gtk_button_new_from_icon_name("go-previous-symbolic");
-  describe(back_, "Back");
+  describe(back_, _("Back"));
   g_signal_connect_swapped(back_, "clicked", G_CALLBACK(+[](FolderPicker* self) { self->goUp(); }), this);
   adw_header_bar_pack_start(ADW_HEADER_BAR(header), back_);
   title_ = adw_window_title_new(nullptr, invitation().c_str());
   adw_header_bar_set_title_widget(ADW_HEADER_BAR(header), title_);
-  move_ = gtk_button_new_with_label("Move");
+  move_ = gtk_button_new_with_label(_("Move"));
   gtk_widget_add_css_class(move_, "suggested-action");
   g_signal_connect_swapped(move_, "clicked", G_CALLBACK(+[](FolderPicker* self) { self->choose(); }), this);
   adw_header_bar_pack_end(ADW_HEADER_BAR(header), move_);
   newFolder_ = gtk_button_new_from_icon_name("folder-new-symbolic");
-  describe(newFolder_, "New Folder");
+  describe(newFolder_, _("New Folder"));
   g_signal_connect_swapped(newFolder_, "clicked", G_CALLBACK(+[](FolderPicker* self) { self->askForNewFolder(); }), this);
   adw_header_bar_pack_end(ADW_HEADER_BAR(header), newFolder_);
   gtk_box_append(GTK_BOX(box), header);
@@ -107,8 +108,11 @@ void FolderPicker::build(GtkWindow* over) {
 
 std::string FolderPicker::invitation() const {
   const std::vector<URL>& items = picker_->itemsToMove();
-  if (items.size() != 1) return "Move " + std::to_string(items.size()) + " items to…";
-  return "Move “" + takeString(g_filename_display_name(items.front().lastPathComponent().c_str())) + "” to…";
+  if (items.size() != 1) {
+    return filled(ngettext("Move %s item to…", "Move %s items to…", items.size()),
+                  {numberText(static_cast<std::int64_t>(items.size()))});
+  }
+  return filled(_("Move “%s” to…"), {takeString(g_filename_display_name(items.front().lastPathComponent().c_str()))});
 }
 
 std::string FolderPicker::titleOf(const URL& folder) const {
@@ -162,13 +166,13 @@ void FolderPicker::choose() {
 }
 
 void FolderPicker::askForNewFolder() {
-  GtkWidget* dialog = adw_message_dialog_new(GTK_WINDOW(window_), "New Folder", "Enter a name for this folder.");
+  GtkWidget* dialog = adw_message_dialog_new(GTK_WINDOW(window_), _("New Folder"), _("Enter a name for this folder."));
   GtkWidget* entry = gtk_entry_new();
-  gtk_entry_set_placeholder_text(GTK_ENTRY(entry), "Folder Name");
+  gtk_entry_set_placeholder_text(GTK_ENTRY(entry), _("Folder Name"));
   gtk_entry_set_activates_default(GTK_ENTRY(entry), TRUE);
-  gtk_accessible_update_property(GTK_ACCESSIBLE(entry), GTK_ACCESSIBLE_PROPERTY_LABEL, "Folder Name", -1);
+  gtk_accessible_update_property(GTK_ACCESSIBLE(entry), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Folder Name"), -1);
   adw_message_dialog_set_extra_child(ADW_MESSAGE_DIALOG(dialog), entry);
-  adw_message_dialog_add_responses(ADW_MESSAGE_DIALOG(dialog), "cancel", "_Cancel", "create", "C_reate", nullptr);
+  adw_message_dialog_add_responses(ADW_MESSAGE_DIALOG(dialog), "cancel", _("_Cancel"), "create", _("C_reate"), nullptr);
   adw_message_dialog_set_default_response(ADW_MESSAGE_DIALOG(dialog), "create");
   adw_message_dialog_set_response_enabled(ADW_MESSAGE_DIALOG(dialog), "create", FALSE);
   g_signal_connect(entry, "changed", G_CALLBACK(+[](GtkEditable* changed, AdwMessageDialog* shown) {

@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/gtk_application_loop.h"
 
-#include <unicode/uloc.h>
-
 #include "host/desktop/recent_documents.h"
 #include "host/drive/drive_user_activities.h"
 #include "host/drive/promise_file.h"
@@ -13,6 +11,8 @@
 #include "host/gtk/gtk_window.h"
 #include "host/gtk/preview/portable_document_marks.h"
 #include "host/support/glib_ptr.h"
+#include "host/support/message_catalogue.h"
+#include "host/support/texts.h"
 #include "items/url_additions.h"
 #include "platform/archive.h"
 #include "platform/platform.h"
@@ -22,11 +22,6 @@ namespace vaelo {
 namespace {
 
 constexpr unsigned IdleServiceEnds = 30000;  // milliseconds without a call from the desktop
-
-constexpr GOptionEntry Options[] = {
-    {"search", 0, 0, G_OPTION_ARG_NONE, nullptr, "Search in the drive", nullptr},
-    {"recent-document", 0, 0, G_OPTION_ARG_NONE, nullptr, "Open the document used last", nullptr},
-    {nullptr, 0, 0, G_OPTION_ARG_NONE, nullptr, nullptr, nullptr}};
 
 bool hasOption(GApplicationCommandLine* line, const char* name) {
   return g_variant_dict_contains(g_application_command_line_get_options_dict(line), name);
@@ -59,14 +54,18 @@ int GtkApplicationLoop::run(int argc, char** argv, std::function<std::shared_ptr
                                        },
                                        [this] { searchProvider_.unexport(); }});
   screens_.setApplication(GTK_APPLICATION(application_));
-  g_application_set_option_context_parameter_string(G_APPLICATION(application_), "[LINK...]");
+  g_application_set_option_context_parameter_string(G_APPLICATION(application_), _("[LINK...]"));
   g_application_set_option_context_summary(G_APPLICATION(application_),
-                                           "Browse and manage the documents of your cloud drive.\n"
-                                           "LINK is one of the vaelodriveapp: scheme and opens that item.");
-  g_application_add_main_option_entries(G_APPLICATION(application_), Options);
-  // Our texts follow the user's list of languages, so the direction does too, not the locale of numbers and dates.
+                                           _("Browse and manage the documents of your cloud drive.\n"
+                                             "LINK is one of the vaelodriveapp: scheme and opens that item."));
+  const GOptionEntry options[] = {
+      {"search", 0, 0, G_OPTION_ARG_NONE, nullptr, _("Search in the drive"), nullptr},
+      {"recent-document", 0, 0, G_OPTION_ARG_NONE, nullptr, _("Open the document used last"), nullptr},
+      {nullptr, 0, 0, G_OPTION_ARG_NONE, nullptr, nullptr, nullptr}};
+  g_application_add_main_option_entries(G_APPLICATION(application_), options);
+  // The toolkit goes by its own translations, which need not be installed.
   g_signal_connect(application_, "startup", G_CALLBACK(+[](GApplication*, gpointer) {
-                     if (uloc_isRightToLeft(g_get_language_names()[0])) gtk_widget_set_default_direction(GTK_TEXT_DIR_RTL);
+                     gtk_widget_set_default_direction(messagesAreRightToLeft() ? GTK_TEXT_DIR_RTL : GTK_TEXT_DIR_LTR);
                    }),
                    nullptr);
   g_signal_connect_swapped(application_, "startup", G_CALLBACK(+[](GtkApplicationLoop* self) { self->beginService(); }),
@@ -171,7 +170,7 @@ void GtkApplicationLoop::openRecentDocument() {
   });
   if (document) return performShortcut({RecentDocumentShortcutType, {{RecentDocumentURLKey, archiveURL(*document)}}});
   activate();
-  if (const auto window = screens_.window()) window->showToast("No document of this drive was used recently.");
+  if (const auto window = screens_.window()) window->showToast(_("No document of this drive was used recently."));
 }
 
 void GtkApplicationLoop::continueSearch(const std::string& query, std::uint32_t timestamp) {
@@ -187,7 +186,7 @@ void GtkApplicationLoop::openSearchResult(const std::string& documentID, std::ui
   activity->setUserInfo({{SearchResultIdentifierKey, documentID}});
   continueActivity(activity);
   const auto window = screens_.window();
-  if (window && !vlo_URLFromDocumentID(documentID)) window->showToast("This search result is no longer in the drive.");
+  if (window && !vlo_URLFromDocumentID(documentID)) window->showToast(_("This search result is no longer in the drive."));
 }
 
 void GtkApplicationLoop::launch(const LaunchOptions& options) {
@@ -202,7 +201,7 @@ void GtkApplicationLoop::launch(const LaunchOptions& options) {
   tellOfDamage();
   rebuiltToken_ = notifications_.addObserver(DocumentIndexRebuiltNotification, [this](const Notification&) {
     if (const auto shown = screens_.window()) {
-      shown->showToast("The drive’s index was damaged. It has been rebuilt, and the old one kept.", true);
+      shown->showToast(_("The drive’s index was damaged. It has been rebuilt, and the old one kept."), true);
     }
   });
 }
@@ -210,7 +209,8 @@ void GtkApplicationLoop::launch(const LaunchOptions& options) {
 void GtkApplicationLoop::tellOfDamage() {
   if (!drive_.accountWasDamaged()) return;
   screens_.window()->showToast(
-      "The file of your account was damaged. It was kept aside, and a new one made for the documents on this device.", true);
+      _("The file of your account was damaged. It was kept aside, and a new one made for the documents on this device."),
+      true);
 }
 
 void GtkApplicationLoop::offerToContinue() {
@@ -250,7 +250,8 @@ int GtkApplicationLoop::commandLine(GApplicationCommandLine* line) {
     if (openLink(arguments[i])) continue;
     // It goes to the other process as text, which an argument need not be.
     const std::string shown = takeString(g_utf8_make_valid(arguments[i], -1));
-    g_application_command_line_printerr(line, "vaelo-drive: “%s” leads to nothing in the drive.\n", shown.c_str());
+    const std::string problem = filled(_("vaelo-drive: “%s” leads to nothing in the drive."), {shown});
+    g_application_command_line_printerr(line, "%s\n", problem.c_str());
     status = 1;
   }
   if (first && count == 1 && !search && !recent) restore();
@@ -266,7 +267,7 @@ bool GtkApplicationLoop::openLink(const std::string& link) {
     return true;
   }
   if (delegate_->applicationOpenURLOptions(link, {})) return true;
-  if (const auto window = screens_.window()) window->showToast("The link leads to nothing in this drive.");
+  if (const auto window = screens_.window()) window->showToast(_("The link leads to nothing in this drive."));
   return false;
 }
 
@@ -318,7 +319,9 @@ void GtkApplicationLoop::showAbout() {
   if (!window) return;
   adw_show_about_window(window->widget(), "application-name", "Vaelo Drive", "application-icon", "com.marrow.VaeloDrive",
                         "version", VAELO_VERSION, "license-type", GTK_LICENSE_GPL_3_0, "comments",
-                        "Browse and manage the documents of your cloud drive.", nullptr);
+                        _("Browse and manage the documents of your cloud drive."), "translator-credits",
+                        // TRANSLATORS: your name and address, a line each; they are shown in the About window.
+                        _("translator-credits"), nullptr);
 }
 
 std::string GtkApplicationLoop::description() {

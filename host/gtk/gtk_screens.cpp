@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/gtk_screens.h"
 
-#include <glib/gi18n.h>
-
 #include "host/desktop/web_page.h"
 #include "host/gtk/drive_unavailable_screen.h"
 #include "host/gtk/folder_list_screen.h"
@@ -12,6 +10,7 @@
 #include "host/gtk/root_list_screen.h"
 #include "host/gtk/upgrade_flow.h"
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -69,7 +68,7 @@ std::function<void(const std::string&)> GtkScreens::pageOpener() {
     const GRef<GdkAppLaunchContext> context(
         shown ? gdk_display_get_app_launch_context(gtk_widget_get_display(GTK_WIDGET(shown->widget()))) : nullptr);
     openWebPage(address, G_APP_LAUNCH_CONTEXT(context.get()), [weak](const std::string& reason) {
-      if (const auto window = weak.lock()) window->showToast(std::string(_("The page can’t be opened.")) + " " + reason);
+      if (const auto window = weak.lock()) window->showToast(sentences(_("The page can’t be opened."), reason));
     });
   };
 }

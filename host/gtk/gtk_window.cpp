@@ -8,6 +8,7 @@
 #include "host/gtk/folder_picker.h"
 #include "host/gtk/host_dialog.h"
 #include "host/gtk/host_screen.h"
+#include "host/support/texts.h"
 #include "platform/platform.h"
 #include "platform/ui/document_list_controller.h"
 #include "platform/ui/search_controller.h"
@@ -29,10 +30,10 @@ GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds, Dr
   gtk_overlay_set_child(GTK_OVERLAY(overlay_), stack_.widget());
   adw_toast_overlay_set_child(ADW_TOAST_OVERLAY(toasts_), overlay_);
   adw_application_window_set_content(window_, toasts_);
-  g_menu_append(menu_, "Select _All", "win.select-all");
-  g_menu_append(menu_, "_Refresh", "win.refresh");
-  g_menu_append(menu_, "A_ccounts…", "app.accounts");
-  g_menu_append(menu_, "_About Vaelo Drive", "app.about");
+  g_menu_append(menu_, _("Select _All"), "win.select-all");
+  g_menu_append(menu_, _("_Refresh"), "win.refresh");
+  g_menu_append(menu_, _("A_ccounts…"), "app.accounts");
+  g_menu_append(menu_, _("_About Vaelo Drive"), "app.about");
   addActions();
   stack_.onSwipedBack([this](std::size_t left) {
     if (const auto controller = navigation()) controller->userWentBackTo(left);

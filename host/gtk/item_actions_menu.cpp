@@ -3,6 +3,7 @@
 
 #include <memory>
 
+#include "host/support/texts.h"
 #include "platform/ui/document_list_controller_delegate.h"
 
 namespace vaelo {
@@ -15,14 +16,14 @@ struct Entry {
 };
 
 // What a person does most comes first, and what can't be undone last.
-constexpr Entry Entries[] = {{ItemAction::FirmpressPop, "_Open"},
-                             {ItemAction::Share, "_Share…"},
-                             {ItemAction::Info, "_Info"},
-                             {ItemAction::Rename, "_Rename…"},
-                             {TagsEntry, "_Tags…"},
-                             {ItemAction::Move, "_Move…"},
-                             {SelectEntry, "Se_lect"},
-                             {ItemAction::Delete, "_Delete…"}};
+constexpr Entry Entries[] = {{ItemAction::FirmpressPop, N_("_Open")},
+                             {ItemAction::Share, N_("_Share…")},
+                             {ItemAction::Info, N_("_Info")},
+                             {ItemAction::Rename, N_("_Rename…")},
+                             {TagsEntry, N_("_Tags…")},
+                             {ItemAction::Move, N_("_Move…")},
+                             {SelectEntry, N_("Se_lect")},
+                             {ItemAction::Delete, N_("_Delete…")}};
 
 using Chosen = std::function<void(int)>;
 
@@ -60,7 +61,7 @@ void showItemActionsMenu(GtkWidget* over, const GdkRectangle& at, unsigned avail
       g_object_unref(section);
       section = g_menu_new();
     }
-    GMenuItem* item = g_menu_item_new(entry.label, nullptr);
+    GMenuItem* item = g_menu_item_new(_(entry.label), nullptr);
     g_menu_item_set_action_and_target(item, "item.act", "i", entry.action);
     g_menu_append_item(section, item);
     g_object_unref(item);

@@ -2,6 +2,7 @@
 #include "host/gtk/mirrored_field.h"
 
 #include "host/gtk/mirrored_text.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -60,7 +61,7 @@ void MirroredField::update() {
                       (field_->clearButtonMode() == ClearButtonMode::WhileEditing && field_->isEditing());
   gtk_entry_set_icon_from_icon_name(entry, GTK_ENTRY_ICON_SECONDARY,
                                     clears && !field_->text().empty() ? "edit-clear-symbolic" : nullptr);
-  gtk_entry_set_icon_tooltip_text(entry, GTK_ENTRY_ICON_SECONDARY, "Clear");
+  gtk_entry_set_icon_tooltip_text(entry, GTK_ENTRY_ICON_SECONDARY, _("Clear"));
   // A name at rest looks like a title, and like a field while it is edited.
   gtk_entry_set_has_frame(entry, field_->isEditing());
   gtk_entry_set_input_hints(

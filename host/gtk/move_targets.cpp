@@ -6,6 +6,7 @@
 
 #include "host/gtk/list/folder_reader.h"
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 #include "items/file_utils.h"
 
 namespace vaelo {
@@ -32,21 +33,22 @@ std::string refusalOf(const URL& folder, const std::vector<URL>& items) {
   std::vector<std::string> components;
   if (FileUtils::containerAndRelativePathforURLContainerRelativePathComponents(folder, &container, &components) ||
       !container) {
-    return "This folder can’t be used.";
+    return _("This folder can’t be used.");
   }
   bool allHere = true;
   for (const URL& item : items) {
-    if (folder.path() == item.path() || folder.isInside(item)) return "A folder can’t be moved into itself.";
+    if (folder.path() == item.path() || folder.isInside(item)) return _("A folder can’t be moved into itself.");
     allHere = allHere && item.deletingLastPathComponent().path() == folder.path();
     const bool isFolder = FileUtils::getResourceValueForURL(ResourceKey::IsDirectory, item).boolValue() &&
                           !FileUtils::getResourceValueForURL(ResourceKey::IsPackage, item).boolValue();
-    if (isFolder && !takesFolders(*container, components.size())) return "This library doesn’t take folders here.";
+    if (isFolder && !takesFolders(*container, components.size())) return _("This library doesn’t take folders here.");
     if (!isFolder && !FileUtils::isValidExtensionForContainer(folder.appendingPathComponent(item.lastPathComponent()))) {
-      return "This library doesn’t take documents of this type.";
+      return _("This library doesn’t take documents of this type.");
     }
   }
-  return allHere ? (items.size() == 1 ? "The item is in this folder already." : "The items are in this folder already.")
-                 : "";
+  return allHere
+             ? (items.size() == 1 ? _("The item is in this folder already.") : _("The items are in this folder already."))
+             : "";
 }
 
 }  // namespace
@@ -56,7 +58,7 @@ MoveTarget moveTargetAt(const URL& folder, const std::vector<URL>& items, bool l
   target.refusal = refusalOf(folder, items);
   const FolderReading reading = readFolder(folder.path());
   if (!reading.snapshot) {
-    target.refusal = std::string("This folder can’t be read: ") + std::strerror(reading.errorNumber);
+    target.refusal = filled(_("This folder can’t be read: %s"), {g_strerror(reading.errorNumber)});
     return target;
   }
   target.takesFolders = canHoldNewFolder(folder);

@@ -1,9 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/offer_button.h"
 
-#include <glib/gi18n.h>
-
 #include "host/drive/account_offers.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 

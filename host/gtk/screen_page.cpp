@@ -6,6 +6,7 @@
 #include "host/gtk/host_screen.h"
 #include "host/gtk/mirror/view_mirror.h"
 #include "host/gtk/preview/preview_page.h"
+#include "host/support/texts.h"
 #include "preview/preview_details_view_controller.h"
 
 namespace vaelo {
@@ -20,16 +21,16 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
       toolbar_(gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 6)),
       goBack_(std::move(goBack)) {
   adw_header_bar_set_title_widget(ADW_HEADER_BAR(header_), title_);
-  gtk_widget_set_tooltip_text(back_, "Back");
-  gtk_accessible_update_property(GTK_ACCESSIBLE(back_), GTK_ACCESSIBLE_PROPERTY_LABEL, "Back", -1);
+  gtk_widget_set_tooltip_text(back_, _("Back"));
+  gtk_accessible_update_property(GTK_ACCESSIBLE(back_), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Back"), -1);
   g_signal_connect_swapped(back_, "clicked", G_CALLBACK(+[](ScreenPage* self) { self->goBack_(); }), this);
   adw_header_bar_pack_start(ADW_HEADER_BAR(header_), back_);
   if (menu) {
     GtkWidget* button = gtk_menu_button_new();
     gtk_menu_button_set_icon_name(GTK_MENU_BUTTON(button), "open-menu-symbolic");
     gtk_menu_button_set_menu_model(GTK_MENU_BUTTON(button), menu);
-    gtk_widget_set_tooltip_text(button, "Main Menu");
-    gtk_accessible_update_property(GTK_ACCESSIBLE(button), GTK_ACCESSIBLE_PROPERTY_LABEL, "Main Menu", -1);
+    gtk_widget_set_tooltip_text(button, _("Main Menu"));
+    gtk_accessible_update_property(GTK_ACCESSIBLE(button), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Main Menu"), -1);
     adw_header_bar_pack_end(ADW_HEADER_BAR(header_), button);
   }
   gtk_box_append(GTK_BOX(box_), header_);

@@ -13,6 +13,7 @@
 #include "host/gtk/share_applications.h"
 #include "host/gtk/share_clipboard.h"
 #include "host/gtk/share_save.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -29,8 +30,8 @@ ShareActions::ShareActions(SharedItem item, const std::shared_ptr<GtkWindowHost>
     : item_(std::move(item)), window_(window) {}
 
 std::string ShareActions::notice() const {
-  if (!item_.exists) return "This item is no longer there.";
-  if (!item_.downloaded) return "This item is not downloaded. Until it is, only its link can be shared.";
+  if (!item_.exists) return _("This item is no longer there.");
+  if (!item_.downloaded) return _("This item is not downloaded. Until it is, only its link can be shared.");
   return "";
 }
 
@@ -40,21 +41,22 @@ std::vector<ShareRow> ShareActions::rows() {
   std::vector<ShareRow> rows;
   addApplicationRows(rows);
   if (!item_.folder && MailComposer::isAvailable()) {
-    rows.push_back({"Send by E-Mail", "mail-send-symbolic", nullptr, here, [self] { self->sendByMail(); }});
+    rows.push_back({_("Send by E-Mail"), "mail-send-symbolic", nullptr, here, [self] { self->sendByMail(); }});
   }
   if (!item_.folder && BluetoothSender::isAvailable()) {
-    rows.push_back({"Send by Bluetooth", "bluetooth-symbolic", nullptr, here, [self] { self->sendByBluetooth(); }});
+    rows.push_back({_("Send by Bluetooth"), "bluetooth-symbolic", nullptr, here, [self] { self->sendByBluetooth(); }});
   }
-  rows.push_back({item_.folder ? "Copy" : "Copy File", "edit-copy-symbolic", nullptr, here, [self] { self->copyFile(); }});
+  rows.push_back(
+      {item_.folder ? _("Copy") : _("Copy File"), "edit-copy-symbolic", nullptr, here, [self] { self->copyFile(); }});
   if (item_.link) {
-    rows.push_back({"Copy Link", "insert-link-symbolic", nullptr, item_.exists,
-                    [self] { self->copyText(*self->item_.link, "Link copied"); }});
+    rows.push_back({_("Copy Link"), "insert-link-symbolic", nullptr, item_.exists,
+                    [self] { self->copyText(*self->item_.link, _("Link copied")); }});
   }
   if (item_.shareLink) {
-    rows.push_back({"Copy Link for Others", "emblem-shared-symbolic", nullptr, item_.exists,
-                    [self] { self->copyText(*self->item_.shareLink, "Link for others copied"); }});
+    rows.push_back({_("Copy Link for Others"), "emblem-shared-symbolic", nullptr, item_.exists,
+                    [self] { self->copyText(*self->item_.shareLink, _("Link for others copied")); }});
   }
-  rows.push_back({"Save a Copy…", "document-save-as-symbolic", nullptr, here, [self] {
+  rows.push_back({_("Save a Copy…"), "document-save-as-symbolic", nullptr, here, [self] {
                     const auto window = self->window_.lock();
                     if (window && self->hasContent()) saveCopyOf(self->item_.url, self->item_.name, window);
                   }});
@@ -72,19 +74,19 @@ void ShareActions::addApplicationRows(std::vector<ShareRow>& rows) {
     const bool takesFiles = g_app_info_supports_files(app.get()) || g_app_info_supports_uris(app.get());
     if (!id || !takesFiles || std::find(ids.begin(), ids.end(), id) != ids.end()) continue;
     ids.emplace_back(id);
-    rows.push_back({"Open in “" + nameOf(app.get()) + "”", "application-x-executable-symbolic",
+    rows.push_back({filled(_("Open in “%s”"), {nameOf(app.get())}), "application-x-executable-symbolic",
                     g_app_info_get_icon(app.get()), item_.downloaded, [self, app] { self->openWith(app.get()); }});
   }
   g_list_free_full(apps, g_object_unref);
-  rows.push_back({"Open With Another Application…", "view-app-grid-symbolic", nullptr, item_.downloaded,
+  rows.push_back({_("Open With Another Application…"), "view-app-grid-symbolic", nullptr, item_.downloaded,
                   [self] { self->chooseApplication(); }});
 }
 
 bool ShareActions::hasContent() const {
   // Looked at anew: the item may have gone while the sheet was open.
   if (g_file_test(item_.url.path().c_str(), G_FILE_TEST_EXISTS)) return true;
-  toast(item_.exists && !item_.downloaded ? "“" + item_.name + "” is not downloaded yet."
-                                          : "“" + item_.name + "” is no longer there.");
+  toast(filled(item_.exists && !item_.downloaded ? _("“%s” is not downloaded yet.") : _("“%s” is no longer there."),
+               {item_.name}));
   return false;
 }
 
@@ -94,10 +96,10 @@ GRef<GAppLaunchContext> ShareActions::contextFor(GAppInfo* app) const {
   return GRef<GAppLaunchContext>(G_APP_LAUNCH_CONTEXT(context));
 }
 
-LaunchFailed ShareActions::tellFailure(const std::string& application) const {
-  return [weak = window_, application](const std::string& reason) {
+LaunchFailed ShareActions::tellFailure(const std::string& title) const {
+  return [weak = window_, title](const std::string& reason) {
     const auto window = weak.lock();
-    if (window) showMessage(window->widget(), application + " Could Not Be Started", reason);
+    if (window) showMessage(window->widget(), title, reason);
   };
 }
 
@@ -110,18 +112,19 @@ bool ShareActions::openWith(GAppInfo* app) {
   const GRef<GFile> file(g_file_new_for_path(item_.url.path().c_str()));
   const std::string name = nameOf(app);
   if (!launchApplication(app, {takeString(g_file_get_uri(file.get()))}, contextFor(app).get(),
-                         tellFailure("“" + name + "”"))) {
+                         tellFailure(filled(_("“%s” Could Not Be Started"), {name})))) {
     return false;
   }
   noteRecentDocument(item_.url);
-  toast("Opening “" + item_.name + "” in " + name + "…");
+  toast(filled(_("Opening “%s” in %s…"), {item_.name, name}));
   return true;
 }
 
 bool ShareActions::openWithApplication(const ApplicationRecord& application) {
   const GRef<GDesktopAppInfo> app(g_desktop_app_info_new(application.itemID.c_str()));
   if (app) return openWith(G_APP_INFO(app.get()));
-  tellFailure("“" + application.localizedName + "”")("The application is no longer installed.");
+  tellFailure(filled(_("“%s” Could Not Be Started"), {application.localizedName}))(
+      _("The application is no longer installed."));
   return false;
 }
 
@@ -133,15 +136,16 @@ void ShareActions::chooseApplication() {
 
 void ShareActions::sendByMail() {
   if (!hasContent()) return;
-  if (MailComposer::compose(item_.url.path(), contextFor(nullptr).get(), tellFailure("The Mail Program"))) {
-    toast("Attaching “" + item_.name + "” to a message…");
+  if (MailComposer::compose(item_.url.path(), contextFor(nullptr).get(),
+                            tellFailure(_("The Mail Program Could Not Be Started")))) {
+    toast(filled(_("Attaching “%s” to a message…"), {item_.name}));
   }
 }
 
 void ShareActions::sendByBluetooth() {
   if (!hasContent()) return;
-  if (BluetoothSender::send(item_.url.path(), contextFor(nullptr).get(), tellFailure("Bluetooth"))) {
-    toast("Sending “" + item_.name + "” by Bluetooth…");
+  if (BluetoothSender::send(item_.url.path(), contextFor(nullptr).get(), tellFailure(_("Bluetooth Could Not Be Started")))) {
+    toast(filled(_("Sending “%s” by Bluetooth…"), {item_.name}));
   }
 }
 
@@ -149,7 +153,7 @@ void ShareActions::copyFile() {
   const auto window = window_.lock();
   if (!window || !hasContent()) return;
   copyFileToClipboard(gtk_widget_get_clipboard(GTK_WIDGET(window->widget())), item_.url.path());
-  window->showToast("“" + item_.name + "” copied");
+  window->showToast(filled(_("“%s” copied"), {item_.name}));
 }
 
 void ShareActions::copyText(const std::string& text, const std::string& said) {

@@ -37,7 +37,7 @@ class ShareActions : public std::enable_shared_from_this<ShareActions> {
   void copyFile();
   void copyText(const std::string& text, const std::string& said);
   GRef<GAppLaunchContext> contextFor(GAppInfo* app) const;
-  LaunchFailed tellFailure(const std::string& application) const;
+  LaunchFailed tellFailure(const std::string& title) const;
   void toast(const std::string& text) const;
   /// False, and the user told, when the content is not here.
   bool hasContent() const;

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -68,15 +69,15 @@ GtkWidget* makeList(GtkWindow* window, std::function<void(GAppInfo*)> chosen) {
   std::vector<Candidate> all = candidates();
   if (all.empty()) {
     GtkWidget* nothing = adw_status_page_new();
-    adw_status_page_set_title(ADW_STATUS_PAGE(nothing), "No Applications");
-    adw_status_page_set_description(ADW_STATUS_PAGE(nothing), "No installed application opens documents.");
+    adw_status_page_set_title(ADW_STATUS_PAGE(nothing), _("No Applications"));
+    adw_status_page_set_description(ADW_STATUS_PAGE(nothing), _("No installed application opens documents."));
     return nothing;
   }
   GtkWidget* list = gtk_list_box_new();
   gtk_list_box_set_selection_mode(GTK_LIST_BOX(list), GTK_SELECTION_NONE);
   gtk_widget_add_css_class(list, "boxed-list");
   gtk_widget_set_valign(list, GTK_ALIGN_START);
-  gtk_accessible_update_property(GTK_ACCESSIBLE(list), GTK_ACCESSIBLE_PROPERTY_LABEL, "Applications", -1);
+  gtk_accessible_update_property(GTK_ACCESSIBLE(list), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Applications"), -1);
   for (auto margin :
        {gtk_widget_set_margin_top, gtk_widget_set_margin_bottom, gtk_widget_set_margin_start, gtk_widget_set_margin_end}) {
     margin(list, 12);
@@ -90,7 +91,7 @@ GtkWidget* makeList(GtkWindow* window, std::function<void(GAppInfo*)> chosen) {
 
 void chooseApplicationFor(const std::string& itemName, GtkWindow* over, std::function<void(GAppInfo*)> chosen) {
   GtkWidget* window = adw_window_new();
-  gtk_window_set_title(GTK_WINDOW(window), "Open With");
+  gtk_window_set_title(GTK_WINDOW(window), _("Open With"));
   gtk_window_set_transient_for(GTK_WINDOW(window), over);
   gtk_window_set_modal(GTK_WINDOW(window), TRUE);
   gtk_window_set_destroy_with_parent(GTK_WINDOW(window), TRUE);
@@ -102,7 +103,7 @@ void chooseApplicationFor(const std::string& itemName, GtkWindow* over, std::fun
   gtk_widget_add_controller(window, keys);
 
   GtkWidget* header = adw_header_bar_new();
-  adw_header_bar_set_title_widget(ADW_HEADER_BAR(header), adw_window_title_new("Open With", itemName.c_str()));
+  adw_header_bar_set_title_widget(ADW_HEADER_BAR(header), adw_window_title_new(_("Open With"), itemName.c_str()));
   GtkWidget* scrolled = gtk_scrolled_window_new();
   gtk_scrolled_window_set_policy(GTK_SCROLLED_WINDOW(scrolled), GTK_POLICY_NEVER, GTK_POLICY_AUTOMATIC);
   gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scrolled), makeList(GTK_WINDOW(window), std::move(chosen)));

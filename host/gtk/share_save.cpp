@@ -8,6 +8,7 @@
 #include "host/gtk/alert_dialog.h"
 #include "host/gtk/gtk_window.h"
 #include "host/gtk/list/worker.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -54,11 +55,11 @@ class Saving {
   void showProgress() {
     const auto window = window_.lock();
     g_set_weak_pointer(&dialog_,
-                       adw_message_dialog_new(window ? window->widget() : nullptr, "Saving a Copy", name_.c_str()));
+                       adw_message_dialog_new(window ? window->widget() : nullptr, _("Saving a Copy"), name_.c_str()));
     bar_ = gtk_progress_bar_new();
-    gtk_accessible_update_property(GTK_ACCESSIBLE(bar_), GTK_ACCESSIBLE_PROPERTY_LABEL, "Progress of the copy", -1);
+    gtk_accessible_update_property(GTK_ACCESSIBLE(bar_), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Progress of the copy"), -1);
     adw_message_dialog_set_extra_child(ADW_MESSAGE_DIALOG(dialog_), bar_);
-    adw_message_dialog_add_response(ADW_MESSAGE_DIALOG(dialog_), "cancel", "Cancel");
+    adw_message_dialog_add_response(ADW_MESSAGE_DIALOG(dialog_), "cancel", _("Cancel"));
     adw_message_dialog_set_close_response(ADW_MESSAGE_DIALOG(dialog_), "cancel");
     g_signal_connect_swapped(dialog_, "response",
                              G_CALLBACK(+[](Saving* self) { g_cancellable_cancel(self->cancellable_.get()); }), this);
@@ -80,16 +81,19 @@ class Saving {
     if (!window) return;
     switch (outcome.kind) {
       case CopyOutcome::Kind::Cancelled:
-        return window->showToast("No copy was saved.");
+        return window->showToast(_("No copy was saved."));
       case CopyOutcome::Kind::Failed:
-        return showMessage(window->widget(), "The Copy Could Not Be Saved", "“" + name + "”: " + outcome.reason);
+        return showMessage(window->widget(), _("The Copy Could Not Be Saved"),
+                           filled(_("“%s”: %s"), {name, outcome.reason}));
       case CopyOutcome::Kind::Copied:
         break;
     }
-    if (outcome.notCopied == 0) return window->showToast("Saved a copy of “" + name + "”.");
-    showMessage(
-        window->widget(), "The Copy Is Not Complete",
-        std::to_string(outcome.notCopied) + " items in “" + name + "” are not downloaded and were left out of the copy.");
+    if (outcome.notCopied == 0) return window->showToast(filled(_("Saved a copy of “%s”."), {name}));
+    showMessage(window->widget(), _("The Copy Is Not Complete"),
+                filled(ngettext("%s item in “%s” is not downloaded and was left out of the copy.",
+                                "%s items in “%s” are not downloaded and were left out of the copy.",
+                                static_cast<unsigned long>(outcome.notCopied)),
+                       {numberText(static_cast<std::int64_t>(outcome.notCopied)), name}));
   }
 
   std::string name_;
@@ -121,8 +125,8 @@ void answered(GtkNativeDialog* chooser, int response, gpointer held) {
 }  // namespace
 
 void saveCopyOf(const URL& item, const std::string& name, const std::shared_ptr<GtkWindowHost>& window) {
-  GtkFileChooserNative* chooser =
-      gtk_file_chooser_native_new("Save a Copy", window->widget(), GTK_FILE_CHOOSER_ACTION_SAVE, "_Save", "_Cancel");
+  GtkFileChooserNative* chooser = gtk_file_chooser_native_new(_("Save a Copy"), window->widget(),
+                                                              GTK_FILE_CHOOSER_ACTION_SAVE, _("_Save"), _("_Cancel"));
   gtk_native_dialog_set_modal(GTK_NATIVE_DIALOG(chooser), TRUE);
   gtk_file_chooser_set_current_name(GTK_FILE_CHOOSER(chooser), name.c_str());
   auto* question = new Question{item, name, window};

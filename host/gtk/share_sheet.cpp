@@ -6,6 +6,7 @@
 #include <memory>
 
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -50,8 +51,8 @@ GtkWidget* makeHeader(const SharedItem& item, Callback closed) {
     gtk_widget_add_css_class(close, "circular");
     gtk_widget_set_valign(close, GTK_ALIGN_CENTER);
     gtk_widget_set_size_request(close, 44, 44);
-    gtk_widget_set_tooltip_text(close, "Close Sheet");
-    gtk_accessible_update_property(GTK_ACCESSIBLE(close), GTK_ACCESSIBLE_PROPERTY_LABEL, "Close Sheet", -1);
+    gtk_widget_set_tooltip_text(close, _("Close Sheet"));
+    gtk_accessible_update_property(GTK_ACCESSIBLE(close), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Close Sheet"), -1);
     g_signal_connect_data(close, "clicked",
                           G_CALLBACK(+[](GtkButton*, gpointer held) { (*static_cast<Callback*>(held))(); }),
                           new Callback(std::move(closed)), deleteCallback, GConnectFlags(0));
@@ -99,7 +100,7 @@ GtkWidget* makeShareSheet(const SharedItem& item, const std::string& notice, std
   GtkWidget* list = gtk_list_box_new();
   gtk_list_box_set_selection_mode(GTK_LIST_BOX(list), GTK_SELECTION_NONE);
   gtk_widget_add_css_class(list, "boxed-list");
-  const std::string label = "Share " + item.name;
+  const std::string label = filled(_("Share %s"), {item.name});
   gtk_accessible_update_property(GTK_ACCESSIBLE(list), GTK_ACCESSIBLE_PROPERTY_LABEL, label.c_str(), -1);
   for (ShareRow& row : rows) gtk_list_box_append(GTK_LIST_BOX(list), makeRow(row));
   gtk_box_append(GTK_BOX(box), list);

@@ -1,8 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/tags_popover.h"
 
-#include <glib/gi18n.h>
-
 #include <algorithm>
 #include <array>
 #include <cmath>
@@ -19,6 +17,7 @@
 #include "host/drive/small_file.h"
 #include "host/gtk/list/worker.h"
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 #include "items/file_tags.h"
 
 namespace vaelo {
@@ -65,7 +64,7 @@ std::string messageFor(const Error& error) {
     case FileErrorCode::FeatureUnsupported:
       return _("A newer version of the application keeps the tags.");
     default:
-      return std::string(_("The tags can’t be changed:")) + " " + error.localizedFailureReason.value_or("");
+      return filled(_("The tags can’t be changed: %s"), {translated(error.localizedFailureReason.value_or(""))});
   }
 }
 

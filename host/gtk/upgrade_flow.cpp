@@ -2,10 +2,10 @@
 #include "host/gtk/upgrade_flow.h"
 
 #include <adwaita.h>
-#include <glib/gi18n.h>
 
 #include "host/drive/account_offers.h"
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 #include "platform/platform.h"
 
 namespace vaelo {
@@ -21,10 +21,6 @@ std::string hostOf(const std::string& address) {
 
 std::string bytes(std::int64_t count) {
   return Platform::current().formatting.byteCount(static_cast<std::uint64_t>(count), ByteCountStyle::Binary);
-}
-
-std::string filled(const char* format, const std::vector<std::string>& arguments) {
-  return Platform::current().formatting.filled(format, arguments);
 }
 
 class UpgradeScreen : public ViewController, public HostDialog {
@@ -65,7 +61,7 @@ class UpgradeScreen : public ViewController, public HostDialog {
     adw_status_page_set_icon_name(ADW_STATUS_PAGE(page), "drive-harddisk-symbolic");
     adw_status_page_set_title(ADW_STATUS_PAGE(page),
                               figures.free == 0 ? _("Your storage is full") : _("Your storage is almost full"));
-    const std::string text = filled(_("%1$@ of %2$@ are free. Your provider %3$@ has more."),
+    const std::string text = filled(_("%1$s of %2$s are free. Your provider %3$s has more."),
                                     {bytes(figures.free), bytes(figures.total), hostOf(offer_->terms().page)});
     const std::string markup = takeString(g_markup_escape_text(text.c_str(), -1));
     adw_status_page_set_description(ADW_STATUS_PAGE(page), markup.c_str());

@@ -99,7 +99,7 @@ TEST_F(FolderViewTest, VisibleRowsGetTheirDetails) {
     return item && item->details ? item->details->secondLine : std::string();
   };
   EXPECT_TRUE(waitUntil([&] { return !detailsOf("file 0").empty(); }));
-  EXPECT_NE(detailsOf("file 0").find("2.5"), std::string::npos);
+  EXPECT_NE(detailsOf("file 0").find("3 KB"), std::string::npos);
   EXPECT_EQ(detailsOf("file 299"), "");
   folder_.write("file 0", "four");
   EXPECT_TRUE(waitUntil([&] { return detailsOf("file 0").find("4 bytes") != std::string::npos; }));

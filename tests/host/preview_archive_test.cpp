@@ -240,7 +240,7 @@ TEST_F(PreviewArchiveTest, OfVeryManyEntriesTheFirstAreListed) {
   for (int i = 0; i < 51'000; ++i) many.push_back({std::to_string(i), ""});
   openArchive("a.zip", "application/zip", pack(Zip, many));
   ASSERT_EQ(failure_, "");
-  EXPECT_NE(labelsIn(view_->widget()).find("50000 files. There are more"), std::string::npos)
+  EXPECT_NE(labelsIn(view_->widget()).find("50,000 files. There are more"), std::string::npos)
       << labelsIn(view_->widget()).substr(0, 400);
 }
 

@@ -2,8 +2,8 @@
 #include "host/gtk/list/details_reader.h"
 
 #include <fcntl.h>
-#include <glib/gi18n.h>
 #include <sys/stat.h>
+#include <unicode/locid.h>
 #include <unicode/udat.h>
 #include <unicode/ustring.h>
 
@@ -13,9 +13,12 @@
 #include <optional>
 
 #include "host/drive/promise_file.h"
+#include "host/files/icu_formatting.h"
+#include "host/files/user_locale.h"
 #include "host/gtk/list/folder_reader.h"
 #include "host/gtk/thumbnails/thumbnail_cache.h"
 #include "host/gtk/thumbnails/thumbnail_maker.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 namespace {
@@ -26,8 +29,9 @@ std::string dateText(double secondsSince1970) {
     void operator()(UDateFormat* format) const { udat_close(format); }
   };
   UErrorCode status = U_ZERO_ERROR;
-  thread_local const std::unique_ptr<UDateFormat, Closer> format(
-      static_cast<UDateFormat*>(udat_open(UDAT_NONE, UDAT_MEDIUM_RELATIVE, nullptr, nullptr, -1, nullptr, 0, &status)));
+  thread_local const std::unique_ptr<UDateFormat, Closer> format(static_cast<UDateFormat*>(
+      udat_open(UDAT_NONE, UDAT_MEDIUM_RELATIVE, icu::Locale::createCanonical(userLocale("LC_TIME").c_str()).getName(),
+                nullptr, -1, nullptr, 0, &status)));
   if (!format) return {};
   std::array<UChar, 128> text;
   const int32_t length =
@@ -38,12 +42,12 @@ std::string dateText(double secondsSince1970) {
   return U_SUCCESS(status) ? std::string(utf8.data(), static_cast<std::size_t>(bytes)) : std::string();
 }
 
-std::string sizeText(std::uint64_t bytes) {
-  char* text = g_format_size(bytes);
-  std::string result(text);
-  g_free(text);
-  return result;
+IcuFormatting& formatting() {
+  static IcuFormatting made;
+  return made;
 }
+
+std::string sizeText(std::uint64_t bytes) { return formatting().byteCount(bytes, ByteCountStyle::File); }
 
 std::string joinedText(std::initializer_list<std::string> parts) {
   std::string text;
@@ -56,11 +60,7 @@ std::string joinedText(std::initializer_list<std::string> parts) {
 }
 
 std::string countText(long count) {
-  if (count < 0) return {};
-  char* text = g_strdup_printf(ngettext("%ld item", "%ld items", static_cast<unsigned long>(count)), count);
-  std::string result(text);
-  g_free(text);
-  return result;
+  return count < 0 ? std::string() : formatting().localizedCount(".DICT.ITEMS.%d", count);
 }
 
 }  // namespace

@@ -1,13 +1,12 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/list/folder_view.h"
 
-#include <glib/gi18n.h>
-
 #include <algorithm>
 #include <cerrno>
 #include <utility>
 
 #include "host/gtk/list/folder_reader.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 namespace {

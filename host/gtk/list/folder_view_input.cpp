@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 // Keys and gestures of FolderView.
-#include <glib/gi18n.h>
 
 #include <array>
 
 #include "host/gtk/list/folder_view.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 namespace {

@@ -4,6 +4,7 @@
 #include <algorithm>
 
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 #include "platform/platform.h"
 
 namespace vaelo {
@@ -127,7 +128,7 @@ void setUp(GtkSignalListItemFactory*, GtkListItem* item, gpointer) {
   gtk_box_append(GTK_BOX(lines), row->name);
   gtk_box_append(GTK_BOX(lines), row->details);
   gtk_widget_add_css_class(row->lock, "dim-label");
-  gtk_widget_set_tooltip_text(row->lock, "Protected by a password");
+  gtk_widget_set_tooltip_text(row->lock, _("Protected by a password"));
   GtkWidget* box = gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 12);
   gtk_widget_set_size_request(box, -1, 48);
   gtk_widget_set_margin_end(box, 6);
@@ -152,7 +153,7 @@ void bind(GtkSignalListItemFactory*, GtkListItem* item, gpointer) {
   gtk_widget_set_visible(row.lock, entry.isLocked);
   // A name that doesn't fit is told by its tooltip.
   gtk_widget_set_tooltip_text(row.name, entry.name.c_str());
-  const std::string label = entry.name + (details.empty() ? "" : ", " + details);
+  const std::string label = details.empty() ? entry.name : listedText(entry.name, details);
   GtkWidget* listRow = gtk_widget_get_parent(row.expander);
   gtk_accessible_update_property(GTK_ACCESSIBLE(listRow), GTK_ACCESSIBLE_PROPERTY_LABEL, label.c_str(), -1);
 }

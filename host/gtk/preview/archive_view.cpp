@@ -11,6 +11,7 @@
 #include "host/gtk/preview/archive_rows.h"
 #include "host/gtk/preview/text_note.h"
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 #include "platform/platform.h"
 
 namespace vaelo {
@@ -76,17 +77,20 @@ std::string withoutExtension(const std::string& name) {
   return dot == std::string::npos || dot == 0 ? name : name.substr(0, dot);
 }
 
-std::string counted(std::size_t count, const char* one, const char* many) {
-  return std::to_string(count) + " " + (count == 1 ? one : many);
-}
+std::string number(std::size_t count) { return numberText(static_cast<std::int64_t>(count)); }
 
 std::string totalOf(const ArchiveListing& listing) {
-  std::string total = counted(listing.files(), "file", "files");
-  if (listing.folders() > 0) total += ", " + counted(listing.folders(), "folder", "folders");
-  if (listing.bytes() > 0) {
-    total += ", " + Platform::current().formatting.byteCount(listing.bytes(), ByteCountStyle::File) + " unpacked";
+  std::string total = filled(ngettext("%s file", "%s files", listing.files()), {number(listing.files())});
+  if (listing.folders() > 0) {
+    total = listedText(total, filled(ngettext("%s folder", "%s folders", listing.folders()), {number(listing.folders())}));
   }
-  return total + ".";
+  if (listing.bytes() > 0) {
+    const std::string bytes = Platform::current().formatting.byteCount(listing.bytes(), ByteCountStyle::File);
+    // TRANSLATORS: %s is how much the content of an archive takes when it is unpacked, as in "12 MB unpacked".
+    total = listedText(total, filled(_("%s unpacked"), {bytes}));
+  }
+  // TRANSLATORS: %s is how many files and folders there are, which becomes a sentence here.
+  return filled(_("%s."), {total});
 }
 
 const char* remarkFor(ArchiveLoad::End end) {
@@ -94,11 +98,11 @@ const char* remarkFor(ArchiveLoad::End end) {
     case ArchiveLoad::End::Whole:
       return "";
     case ArchiveLoad::End::Full:
-      return " There are more, which are not listed.";
+      return _("There are more, which are not listed.");
     case ArchiveLoad::End::Broken:
-      return " The archive is damaged: what follows can’t be read.";
+      return _("The archive is damaged: what follows can’t be read.");
     case ArchiveLoad::End::Slow:
-      return " There may be more: reading all of the archive would take too long.";
+      return _("There may be more: reading all of the archive would take too long.");
   }
   return "";
 }
@@ -126,8 +130,8 @@ class ArchiveView : public DocumentView {
     g_signal_connect(list_, "map", G_CALLBACK(+[](GtkWidget* list, gpointer) { gtk_widget_grab_focus(list); }), nullptr);
     GtkWidget* empty = adw_status_page_new();
     adw_status_page_set_icon_name(ADW_STATUS_PAGE(empty), "package-x-generic-symbolic");
-    adw_status_page_set_title(ADW_STATUS_PAGE(empty), "Nothing Inside");
-    adw_status_page_set_description(ADW_STATUS_PAGE(empty), "This archive is empty.");
+    adw_status_page_set_title(ADW_STATUS_PAGE(empty), _("Nothing Inside"));
+    adw_status_page_set_description(ADW_STATUS_PAGE(empty), _("This archive is empty."));
     gtk_stack_add_named(GTK_STACK(stack_), scrolled, "list");
     gtk_stack_add_named(GTK_STACK(stack_), empty, "empty");
     gtk_widget_set_vexpand(stack_, TRUE);
@@ -147,7 +151,8 @@ class ArchiveView : public DocumentView {
             [this](std::shared_ptr<const ArchiveListing> listing, ArchiveLoad::End end) { show(std::move(listing), end); },
             [this](const std::string& error) { events_.failed(messageForDecoderError(error)); },
             [this](int entries) {
-              events_.progress(counted(static_cast<std::size_t>(entries), "entry", "entries") + " so far");
+              events_.progress(filled(ngettext("%s entry so far", "%s entries so far", static_cast<unsigned long>(entries)),
+                                      {numberText(entries)}));
             }});
   }
 
@@ -165,8 +170,11 @@ class ArchiveView : public DocumentView {
     showRows(rows.get());
     const bool isEmpty = listing->entry(0).inside.empty();
     gtk_stack_set_visible_child_name(GTK_STACK(stack_), isEmpty ? "empty" : "list");
-    std::string note = isEmpty ? "" : totalOf(*listing) + remarkFor(end);
-    if (listing->hasLocked()) note += " The content is protected by a password.";
+    std::string note = isEmpty ? "" : totalOf(*listing);
+    for (const char* remark :
+         {isEmpty ? "" : remarkFor(end), listing->hasLocked() ? _("The content is protected by a password.") : ""}) {
+      if (*remark) note = note.empty() ? remark : sentences(note, remark);
+    }
     setPreviewNote(note_, note);
     events_.shown();
   }

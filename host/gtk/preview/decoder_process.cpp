@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -136,13 +137,13 @@ void DecoderProcess::ask(std::string request, Done done, std::chrono::millisecon
 }
 
 std::string messageForDecoderError(const std::string& error) {
-  if (error == DecoderError::TooBig) return "This document is too large for a preview.";
-  if (error == DecoderError::Locked) return "This document is protected by a password.";
-  if (error == DecoderError::Unsupported) return "There is no preview for this kind of document.";
-  if (error == DecoderError::Gone) return "This document is no longer there.";
-  if (error == DecoderError::Unreadable) return "You have no permission to read this document.";
-  if (error == DecoderError::TooSlow) return "Showing this document would take too long. It may be damaged.";
-  return "This document is damaged and can’t be shown.";
+  if (error == DecoderError::TooBig) return _("This document is too large for a preview.");
+  if (error == DecoderError::Locked) return _("This document is protected by a password.");
+  if (error == DecoderError::Unsupported) return _("There is no preview for this kind of document.");
+  if (error == DecoderError::Gone) return _("This document is no longer there.");
+  if (error == DecoderError::Unreadable) return _("You have no permission to read this document.");
+  if (error == DecoderError::TooSlow) return _("Showing this document would take too long. It may be damaged.");
+  return _("This document is damaged and can’t be shown.");
 }
 
 }  // namespace vaelo

@@ -3,6 +3,7 @@
 
 #include "host/gtk/preview/find_bar.h"
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -36,14 +37,14 @@ GtkWidget* DocumentButtons::makeMenu() {
   const GRef<GPropertyAction> markup(g_property_action_new("markup", bar_.widget(), "reveal-child"));
   g_action_map_add_action(G_ACTION_MAP(actions.get()), G_ACTION(markup.get()));
   const GRef<GMenu> items(g_menu_new());
-  g_menu_append(items.get(), "_Find in This Document", "document.find");
-  g_menu_append(items.get(), "_Markup", "document.markup");
+  g_menu_append(items.get(), _("_Find in This Document"), "document.find");
+  g_menu_append(items.get(), _("_Markup"), "document.markup");
   GtkWidget* menu = gtk_menu_button_new();
   gtk_menu_button_set_icon_name(GTK_MENU_BUTTON(menu), "view-more-symbolic");
   gtk_menu_button_set_menu_model(GTK_MENU_BUTTON(menu), G_MENU_MODEL(items.get()));
   gtk_widget_insert_action_group(menu, "document", G_ACTION_GROUP(actions.get()));
-  gtk_widget_set_tooltip_text(menu, "Find and Markup");
-  gtk_accessible_update_property(GTK_ACCESSIBLE(menu), GTK_ACCESSIBLE_PROPERTY_LABEL, "Find and Markup", -1);
+  gtk_widget_set_tooltip_text(menu, _("Find and Markup"));
+  gtk_accessible_update_property(GTK_ACCESSIBLE(menu), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Find and Markup"), -1);
   return menu;
 }
 

@@ -4,6 +4,7 @@
 #include <cmath>
 
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 #include "platform/platform.h"
 
 namespace vaelo {
@@ -30,8 +31,8 @@ bool isHere(const ResourceMap& values) {
 }
 
 void tellFailure(GtkWindow* parent, const std::string& name, const std::string& reason) {
-  GtkWidget* dialog = adw_message_dialog_new(parent, ("“" + name + "” couldn’t be opened.").c_str(), reason.c_str());
-  adw_message_dialog_add_response(ADW_MESSAGE_DIALOG(dialog), "ok", "OK");
+  GtkWidget* dialog = adw_message_dialog_new(parent, filled(_("“%s” couldn’t be opened."), {name}).c_str(), reason.c_str());
+  adw_message_dialog_add_response(ADW_MESSAGE_DIALOG(dialog), "ok", _("OK"));
   gtk_window_present(GTK_WINDOW(dialog));
 }
 
@@ -58,7 +59,7 @@ FactsPage::FactsPage(std::function<void()> arrived)
     : page_(GTK_WIDGET(g_object_ref_sink(adw_status_page_new()))),
       box_(gtk_box_new(GTK_ORIENTATION_VERTICAL, 24)),
       bar_(gtk_progress_bar_new()),
-      open_(gtk_button_new_with_label("Open With Another Application")),
+      open_(gtk_button_new_with_label(_("Open With Another Application"))),
       arrived_(std::move(arrived)) {
   gtk_progress_bar_set_show_text(GTK_PROGRESS_BAR(bar_), TRUE);
   gtk_widget_set_visible(bar_, FALSE);
@@ -85,7 +86,7 @@ bool FactsPage::isDownloaded(const URL& item) { return isHere(valuesOf(item)); }
 void FactsPage::showNothing() {
   stopFollowing();
   gtk_widget_set_visible(box_, FALSE);
-  adw_status_page_set_title(ADW_STATUS_PAGE(page_), "Nothing to show");
+  adw_status_page_set_title(ADW_STATUS_PAGE(page_), _("Nothing to show"));
   adw_status_page_set_description(ADW_STATUS_PAGE(page_), nullptr);
 }
 
@@ -112,7 +113,7 @@ void FactsPage::showValues(const URL& item, const ResourceMap& values, const std
     facts += (facts.empty() ? "" : "\n") + bytes;
   }
   const bool here = isHere(values);
-  if (!here) facts += "\nNot downloaded";
+  if (!here) facts += std::string("\n") + _("Not downloaded");
   if (!message.empty()) facts += "\n\n" + message;
   const std::string name = textOf(values, ResourceKey::LocalizedName);
   AdwStatusPage* page = ADW_STATUS_PAGE(page_);
@@ -171,15 +172,17 @@ void FactsPage::followDownload(const URL& item) {
 void FactsPage::progressChanged(const std::shared_ptr<Progress>& progress) {
   gtk_widget_set_visible(bar_, TRUE);
   const std::int64_t total = progress->totalUnits();
-  std::string text = "Downloading… ";
+  std::string text;
   if (total > 0) {
     const double fraction = static_cast<double>(progress->completedUnits()) / static_cast<double>(total);
     gtk_progress_bar_set_fraction(GTK_PROGRESS_BAR(bar_), fraction);
-    text += std::to_string(std::lround(fraction * 100)) + "%";
+    // TRANSLATORS: %s is a number of percents.
+    text = filled(_("Downloading… %s%%"), {numberText(std::lround(fraction * 100))});
   } else {
     gtk_progress_bar_pulse(GTK_PROGRESS_BAR(bar_));
-    text += Platform::current().formatting.byteCount(static_cast<std::uint64_t>(progress->completedUnits()),
-                                                     ByteCountStyle::File);
+    // TRANSLATORS: %s is how much has come so far, as in "12 MB".
+    text = filled(_("Downloading… %s"), {Platform::current().formatting.byteCount(
+                                            static_cast<std::uint64_t>(progress->completedUnits()), ByteCountStyle::File)});
   }
   gtk_progress_bar_set_text(GTK_PROGRESS_BAR(bar_), text.c_str());
   gtk_accessible_update_property(GTK_ACCESSIBLE(bar_), GTK_ACCESSIBLE_PROPERTY_LABEL, text.c_str(), -1);

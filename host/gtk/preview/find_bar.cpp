@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/preview/find_bar.h"
 
+#include "host/support/texts.h"
+
 namespace vaelo {
 
 namespace {
@@ -20,11 +22,11 @@ FindBar::FindBar(GtkWidget* content, Events events)
       bar_(GTK_WIDGET(g_object_ref_sink(gtk_search_bar_new()))),
       entry_(gtk_search_entry_new()),
       count_(gtk_label_new(nullptr)) {
-  GtkWidget* back = makeButton("go-up-symbolic", "Find Previous");
-  GtkWidget* onwards = makeButton("go-down-symbolic", "Find Next");
+  GtkWidget* back = makeButton("go-up-symbolic", _("Find Previous"));
+  GtkWidget* onwards = makeButton("go-down-symbolic", _("Find Next"));
   GtkWidget* box = gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 6);
   gtk_widget_set_hexpand(entry_, TRUE);
-  gtk_accessible_update_property(GTK_ACCESSIBLE(entry_), GTK_ACCESSIBLE_PROPERTY_LABEL, "Find in this document", -1);
+  gtk_accessible_update_property(GTK_ACCESSIBLE(entry_), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Find in this document"), -1);
   gtk_widget_add_css_class(count_, "dim-label");
   gtk_widget_add_css_class(count_, "numeric");
   for (GtkWidget* child : {entry_, count_, back, onwards}) gtk_box_append(GTK_BOX(box), child);
@@ -97,7 +99,7 @@ void FindBar::showCount(const std::string& count, bool nothingFound) {
 }
 
 GtkWidget* makeFindButton(GCallback activated, gpointer data) {
-  GtkWidget* find = makeButton("edit-find-symbolic", "Find in This Document");
+  GtkWidget* find = makeButton("edit-find-symbolic", _("Find in This Document"));
   g_signal_connect_swapped(find, "clicked", activated, data);
   return find;
 }

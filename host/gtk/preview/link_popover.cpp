@@ -5,6 +5,7 @@
 #include <array>
 
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -12,7 +13,7 @@ LinkPopover::LinkPopover(GtkWidget* parent, GtkWidget* content)
     : content_(content),
       popover_(gtk_popover_new()),
       label_(gtk_label_new(nullptr)),
-      open_(gtk_button_new_with_label("Open Link")) {
+      open_(gtk_button_new_with_label(_("Open Link"))) {
   gtk_label_set_wrap(GTK_LABEL(label_), TRUE);
   gtk_label_set_wrap_mode(GTK_LABEL(label_), PANGO_WRAP_WORD_CHAR);
   gtk_label_set_selectable(GTK_LABEL(label_), TRUE);

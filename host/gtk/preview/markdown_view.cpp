@@ -13,6 +13,7 @@
 #include "host/gtk/preview/text_note.h"
 #include "host/gtk/preview/text_view.h"
 #include "host/gtk/preview/text_zoom.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -78,14 +79,14 @@ class MarkdownView : public DocumentView {
 
   std::vector<GtkWidget*> headerWidgets() override {
     GtkWidget* find = gtk_button_new_from_icon_name("edit-find-symbolic");
-    gtk_widget_set_tooltip_text(find, "Find in This Document");
-    gtk_accessible_update_property(GTK_ACCESSIBLE(find), GTK_ACCESSIBLE_PROPERTY_LABEL, "Find in This Document", -1);
+    gtk_widget_set_tooltip_text(find, _("Find in This Document"));
+    gtk_accessible_update_property(GTK_ACCESSIBLE(find), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Find in This Document"), -1);
     g_signal_connect_swapped(find, "clicked", G_CALLBACK(+[](MarkdownView* self) { self->toggleFind(); }), this);
     if (isSourceOnly_) return {find};
     GtkWidget* source = gtk_toggle_button_new();
     gtk_button_set_icon_name(GTK_BUTTON(source), "text-x-generic-symbolic");
-    gtk_widget_set_tooltip_text(source, "Show Source Text");
-    gtk_accessible_update_property(GTK_ACCESSIBLE(source), GTK_ACCESSIBLE_PROPERTY_LABEL, "Show Source Text", -1);
+    gtk_widget_set_tooltip_text(source, _("Show Source Text"));
+    gtk_accessible_update_property(GTK_ACCESSIBLE(source), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Show Source Text"), -1);
     gtk_toggle_button_set_active(GTK_TOGGLE_BUTTON(source), showsSource());
     g_signal_connect(source, "toggled", G_CALLBACK(+[](GtkToggleButton* button, MarkdownView* self) {
                        self->showSource(gtk_toggle_button_get_active(button));
@@ -120,7 +121,7 @@ class MarkdownView : public DocumentView {
     gtk_text_buffer_get_iter_at_line(buffer, &place, line);
     gtk_text_buffer_place_cursor(buffer, &place);
     if (line > 0) gtk_text_view_scroll_to_mark(GTK_TEXT_VIEW(view_), gtk_text_buffer_get_insert(buffer), 0, TRUE, 0, 0);
-    setPreviewNote(note_, current_->isEmpty() ? "This document is empty." : "");
+    setPreviewNote(note_, current_->isEmpty() ? _("This document is empty.") : "");
     events_.shown();
   }
 
@@ -163,8 +164,8 @@ class MarkdownView : public DocumentView {
           GError* error = nullptr;
           if (gtk_show_uri_full_finish(GTK_WINDOW(source), result, &error)) return;
           const GErrorPtr owned(error);
-          GtkWidget* dialog = adw_message_dialog_new(GTK_WINDOW(source), "The link couldn’t be opened.", error->message);
-          adw_message_dialog_add_response(ADW_MESSAGE_DIALOG(dialog), "ok", "OK");
+          GtkWidget* dialog = adw_message_dialog_new(GTK_WINDOW(source), _("The link couldn’t be opened."), error->message);
+          adw_message_dialog_add_response(ADW_MESSAGE_DIALOG(dialog), "ok", _("OK"));
           gtk_window_present(GTK_WINDOW(dialog));
         },
         nullptr);

@@ -15,6 +15,7 @@
 
 #include "host/drive/small_file.h"
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -76,7 +77,7 @@ std::string markedCopyName(const std::string& name, int number) {
   const std::size_t dot = name.rfind('.');
   const bool hasExtension = dot != std::string::npos && dot > 0;
   std::string stem = name.substr(0, hasExtension ? dot : name.size());
-  const std::string end = (number > 1 ? " (marked " + std::to_string(number) + ")" : std::string(" (marked)")) +
+  const std::string end = (number > 1 ? filled(_(" (marked %s)"), {std::to_string(number)}) : _(" (marked)")) +
                           (hasExtension ? name.substr(dot) : "");
   // Whole letters go.
   const auto isInLetter = [&] { return !stem.empty() && (static_cast<unsigned char>(stem.back()) & 0xC0) == 0x80; };

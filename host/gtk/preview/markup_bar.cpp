@@ -5,6 +5,7 @@
 #include <iterator>
 
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -30,11 +31,11 @@ const char* sentenceFor(PortableDocumentMarks::State state) {
       return "";
     case PortableDocumentMarks::State::Unsaved:
     case PortableDocumentMarks::State::Saving:
-      return "Saving…";
+      return _("Saving…");
     case PortableDocumentMarks::State::Saved:
-      return "Saved";
+      return _("Saved");
     case PortableDocumentMarks::State::Failed:
-      return "Not saved";
+      return _("Not saved");
   }
   return "";
 }
@@ -48,10 +49,10 @@ MarkupBar::MarkupBar(Events events)
       state_(gtk_label_new(nullptr)) {
   GtkWidget* box = gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 6);
   gtk_widget_add_css_class(box, "toolbar");
-  gtk_box_append(GTK_BOX(box), makeTool(MarkTool::Highlight, "Highlight", "Highlight Text"));
-  gtk_box_append(GTK_BOX(box), makeTool(MarkTool::Ink, "Draw", "Draw on the Page"));
-  gtk_box_append(GTK_BOX(box), makeTool(MarkTool::Note, "Note", "Put a Note on the Page"));
-  setLabel(undo_, "Undo Mark", "Undo the Last Mark");
+  gtk_box_append(GTK_BOX(box), makeTool(MarkTool::Highlight, _("Highlight"), _("Highlight Text")));
+  gtk_box_append(GTK_BOX(box), makeTool(MarkTool::Ink, _("Draw"), _("Draw on the Page")));
+  gtk_box_append(GTK_BOX(box), makeTool(MarkTool::Note, _("Note"), _("Put a Note on the Page")));
+  setLabel(undo_, _("Undo Mark"), _("Undo the Last Mark"));
   gtk_widget_set_sensitive(undo_, FALSE);
   gtk_box_append(GTK_BOX(box), undo_);
   gtk_label_set_ellipsize(GTK_LABEL(state_), PANGO_ELLIPSIZE_END);
@@ -59,8 +60,8 @@ MarkupBar::MarkupBar(Events events)
   gtk_widget_set_halign(state_, GTK_ALIGN_END);
   for (const char* name : {"dim-label", "caption"}) gtk_widget_add_css_class(state_, name);
   gtk_box_append(GTK_BOX(box), state_);
-  GtkWidget* done = gtk_button_new_with_label("Done");
-  setLabel(done, "Done", "Leave Markup");
+  GtkWidget* done = gtk_button_new_with_label(_("Done"));
+  setLabel(done, _("Done"), _("Leave Markup"));
   makeNarrow(done);
   gtk_box_append(GTK_BOX(box), done);
   gtk_revealer_set_child(GTK_REVEALER(revealer_), box);
@@ -124,7 +125,7 @@ void MarkupBar::offer(bool offered) {
 GtkWidget* MarkupBar::makeToggle() const {
   GtkWidget* toggle = gtk_toggle_button_new();
   gtk_button_set_icon_name(GTK_BUTTON(toggle), "document-edit-symbolic");
-  setLabel(toggle, "Markup", "Mark This Document");
+  setLabel(toggle, _("Markup"), _("Mark This Document"));
   g_object_bind_property(revealer_, "reveal-child", toggle, "active",
                          static_cast<GBindingFlags>(G_BINDING_BIDIRECTIONAL | G_BINDING_SYNC_CREATE));
   g_object_bind_property(revealer_, "visible", toggle, "visible", G_BINDING_SYNC_CREATE);

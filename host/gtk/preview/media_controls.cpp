@@ -5,6 +5,8 @@
 #include <cmath>
 #include <cstdio>
 
+#include "host/support/texts.h"
+
 namespace vaelo {
 
 namespace {
@@ -51,17 +53,17 @@ MediaControls::MediaControls(GtkMediaStream* stream, bool isFullScreen, std::fun
     : stream_(GTK_MEDIA_STREAM(g_object_ref(stream))),
       fullScreen_(std::move(fullScreen)),
       bar_(GTK_WIDGET(g_object_ref_sink(gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 6)))),
-      play_(makeButton("media-playback-start-symbolic", "Play")),
-      time_(makeTime("Position")),
+      play_(makeButton("media-playback-start-symbolic", _("Play"))),
+      time_(makeTime(_("Position"))),
       place_(gtk_scale_new_with_range(GTK_ORIENTATION_HORIZONTAL, 0, 1, 1)),
-      length_(makeTime("Duration")),
+      length_(makeTime(_("Duration"))),
       volume_(gtk_volume_button_new()) {
   gtk_widget_add_css_class(bar_, "toolbar");
   gtk_widget_set_hexpand(place_, TRUE);
   gtk_scale_set_draw_value(GTK_SCALE(place_), FALSE);
   gtk_range_set_increments(GTK_RANGE(place_), 5, 30);
-  gtk_accessible_update_property(GTK_ACCESSIBLE(place_), GTK_ACCESSIBLE_PROPERTY_LABEL, "Position", -1);
-  gtk_accessible_update_property(GTK_ACCESSIBLE(volume_), GTK_ACCESSIBLE_PROPERTY_LABEL, "Volume", -1);
+  gtk_accessible_update_property(GTK_ACCESSIBLE(place_), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Position"), -1);
+  gtk_accessible_update_property(GTK_ACCESSIBLE(volume_), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Volume"), -1);
   gtk_widget_set_valign(volume_, GTK_ALIGN_CENTER);
   for (GtkWidget* child : {play_, time_, place_, length_, volume_}) gtk_box_append(GTK_BOX(bar_), child);
   g_signal_connect_swapped(play_, "clicked", G_CALLBACK(toggleMedia), stream);
@@ -78,7 +80,7 @@ MediaControls::MediaControls(GtkMediaStream* stream, bool isFullScreen, std::fun
                    this);
   if (fullScreen_) {
     GtkWidget* button = makeButton(isFullScreen ? "view-restore-symbolic" : "view-fullscreen-symbolic",
-                                   isFullScreen ? "Leave Full Screen" : "Full Screen");
+                                   isFullScreen ? _("Leave Full Screen") : _("Full Screen"));
     gtk_box_append(GTK_BOX(bar_), button);
     g_signal_connect_swapped(button, "clicked", G_CALLBACK(+[](MediaControls* self) { self->fullScreen_(); }), this);
   }
@@ -109,7 +111,7 @@ MediaControls::~MediaControls() {
 
 void MediaControls::showPlaying() {
   const bool plays = gtk_media_stream_get_playing(stream_.get());
-  const char* label = plays ? "Pause" : "Play";
+  const char* label = plays ? _("Pause") : _("Play");
   gtk_button_set_icon_name(GTK_BUTTON(play_), plays ? "media-playback-pause-symbolic" : "media-playback-start-symbolic");
   gtk_widget_set_tooltip_text(play_, label);
   gtk_accessible_update_property(GTK_ACCESSIBLE(play_), GTK_ACCESSIBLE_PROPERTY_LABEL, label, -1);

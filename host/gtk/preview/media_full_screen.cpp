@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/preview/media_full_screen.h"
 
+#include "host/support/texts.h"
+
 namespace vaelo {
 
 namespace {
@@ -26,7 +28,7 @@ MediaFullScreen::MediaFullScreen(GtkWindow* parent, GtkMediaStream* stream, std:
   gtk_overlay_set_child(GTK_OVERLAY(overlay), picture);
   gtk_overlay_add_overlay(GTK_OVERLAY(overlay), revealer_);
   gtk_window_set_child(GTK_WINDOW(window_), overlay);
-  gtk_window_set_title(GTK_WINDOW(window_), "Film");
+  gtk_window_set_title(GTK_WINDOW(window_), _("Film"));
   gtk_window_set_transient_for(GTK_WINDOW(window_), parent);
   gtk_window_set_modal(GTK_WINDOW(window_), TRUE);
 

@@ -14,6 +14,7 @@
 #include "host/gtk/preview/media_controls.h"
 #include "host/gtk/preview/media_framework.h"
 #include "host/gtk/preview/media_full_screen.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -21,8 +22,8 @@ namespace {
 
 constexpr std::chrono::milliseconds LoadingTakes = std::chrono::seconds(12);
 constexpr const char* CannotPlay =
-    "This document can’t be played. It may be damaged or of a kind that this computer doesn’t know.";
-constexpr const char* NoPlayer = "Sound and film can’t be played on this computer.";
+    N_("This document can’t be played. It may be damaged or of a kind that this computer doesn’t know.");
+constexpr const char* NoPlayer = N_("Sound and film can’t be played on this computer.");
 
 // Which say sound or film and are lists of addresses.
 constexpr std::array<std::string_view, 8> ListTypes = {"audio/x-mpegurl",   "audio/mpegurl",  "audio/x-scpls",
@@ -41,7 +42,7 @@ std::string problemWith(const std::string& path) {
   struct stat status = {};
   if (::stat(path.c_str(), &status) != 0) return messageForDecoderError(DecoderError::Gone);
   if (::access(path.c_str(), R_OK) != 0) return messageForDecoderError(DecoderError::Unreadable);
-  return S_ISREG(status.st_mode) && status.st_size > 0 ? "" : CannotPlay;
+  return S_ISREG(status.st_mode) && status.st_size > 0 ? "" : _(CannotPlay);
 }
 
 class MediaView : public DocumentView {
@@ -80,7 +81,7 @@ class MediaView : public DocumentView {
         },
         this);
     worker_.run([this, path = document_.path]() -> std::function<void()> {
-      const std::string problem = prepareMediaFramework() ? problemWith(path) : NoPlayer;
+      const std::string problem = prepareMediaFramework() ? problemWith(path) : _(NoPlayer);
       return [this, problem] { problem.empty() ? load() : fail(problem); };
     });
   }
@@ -102,7 +103,7 @@ class MediaView : public DocumentView {
           auto* self = static_cast<MediaView*>(data);
           self->change_ = 0;
           if (gtk_media_stream_get_error(self->stream_.get())) {
-            self->fail(CannotPlay);
+            self->fail(_(CannotPlay));
           } else if (gtk_media_stream_is_prepared(self->stream_.get()) && !self->controls_) {
             self->show();
           }
@@ -112,7 +113,7 @@ class MediaView : public DocumentView {
   }
 
   void show() {
-    if (!gtk_media_stream_has_audio(stream_.get()) && !gtk_media_stream_has_video(stream_.get())) return fail(CannotPlay);
+    if (!gtk_media_stream_has_audio(stream_.get()) && !gtk_media_stream_has_video(stream_.get())) return fail(_(CannotPlay));
     g_clear_handle_id(&timer_, g_source_remove);
     const bool isFilm = gtk_media_stream_has_video(stream_.get());
     controls_ = std::make_unique<MediaControls>(stream_.get(), false,

@@ -2,6 +2,7 @@
 #include "host/gtk/preview/note_popover.h"
 
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -13,14 +14,14 @@ NotePopover::NotePopover(GtkWidget* parent, GtkWidget* content)
                          gtk_text_view_set_bottom_margin}) {
     set(GTK_TEXT_VIEW(text_), 8);
   }
-  gtk_accessible_update_property(GTK_ACCESSIBLE(text_), GTK_ACCESSIBLE_PROPERTY_LABEL, "Note", -1);
+  gtk_accessible_update_property(GTK_ACCESSIBLE(text_), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Note"), -1);
   GtkWidget* scrolled = gtk_scrolled_window_new();
   gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scrolled), text_);
   gtk_scrolled_window_set_policy(GTK_SCROLLED_WINDOW(scrolled), GTK_POLICY_NEVER, GTK_POLICY_AUTOMATIC);
   gtk_widget_set_size_request(scrolled, 240, 96);
   gtk_widget_add_css_class(scrolled, "card");
-  GtkWidget* cancel = gtk_button_new_with_label("Cancel");
-  GtkWidget* add = gtk_button_new_with_label("Add Note");
+  GtkWidget* cancel = gtk_button_new_with_label(_("Cancel"));
+  GtkWidget* add = gtk_button_new_with_label(_("Add Note"));
   gtk_widget_add_css_class(add, "suggested-action");
   GtkWidget* buttons = gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 6);
   gtk_box_set_homogeneous(GTK_BOX(buttons), TRUE);

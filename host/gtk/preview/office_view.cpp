@@ -11,6 +11,7 @@
 #include "host/gtk/preview/decoder_process.h"
 #include "host/gtk/preview/office_conversion.h"
 #include "host/gtk/preview/portable_document_view.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -53,7 +54,7 @@ class OfficeView : public DocumentView {
         +[](gpointer data) -> gboolean {
           auto* self = static_cast<OfficeView*>(data);
           self->progress_ = 0;
-          self->events_.progress("Preparing the document to be shown");
+          self->events_.progress(_("Preparing the document to be shown"));
           return G_SOURCE_REMOVE;
         },
         this);
@@ -80,7 +81,7 @@ class OfficeView : public DocumentView {
   void converted(const std::string& made, OfficeConversion::Problem problem) {
     switch (problem) {
       case OfficeConversion::Problem::Failed:
-        return events_.failed("This document can’t be shown. It may be damaged or protected by a password.");
+        return events_.failed(_("This document can’t be shown. It may be damaged or protected by a password."));
       case OfficeConversion::Problem::TooSlow:
         return events_.failed(messageForDecoderError(DecoderError::TooSlow));
       case OfficeConversion::Problem::None:

@@ -3,6 +3,8 @@
 
 #include <string>
 
+#include "host/support/texts.h"
+
 namespace vaelo {
 
 PagesIndicator::PagesIndicator(std::function<void(int)> chosen)
@@ -10,7 +12,7 @@ PagesIndicator::PagesIndicator(std::function<void(int)> chosen)
       button_(GTK_WIDGET(g_object_ref_sink(gtk_menu_button_new()))),
       popover_(gtk_popover_new()),
       entry_(gtk_spin_button_new_with_range(1, 2, 1)) {
-  gtk_widget_set_tooltip_text(button_, "Go to Page");
+  gtk_widget_set_tooltip_text(button_, _("Go to Page"));
   gtk_widget_add_css_class(button_, "osd");
   gtk_widget_add_css_class(button_, "numeric");
   gtk_widget_set_halign(button_, GTK_ALIGN_CENTER);
@@ -19,10 +21,10 @@ PagesIndicator::PagesIndicator(std::function<void(int)> chosen)
   gtk_menu_button_set_direction(GTK_MENU_BUTTON(button_), GTK_ARROW_UP);
   gtk_widget_set_visible(button_, FALSE);
 
-  GtkWidget* label = gtk_label_new("Page");
-  GtkWidget* go = gtk_button_new_with_label("Go");
+  GtkWidget* label = gtk_label_new(_("Page"));
+  GtkWidget* go = gtk_button_new_with_label(_("Go"));
   gtk_widget_add_css_class(go, "suggested-action");
-  gtk_accessible_update_property(GTK_ACCESSIBLE(entry_), GTK_ACCESSIBLE_PROPERTY_LABEL, "Page to go to", -1);
+  gtk_accessible_update_property(GTK_ACCESSIBLE(entry_), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Page to go to"), -1);
   gtk_editable_set_width_chars(GTK_EDITABLE(entry_), 5);
   GtkWidget* box = gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 6);
   for (GtkWidget* child : {label, entry_, go}) gtk_box_append(GTK_BOX(box), child);
@@ -55,9 +57,10 @@ void PagesIndicator::show(int page, int count) {
   if (page == page_ && count == count_) return;
   page_ = page;
   count_ = count;
-  const std::string text = std::to_string(page + 1) + " of " + std::to_string(count);
+  const std::string text = filled(_("%s of %s"), {numberText(page + 1), numberText(count)});
   gtk_menu_button_set_label(GTK_MENU_BUTTON(button_), text.c_str());
-  gtk_accessible_update_property(GTK_ACCESSIBLE(button_), GTK_ACCESSIBLE_PROPERTY_LABEL, ("Page " + text).c_str(), -1);
+  gtk_accessible_update_property(GTK_ACCESSIBLE(button_), GTK_ACCESSIBLE_PROPERTY_LABEL,
+                                 filled(_("Page %s of %s"), {numberText(page + 1), numberText(count)}).c_str(), -1);
   gtk_spin_button_set_range(GTK_SPIN_BUTTON(entry_), 1, count);
   gtk_widget_set_visible(button_, count > 1);
 }

@@ -3,6 +3,8 @@
 
 #include <utility>
 
+#include "host/support/texts.h"
+
 namespace vaelo {
 
 PagesSelecting::PagesSelecting(PagesCanvas& canvas, GtkWidget* host, Events events)
@@ -36,9 +38,9 @@ PagesSelecting::PagesSelecting(PagesCanvas& canvas, GtkWidget* host, Events even
   g_action_map_add_action_entries(G_ACTION_MAP(actions_.get()), entries, G_N_ELEMENTS(entries), this);
   gtk_widget_insert_action_group(host_, "pages", G_ACTION_GROUP(actions_.get()));
   const GRef<GMenu> items(g_menu_new());
-  g_menu_append(items.get(), "_Copy", "pages.copy");
-  g_menu_append(items.get(), "_Highlight", "pages.highlight");
-  g_menu_append(items.get(), "_Select Page", "pages.select-all");
+  g_menu_append(items.get(), _("_Copy"), "pages.copy");
+  g_menu_append(items.get(), _("_Highlight"), "pages.highlight");
+  g_menu_append(items.get(), _("_Select Page"), "pages.select-all");
   menu_ = gtk_popover_menu_new_from_model(G_MENU_MODEL(items.get()));
   gtk_popover_set_has_arrow(GTK_POPOVER(menu_), FALSE);
   gtk_widget_set_halign(menu_, GTK_ALIGN_START);

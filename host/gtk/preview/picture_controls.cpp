@@ -4,6 +4,8 @@
 #include <cmath>
 #include <string>
 
+#include "host/support/texts.h"
+
 namespace vaelo {
 
 namespace {
@@ -22,13 +24,13 @@ PictureControls::PictureControls(Actions actions)
   GtkWidget* box = gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 6);
   gtk_widget_add_css_class(box, "osd");
   gtk_widget_add_css_class(box, "toolbar");
-  out_ = addButton(box, "zoom-out-symbolic", "Zoom out", &Actions::zoomOut);
+  out_ = addButton(box, "zoom-out-symbolic", _("Zoom out"), &Actions::zoomOut);
   scale_ = gtk_label_new(nullptr);
   gtk_label_set_width_chars(GTK_LABEL(scale_), 6);
   gtk_widget_add_css_class(scale_, "numeric");
   gtk_box_append(GTK_BOX(box), scale_);
-  in_ = addButton(box, "zoom-in-symbolic", "Zoom in", &Actions::zoomIn);
-  whole_ = addButton(box, "zoom-fit-best-symbolic", "Show the whole picture", &Actions::showWhole);
+  in_ = addButton(box, "zoom-in-symbolic", _("Zoom in"), &Actions::zoomIn);
+  whole_ = addButton(box, "zoom-fit-best-symbolic", _("Show the whole picture"), &Actions::showWhole);
   gtk_revealer_set_transition_type(GTK_REVEALER(revealer_), GTK_REVEALER_TRANSITION_TYPE_CROSSFADE);
   gtk_revealer_set_child(GTK_REVEALER(revealer_), box);
   gtk_widget_set_halign(revealer_, GTK_ALIGN_END);
@@ -81,7 +83,7 @@ void PictureControls::appear() {
 }
 
 void PictureControls::setScale(double scale, bool isFitting, bool isLargest) {
-  const std::string text = std::to_string(std::max(1L, std::lround(scale * 100))) + " %";
+  const std::string text = filled(_("%s %%"), {numberText(std::max(1L, std::lround(scale * 100)))});
   gtk_label_set_text(GTK_LABEL(scale_), text.c_str());
   gtk_widget_set_sensitive(out_, !isFitting);
   gtk_widget_set_sensitive(whole_, !isFitting);

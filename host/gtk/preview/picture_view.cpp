@@ -11,6 +11,7 @@
 #include "host/gtk/preview/picture_frames.h"
 #include "host/gtk/preview/picture_gestures.h"
 #include "host/gtk/preview/shared_bytes.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -33,7 +34,7 @@ class PictureView : public DocumentView {
         overlay_(GTK_WIDGET(g_object_ref_sink(gtk_overlay_new()))),
         gestures_(canvas_),
         controls_({[this] { gestures_.zoomIn(); }, [this] { gestures_.zoomOut(); }, [this] { gestures_.showWhole(); }}),
-        notice_(gtk_label_new("The end of this picture is missing.")) {
+        notice_(gtk_label_new(_("The end of this picture is missing."))) {
     gtk_overlay_set_child(GTK_OVERLAY(overlay_), canvas_.widget());
     gtk_overlay_add_overlay(GTK_OVERLAY(overlay_), controls_.widget());
     gtk_overlay_add_overlay(GTK_OVERLAY(overlay_), notice_);

@@ -7,6 +7,7 @@
 #include <utility>
 
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -22,9 +23,9 @@ std::vector<PortableDocumentMarks*>& living() {
 }
 
 std::string sentenceFor(const std::string& error) {
-  if (error == DecoderError::TooBig) return "This document is too large to be marked.";
-  if (error == DecoderError::Unsupported) return "Marks can’t be written into this document.";
-  return "The marks couldn’t be saved.";
+  if (error == DecoderError::TooBig) return _("This document is too large to be marked.");
+  if (error == DecoderError::Unsupported) return _("Marks can’t be written into this document.");
+  return _("The marks couldn’t be saved.");
 }
 
 }  // namespace
@@ -135,13 +136,14 @@ void PortableDocumentMarks::write(DecoderProcess::Answer answer) {
 
 void PortableDocumentMarks::written(MarkedFile::Result result) {
   if (result.outcome == MarkedFile::Outcome::Failed) {
-    return fail("The marks couldn’t be saved" + (result.reason.empty() ? "." : ": " + result.reason + "."));
+    return fail(result.reason.empty() ? _("The marks couldn’t be saved.")
+                                      : filled(_("The marks couldn’t be saved: %s."), {translated(result.reason)}));
   }
   saved_ = std::move(result.file);
   version_ = result.version;
   if (result.outcome == MarkedFile::Outcome::Beside) {
     const std::string was = std::exchange(document_.name, takeString(g_filename_display_basename(result.path.c_str())));
-    events_.told("Another program changed “" + was + "”. Your marks are in “" + document_.name + "”.");
+    events_.told(filled(_("Another program changed “%s”. Your marks are in “%s”."), {was, document_.name}));
   }
   document_.path = result.path;
   state_ = State::Saved;

@@ -5,6 +5,8 @@
 #include <cmath>
 #include <utility>
 
+#include "host/support/texts.h"
+
 namespace vaelo {
 
 namespace {
@@ -51,7 +53,7 @@ void PortableDocumentMarkup::changed() {
 bool PortableDocumentMarkup::maySave() {
   if (!marks_) return false;
   if (events_.shouldSave()) return true;
-  events_.tell("This document can’t be changed.");
+  events_.tell(_("This document can’t be changed."));
   return false;
 }
 

@@ -1,22 +1,24 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/preview/portable_document_password.h"
 
+#include "host/support/texts.h"
+
 namespace vaelo {
 
 PortableDocumentPassword::PortableDocumentPassword(std::function<void(const std::string&)> entered)
     : entered_(std::move(entered)),
       page_(GTK_WIDGET(g_object_ref_sink(adw_status_page_new()))),
       entry_(gtk_password_entry_new()),
-      wrong_(gtk_label_new("This password is not the right one.")) {
+      wrong_(gtk_label_new(_("This password is not the right one."))) {
   adw_status_page_set_icon_name(ADW_STATUS_PAGE(page_), "channel-secure-symbolic");
-  adw_status_page_set_title(ADW_STATUS_PAGE(page_), "Protected Document");
-  adw_status_page_set_description(ADW_STATUS_PAGE(page_), "This document is protected by a password.");
+  adw_status_page_set_title(ADW_STATUS_PAGE(page_), _("Protected Document"));
+  adw_status_page_set_description(ADW_STATUS_PAGE(page_), _("This document is protected by a password."));
   gtk_password_entry_set_show_peek_icon(GTK_PASSWORD_ENTRY(entry_), TRUE);
-  g_object_set(entry_, "placeholder-text", "Password", nullptr);
-  gtk_accessible_update_property(GTK_ACCESSIBLE(entry_), GTK_ACCESSIBLE_PROPERTY_LABEL, "Password", -1);
+  g_object_set(entry_, "placeholder-text", _("Password"), nullptr);
+  gtk_accessible_update_property(GTK_ACCESSIBLE(entry_), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Password"), -1);
   gtk_widget_add_css_class(wrong_, "error");
   gtk_widget_set_visible(wrong_, FALSE);
-  GtkWidget* open = gtk_button_new_with_label("Open");
+  GtkWidget* open = gtk_button_new_with_label(_("Open"));
   gtk_widget_add_css_class(open, "pill");
   gtk_widget_add_css_class(open, "suggested-action");
   gtk_widget_set_halign(open, GTK_ALIGN_CENTER);

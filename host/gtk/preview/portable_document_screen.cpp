@@ -6,6 +6,8 @@
 #include <algorithm>
 #include <utility>
 
+#include "host/support/texts.h"
+
 namespace vaelo {
 
 namespace {
@@ -172,7 +174,7 @@ void PortableDocumentScreen::draw(GtkSnapshot* snapshot, int page, const PageAre
 
 void PortableDocumentScreen::drawProblem(GtkSnapshot* snapshot, const std::string& problem, const PageArea& area) {
   const bool slow = problem == DecoderError::TooSlow;
-  const char* sentence = slow ? "Showing this page would take too long." : "This page is damaged and can’t be shown.";
+  const char* sentence = slow ? _("Showing this page would take too long.") : _("This page is damaged and can’t be shown.");
   const GRef<PangoLayout> layout(gtk_widget_create_pango_layout(canvas_.widget(), sentence));
   const double margin = std::min(24.0, area.width / 8);
   pango_layout_set_width(layout.get(), static_cast<int>((area.width - 2 * margin) * PANGO_SCALE));
@@ -230,10 +232,11 @@ void PortableDocumentScreen::showFound() {
   canvas_.redraw();
   const int count = find_.count();
   const bool nothing = count == 0 && !find_.isSearching() && !find_.text().empty();
-  std::string text = nothing ? "Not found" : "";
-  if (find_.isSearching() && count == 0) text = "Searching…";
+  std::string text = nothing ? _("Not found") : "";
+  if (find_.isSearching() && count == 0) text = _("Searching…");
   if (count > 0) {
-    text = std::to_string(find_.position()) + " of " + std::to_string(count) + (find_.isSearching() ? "…" : "");
+    // TRANSLATORS: the number of a place where the text was found, and of how many; with "…" there may be more.
+    text = filled(find_.isSearching() ? _("%s of %s…") : _("%s of %s"), {numberText(find_.position()), numberText(count)});
   }
   findBar_.showCount(text, nothing);
 }

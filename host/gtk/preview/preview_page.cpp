@@ -6,6 +6,7 @@
 #include "host/desktop/recent_documents.h"
 #include "host/drive/packages.h"
 #include "host/gtk/bar_item_widget.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -13,8 +14,8 @@ namespace {
 
 constexpr guint LoadingNoticeAfter = 200;  // milliseconds; what is quicker needs no notice
 
-constexpr const char* NoLongerThere = "This document is no longer there.";
-constexpr const char* FolderNow = "There is a folder in this document’s place now.";
+constexpr const char* NoLongerThere = N_("This document is no longer there.");
+constexpr const char* FolderNow = N_("There is a folder in this document’s place now.");
 
 constexpr const char* QueriedAttributes = G_FILE_ATTRIBUTE_STANDARD_TYPE "," G_FILE_ATTRIBUTE_STANDARD_CONTENT_TYPE;
 
@@ -32,7 +33,7 @@ PreviewPage::PreviewPage(std::shared_ptr<PreviewController> controller, std::fun
       spinner_(gtk_spinner_new()) {
   gtk_widget_set_size_request(spinner_, 48, 48);
   gtk_widget_set_halign(spinner_, GTK_ALIGN_CENTER);
-  gtk_accessible_update_property(GTK_ACCESSIBLE(spinner_), GTK_ACCESSIBLE_PROPERTY_LABEL, "Loading", -1);
+  gtk_accessible_update_property(GTK_ACCESSIBLE(spinner_), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Loading"), -1);
   adw_status_page_set_child(ADW_STATUS_PAGE(loading_), spinner_);
   // Empty until the document, or a notice that it takes long, is there to be shown.
   gtk_stack_add_named(GTK_STACK(stack_), gtk_box_new(GTK_ORIENTATION_VERTICAL, 0), "empty");
@@ -142,7 +143,7 @@ void PreviewPage::readInfo(InfoRead done) {
 
 void PreviewPage::infoRead(GFileInfo* info) {
   reading_.reset();
-  if (!info) return showFailure(NoLongerThere);
+  if (!info) return showFailure(_(NoLongerThere));
   const char* type = g_file_info_get_content_type(info);
   const bool isFile = g_file_info_get_file_type(info) == G_FILE_TYPE_REGULAR;
   if (isFile && type && hasDocumentView(type)) return makeView(type);
@@ -153,8 +154,8 @@ void PreviewPage::infoRead(GFileInfo* info) {
 void PreviewPage::showFailure(const std::string& message) {
   struct stat status = {};
   const std::optional<URL> shown = item();
-  if (!shown || ::stat(shown->path().c_str(), &status) != 0) return showFacts(NoLongerThere);
-  showFacts(S_ISDIR(status.st_mode) && !isPackageName(shown->lastPathComponent()) ? FolderNow : message);
+  if (!shown || ::stat(shown->path().c_str(), &status) != 0) return showFacts(_(NoLongerThere));
+  showFacts(S_ISDIR(status.st_mode) && !isPackageName(shown->lastPathComponent()) ? _(FolderNow) : message);
 }
 
 void PreviewPage::makeView(const std::string& contentType) {
@@ -203,7 +204,7 @@ void PreviewPage::showLoadingSoon() {
         auto* self = static_cast<PreviewPage*>(data);
         self->loadingTimer_ = 0;
         gtk_stack_set_visible_child(GTK_STACK(self->stack_), self->loading_);
-        adw_status_page_set_title(ADW_STATUS_PAGE(self->loading_), "Loading…");
+        adw_status_page_set_title(ADW_STATUS_PAGE(self->loading_), _("Loading…"));
         gtk_spinner_start(GTK_SPINNER(self->spinner_));
         return G_SOURCE_REMOVE;
       },

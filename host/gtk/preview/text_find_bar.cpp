@@ -3,6 +3,8 @@
 
 #include <string>
 
+#include "host/support/texts.h"
+
 namespace vaelo {
 
 TextFindBar::TextFindBar(GtkTextView* view)
@@ -91,8 +93,8 @@ void TextFindBar::showCount() {
     GtkTextIter end;
     gtk_text_buffer_get_selection_bounds(gtk_text_view_get_buffer(view_), &begin, &end);
     const int position = gtk_source_search_context_get_occurrence_position(context_.get(), &begin, &end);
-    text = position > 0 ? std::to_string(position) + " of " + std::to_string(count) : std::to_string(count);
-    if (count == 0) text = "Not found";
+    text = position > 0 ? filled(_("%s of %s"), {numberText(position), numberText(count)}) : numberText(count);
+    if (count == 0) text = _("Not found");
   }
   bar_.showCount(text, count == 0 && searching);
 }

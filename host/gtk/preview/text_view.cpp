@@ -9,6 +9,7 @@
 #include "host/gtk/preview/text_load.h"
 #include "host/gtk/preview/text_note.h"
 #include "host/gtk/preview/text_zoom.h"
+#include "host/support/texts.h"
 #include "platform/platform.h"
 
 namespace vaelo {
@@ -17,18 +18,21 @@ namespace {
 
 std::string noteFor(const TextPiece& piece) {
   std::string note;
-  if (piece.documentBytes == 0 && piece.last) note = "This document is empty.";
+  if (piece.documentBytes == 0 && piece.last) note = _("This document is empty.");
   if (piece.shortened) {
     Formatting& formatting = Platform::current().formatting;
-    note = "Only the first " + formatting.byteCount(piece.bytesRead, ByteCountStyle::File) + " of " +
-           formatting.byteCount(piece.documentBytes, ByteCountStyle::File) + " are shown.";
+    note =
+        filled(_("Only the first %s of %s are shown."), {formatting.byteCount(piece.bytesRead, ByteCountStyle::File),
+                                                         formatting.byteCount(piece.documentBytes, ByteCountStyle::File)});
   }
-  if (piece.brokeLines) note += (note.empty() ? "" : " ") + std::string("Lines that are too long go on in the next line.");
+  if (!piece.brokeLines) return note;
+  const char* broken = _("Lines that are too long go on in the next line.");
+  return note.empty() ? broken : sentences(note, broken);
   return note;
 }
 
 std::string sentenceFor(const std::string& error) {
-  if (error == DecoderError::Unsupported) return "This document’s name says text, but its content isn’t.";
+  if (error == DecoderError::Unsupported) return _("This document’s name says text, but its content isn’t.");
   return messageForDecoderError(error);
 }
 

@@ -4,6 +4,7 @@
 #include <adwaita.h>
 
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
@@ -20,7 +21,7 @@ struct WindowNotice::Window {
     if (overlay && gtk_widget_get_root(GTK_WIDGET(overlay.get()))) return toast(overlay.get(), sentence);
     GApplication* application = g_application_get_default();
     if (!application || !g_application_get_is_registered(application)) return;
-    const GRef<GNotification> notification(g_notification_new("Markup"));
+    const GRef<GNotification> notification(g_notification_new(_("Markup")));
     g_notification_set_body(notification.get(), sentence.c_str());
     g_application_send_notification(application, nullptr, notification.get());
   }

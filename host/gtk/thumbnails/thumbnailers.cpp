@@ -12,7 +12,7 @@ namespace vaelo {
 
 namespace {
 
-constexpr const char* Group = "Thumbnailer Entry";
+constexpr const char* Group = "Thumbnailer Entry";  // not for people
 
 std::vector<std::string> filesIn(const std::string& folder) {
   std::vector<std::string> files;
