@@ -1,10 +1,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/list/folder_row.h"
 
-#include <glib/gi18n.h>
-
 #include <algorithm>
 #include <utility>
+
+#include "host/support/texts.h"
 
 namespace vaelo {
 namespace {
@@ -69,9 +69,10 @@ PangoLayout* makeLayout(GtkWidget* widget, const std::string& text, bool small, 
     pango_attr_list_unref(attributes);
   }
   // Text stands at the row's start, whichever way the name itself is read: "left" is where the row begins, but for a text
-  // that is read from the right it is where the row ends.
-  const bool readRtl = pango_layout_get_direction(layout, 0) == PANGO_DIRECTION_RTL;
-  pango_layout_set_alignment(layout, centered ? PANGO_ALIGN_CENTER : readRtl ? PANGO_ALIGN_RIGHT : PANGO_ALIGN_LEFT);
+  // that is read from the right it is where the row ends. A digit at its beginning doesn't tell which that is.
+  const PangoDirection read = pango_layout_line_get_resolved_direction(pango_layout_get_line_readonly(layout, 0));
+  const PangoAlignment side = read == PANGO_DIRECTION_RTL ? PANGO_ALIGN_RIGHT : PANGO_ALIGN_LEFT;
+  pango_layout_set_alignment(layout, centered ? PANGO_ALIGN_CENTER : side);
   return layout;
 }
 
@@ -248,9 +249,9 @@ void tellAccessibility(Row* row) {
   const FolderItem& item = folderItemOf(row->item);
   std::string label = item.displayName;
   if (item.details && !item.details->secondLine.empty()) {
-    label += ", " + item.details->secondLine;
+    label = listedText(label, item.details->secondLine);
   } else if (isPromised(item.kind)) {
-    label += std::string(", ") + _("Not downloaded");
+    label = listedText(label, _("Not downloaded"));
   }
   gtk_accessible_update_property(GTK_ACCESSIBLE(listItem), GTK_ACCESSIBLE_PROPERTY_LABEL, label.c_str(), -1);
 }
