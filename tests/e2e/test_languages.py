@@ -1,0 +1,127 @@
+# SPDX-License-Identifier: GPL-3.0-or-later
+"""The window in other languages than English: its texts, its numbers, and which side it begins on."""
+import os
+import pathlib
+import subprocess
+import tempfile
+import unittest
+
+from PIL import Image
+
+from harness import PROGRAM, App, wait_for
+
+
+class Languages(unittest.TestCase):
+    def open(self, **environment):
+        def prepare(app):
+            app.drive.mkdir(parents=True)
+            (app.data / "account.ini").write_text("[Account]\nName=x\nToken=ab\nSignedIn=true\n")
+            (app.drive / "Plans").mkdir()
+            for name in ("Report.txt", "Second.txt", "تقرير"):
+                (app.drive / name).write_text("x" * 1250)
+            (app.drive / "Big.bin").touch()
+            with (app.drive / "Big.bin").open("wb") as big:
+                big.truncate(1250000)
+        self.app = App(size=(800, 640), prepare=prepare, **environment)
+        self.addCleanup(self.app.close)
+        self.app.wait("Report.txt", "list item")
+        return self.app
+
+    def showing(self, text):
+        wait_for(f"“{text}” to show; showing: {self.app.names()[:60]}", lambda: any(text in name for name in self.app.names()))
+
+    def installed(self, name):
+        """The environment of a system on which the locale is installed."""
+        folder = tempfile.TemporaryDirectory()
+        self.addCleanup(folder.cleanup)
+        language, codeset = name.split(".")
+        subprocess.run(["localedef", "-i", language, "-f", codeset, str(pathlib.Path(folder.name) / name)], check=True)
+        return {"LOCPATH": folder.name, "LC_ALL": name}
+
+    def side_of(self, item):
+        """Where the texts of a row stand, which has its icon at one end and nothing at the other."""
+        row = self.app.find(item, "list item")
+        picture = Image.open(self.app.screenshot()).convert("L")
+        x, y = row[2] + (picture.width - 800) // 2, row[3] + (picture.height - 640) // 2
+        name, details = (y + 3, y + row[5] // 2), (y + row[5] // 2 + 2, y + row[5] - 3)
+        sides = []
+        for top, bottom in (name, details):
+            ink = [any(picture.getpixel((at, line)) < 140 for line in range(top, bottom)) for at in range(x + 80, x + 720)]
+            sides.append("right" if any(ink[320:]) and not any(ink[:320]) else "left" if any(ink[:320]) and not any(ink[320:]) else ink)
+        return sides
+
+    def menu_of(self, item):
+        self.app.click(item, "list item", button=3)
+
+    def test_german_where_its_locale_is_installed(self):
+        app = self.open(**self.installed("de_DE.UTF-8"))
+        for name in ("Auswählen", "Suchen", "Als Raster anzeigen", "Hauptmenü"):
+            app.wait(name)
+        self.showing("5 Objekte, ")
+        self.showing("verfügbar")
+        self.showing("1,3\u00a0MB")
+        self.showing("0 Objekte")
+        for item in ("Report.txt", "تقرير"):
+            self.assertEqual(self.side_of(item), ["left", "left"], item)
+        app.click("Auswählen", "push button")
+        app.wait_title("Auswahl")
+        app.click("Report.txt", "list item")
+        app.wait_title("1 ausgewählt")
+        app.click("Second.txt", "list item")
+        app.wait_title("2 ausgewählt")
+        app.click("Löschen", "push button")
+        app.wait("2 Objekte werden auf allen Ihren Geräten endgültig aus Vaelo Drive gelöscht.")
+        app.wait("Aus Vaelo Drive löschen", "push button")
+        app.wait("Abbrechen", "push button")
+
+    def test_german_menus_and_prompts(self):
+        app = self.open(LANGUAGE="de")
+        self.menu_of("Report.txt")
+        for name in ("Öffnen", "Teilen …", "Informationen", "Umbenennen …", "Schlagwörter …", "Verschieben …",
+                     "Löschen …"):
+            app.wait(name, "menu item")
+        app.key("u")
+        app.wait("Objekt umbenennen")
+        app.wait("Geben Sie einen neuen Namen für dieses Objekt ein.")
+        app.wait("Fertig", "push button")
+
+    def test_arabic_begins_on_the_right_although_its_locale_is_not_installed(self):
+        app = self.open(LC_ALL="ar_EG.UTF-8")
+        self.showing("٥ عناصر")
+        self.showing("المتاح")
+        select, search = app.wait("اختر", "push button"), app.wait("ابحث", "push button")
+        self.assertLess(select[2] + select[4], 400, "what ends the header is on the left")
+        self.assertLess(search[2] + search[4], 400)
+        for item in ("Report.txt", "تقرير"):
+            self.assertEqual(self.side_of(item), ["right", "right"], item)
+        app.click("Plans", "list item")
+        app.wait("هذا المجلد فارغ")
+        back = app.wait("ارجع", "push button")
+        self.assertGreater(back[2], 700, "the way back is on the right")
+        app.click("ارجع", "push button")
+        app.wait("Report.txt", "list item")
+
+    def test_the_first_language_of_several_that_is_there(self):
+        app = self.open(LANGUAGE="he:en_GB:de")
+        app.wait("Select", "push button")
+        self.assertLess(400, app.find("Select", "push button")[2], "and English begins on the left")
+
+
+class Installed(unittest.TestCase):
+    def test_the_translations_are_found_where_they_are_installed(self):
+        with tempfile.TemporaryDirectory() as root:
+            subprocess.run(["cmake", "--install", str(pathlib.Path(PROGRAM).parent)], check=True, capture_output=True,
+                           env={**os.environ, "DESTDIR": root})
+            program = next(pathlib.Path(root).rglob("bin/vaelo-drive"))
+            said = subprocess.run([program, "--help"], check=True, capture_output=True, text=True,
+                                  env={**os.environ, "LC_ALL": "C.UTF-8", "LANGUAGE": "ru"}).stdout
+            self.assertIn("Искать на облачном диске", said)
+            entry = next(pathlib.Path(root).rglob("com.marrow.VaeloDrive.desktop")).read_text()
+            self.assertIn("Name[ja]=最近使ったドキュメント", entry)
+            self.assertIn("Name=Recent Document", entry)
+            about = next(pathlib.Path(root).rglob("com.marrow.VaeloDrive.metainfo.xml")).read_text()
+            self.assertIn('<summary xml:lang="fr">Parcourir et gérer', about)
+
+
+if __name__ == "__main__":
+    unittest.main()
