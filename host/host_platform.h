@@ -21,6 +21,7 @@
 #include "host/files/local_file_coordination.h"
 #include "host/files/local_file_manager.h"
 #include "host/files/local_resource_values.h"
+#include "host/files/long_work.h"
 #include "host/files/move_history.h"
 #include "host/gtk/thumbnails/document_thumbnails.h"
 #include "platform/platform.h"
@@ -56,6 +57,7 @@ class HostPlatform {
   DocumentStore& documentStore() { return documentStore_; }
   FileProvider& fileProvider() { return fileProvider_; }
   MoveHistory& moves() { return moves_; }
+  LongWork& longWork() { return longWork_; }
   DriveSyncedStore& syncedStore() { return syncedStore_; }
   DriveUserActivities& userActivities() { return userActivities_; }
 
@@ -69,14 +71,15 @@ class HostPlatform {
   IcuFormatting formatting_;
   AccountOffers offers_;  // before the drive, whose workers tell it what they measure
   LocalCloudDocuments drive_;
-  LocalFileManager fileManager_{&drive_.removals(), readNameRules(drive_.layout().accountFile())};
+  MoveHistory moves_{queues_};
+  LongWork longWork_{[this](bool isUnderWay) { moves_.hold(isUnderWay); }};
+  LocalFileManager fileManager_{&drive_.removals(), readNameRules(drive_.layout().accountFile()), &longWork_};
   LocalDocumentStore documentStore_;
   LocalFileProvider fileProvider_;
   LocalResourceValues resourceValues_;
   DriveFileProgress fileProgress_;
   DriveUserActivities userActivities_;
   DriveSyncedStore syncedStore_;
-  MoveHistory moves_{queues_};
   LocalFileCoordination coordination_;
   DocumentThumbnails thumbnails_;
   GioLaunchServices launchServices_;

@@ -7,6 +7,7 @@
 #include "host/gtk/change_toasts.h"
 #include "host/gtk/gtk_application_loop.h"
 #include "host/gtk/gtk_screens.h"
+#include "host/gtk/long_work_dialog.h"
 #include "host/host_platform.h"
 #include "host/support/graphics_device.h"
 #include "host/support/message_catalogue.h"
@@ -22,5 +23,6 @@ int main(int argc, char** argv) {
                                  vaelo::RestorationStore(folders.restorationFile));
   platform.install(loop, screens);
   const vaelo::ChangeToasts toasts(screens, platform.drive(), platform.moves());
+  const vaelo::LongWorkDialog progress(screens, platform.longWork());
   return vaelo::vaeloMain(argc, argv);
 }

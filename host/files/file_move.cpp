@@ -10,6 +10,7 @@
 #include <cstdio>
 
 #include "host/drive/promise_file.h"
+#include "host/files/long_work.h"
 #include "host/files/system_error.h"
 #include "host/files/tree_copy.h"
 #include "host/files/tree_removals.h"
@@ -41,12 +42,12 @@ int renameItem(const std::string& from, const std::string& to) {
   return rename(from.c_str(), to.c_str()) == 0 ? 0 : errno;
 }
 
-int copyThenRemove(const std::string& from, const std::string& to, TreeRemovals* removals) {
+int copyThenRemove(const std::string& from, const std::string& to, TreeRemovals* removals, const TreeCopy::GoOn& goOn) {
   if (const int number = whyNotMovable(from, folderOf(to))) return number;
   char name[48];
   std::snprintf(name, sizeof name, "/.vaelo-move-%08x%08x", g_random_int(), g_random_int());
   const std::string temporary = folderOf(to) + name;
-  TreeCopy copy(from, temporary);
+  TreeCopy copy(from, temporary, goOn);
   int number = copy.run();
   // What another program wrote meanwhile must not go with the source.
   if (number == 0 && !copy.sourceIsUnchanged()) number = EBUSY;
@@ -70,11 +71,14 @@ Error moveError(int number, const std::string& from, const std::string& to) {
   return error;
 }
 
-std::optional<Error> moveFile(const std::string& from, const std::string& to, TreeRemovals* removals) {
+std::optional<Error> moveFile(const std::string& from, const std::string& to, TreeRemovals* removals, LongWork* longWork) {
   // A mount below the folder would otherwise make it a copy of itself without end.
   if (URL(to).isInside(URL(from))) return moveError(EINVAL, from, to);
   int number = renameItem(from, to);
-  if (number == EXDEV) number = copyThenRemove(from, to, removals);
+  if (number == EXDEV) {
+    const auto copies = [&](const TreeCopy::GoOn& goOn) { return copyThenRemove(from, to, removals, goOn); };
+    number = longWork ? longWork->run(from, copies) : copies([] { return true; });
+  }
   if (number != 0) return moveError(number, from, to);
   return std::nullopt;
 }

@@ -104,7 +104,7 @@ std::optional<Error> LocalFileManager::moveItemAtURL(const URL& source, const UR
   }
   // An item may change to another spelling of its own name.
   if (clashingItem(to, rules_, source.path())) return moveError(EEXIST, source.path(), to);
-  return isPromiseName(URL(*from).lastPathComponent()) ? movePromise(*from, to) : moveFile(*from, to, removals_);
+  return isPromiseName(URL(*from).lastPathComponent()) ? movePromise(*from, to) : moveFile(*from, to, removals_, longWork_);
 }
 
 void LocalFileManager::enumerate(const URL& url, const std::vector<ResourceKey>&, unsigned options,

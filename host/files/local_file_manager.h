@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include "host/files/long_work.h"
 #include "host/files/name_rules.h"
 #include "host/files/tree_removals.h"
 #include "platform/file_manager.h"
@@ -11,8 +12,9 @@ namespace vaelo {
 class LocalFileManager : public FileManager {
  public:
   /// Folders that are removed go through `removals`, which outlives it; without, they are removed on the spot. What `rules`
-  /// take for one name is taken.
-  explicit LocalFileManager(TreeRemovals* removals = nullptr, NameRules rules = {}) : removals_(removals), rules_(rules) {}
+  /// take for one name is taken. Moves between disks are `longWork`, where given, which outlives it too.
+  explicit LocalFileManager(TreeRemovals* removals = nullptr, NameRules rules = {}, LongWork* longWork = nullptr)
+      : removals_(removals), rules_(rules), longWork_(longWork) {}
   bool fileExistsAtPath(const std::string& path, bool* isDirectory = nullptr) override;
   Result<FileAttributes> attributesOfItemAtPath(const std::string& path) override;
   Result<std::string> destinationOfSymbolicLinkAtPath(const std::string& path) override;
@@ -28,6 +30,7 @@ class LocalFileManager : public FileManager {
  private:
   TreeRemovals* removals_;
   const NameRules rules_;
+  LongWork* longWork_;
 };
 
 }  // namespace vaelo

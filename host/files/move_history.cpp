@@ -36,7 +36,13 @@ void MoveHistory::moved(const URL& from, const URL& to) {
   });
 }
 
+void MoveHistory::hold(bool held) {
+  held_ = held;
+  offerPending();
+}
+
 void MoveHistory::offerPending() {
+  if (held_) return;
   auto batch = std::make_shared<Batch>();
   {
     const std::lock_guard lock(mutex_);

@@ -37,6 +37,8 @@ class MoveHistory {
   void moved(const URL& from, const URL& to);
   /// Called on the main queue with each batch, but not with what undo() moves. Main thread.
   void setOffer(Offer offer) { offer_ = std::move(offer); }
+  /// While held, nothing is offered: the main queue turns to other things in the midst of a move. Main thread.
+  void hold(bool held);
   /// Moves the items back, the latest first, by coordinated moves that replace nothing, and goes on after a failure. Answers
   /// what failed; what is no longer the item that was moved stays, with error 512. Blocks. Main thread.
   std::vector<Error> undo(const Batch& batch);
@@ -49,6 +51,7 @@ class MoveHistory {
   std::mutex mutex_;  // guards the two below
   Batch pending_;
   bool undoing_ = false;
+  bool held_ = false;                                                                // main thread only
   const std::shared_ptr<MoveHistory*> self_ = std::make_shared<MoveHistory*>(this);  // for blocks that come too late
 };
 

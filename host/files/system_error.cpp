@@ -36,6 +36,8 @@ const char* wordsFor(int number) {
       return _("The links of “%s” run in a circle.");
     case EBUSY:
       return _("“%s” is being changed by another program. Try again later.");
+    case ECANCELED:
+      return _("“%s” stays where it is.");
     default:
       return _("“%s” can’t be used.");
   }
@@ -56,6 +58,7 @@ std::string wordsForLongName(const std::string& name) {
 
 Error describedError(int number, const std::string& path, FileAccess access) {
   Error error = errorFromErrno(number, path, access);
+  if (number == ECANCELED) error.code = FileErrorCode::UserCancelled;
   if (number == ENOTEMPTY) error.code = FileErrorCode::WriteFileExists;
   if (number == EILSEQ && access == FileAccess::Write) error.code = FileErrorCode::WriteInvalidFileName;
   if (number == ENAMETOOLONG && access == FileAccess::Write) {

@@ -47,29 +47,6 @@ int copyLink(const std::string& from, const std::string& to) {
   return symlink(target, to.c_str()) == 0 ? 0 : errno;
 }
 
-/// 0 when both have the same bytes, else EIO or the error number.
-int compareContent(int one, int other) {
-  constexpr std::size_t block = 1 << 18;
-  std::vector<char> first(block);
-  std::vector<char> second(block);
-  off_t at = 0;
-  for (;;) {
-    const ssize_t length = pread(one, first.data(), block, at);
-    if (length < 0) return errno;
-    std::size_t have = 0;
-    while (have < static_cast<std::size_t>(std::max<ssize_t>(length, 1))) {
-      const ssize_t more = pread(other, second.data() + have, block - have, at + static_cast<off_t>(have));
-      if (more < 0) return errno;
-      if (more == 0) break;
-      have += static_cast<std::size_t>(more);
-    }
-    if (have < static_cast<std::size_t>(length) || (length == 0 && have > 0)) return EIO;
-    if (length == 0) return 0;
-    if (std::memcmp(first.data(), second.data(), static_cast<std::size_t>(length)) != 0) return EIO;
-    at += length;
-  }
-}
-
 /// What an item and all below it ask of the disk that they are to go to.
 struct Needs {
   std::uint64_t block;
@@ -111,6 +88,7 @@ int whyNotMovable(const std::string& from, const std::string& into) {
 }
 
 int TreeCopy::copy(const std::string& from, const std::string& to) {
+  if (!goOn_()) return ECANCELED;
   struct stat info {};
   if (lstat(from.c_str(), &info) != 0) return errno;
   copied_.push_back({from, info});
@@ -121,13 +99,38 @@ int TreeCopy::copy(const std::string& from, const std::string& to) {
   return EOPNOTSUPP;
 }
 
+/// 0 when both have the same bytes, else EIO or the error number.
+int TreeCopy::compareContent(int one, int other) const {
+  constexpr std::size_t block = 1 << 18;
+  std::vector<char> first(block);
+  std::vector<char> second(block);
+  off_t at = 0;
+  for (;;) {
+    if (!goOn_()) return ECANCELED;
+    const ssize_t length = pread(one, first.data(), block, at);
+    if (length < 0) return errno;
+    std::size_t have = 0;
+    while (have < static_cast<std::size_t>(std::max<ssize_t>(length, 1))) {
+      const ssize_t more = pread(other, second.data() + have, block - have, at + static_cast<off_t>(have));
+      if (more < 0) return errno;
+      if (more == 0) break;
+      have += static_cast<std::size_t>(more);
+    }
+    if (have < static_cast<std::size_t>(length) || (length == 0 && have > 0)) return EIO;
+    if (length == 0) return 0;
+    if (std::memcmp(first.data(), second.data(), static_cast<std::size_t>(length)) != 0) return EIO;
+    at += length;
+  }
+}
+
 int TreeCopy::copyFile(const std::string& from, const std::string& to, const struct stat& info) {
   const UniqueFd in(open(from.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC));
   if (!in) return errno;
   const UniqueFd out(open(to.c_str(), O_RDWR | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600));
   if (!out) return errno;
   for (;;) {
-    constexpr std::size_t most = 0x7ffff000;  // what one call transfers on Linux
+    if (!goOn_()) return ECANCELED;
+    constexpr std::size_t most = 1 << 23;  // a fraction of a second's worth
     const ssize_t step = sendfile(out.get(), in.get(), nullptr, most);
     if (step == 0) break;
     if (step < 0 && errno != EINTR) return errno;

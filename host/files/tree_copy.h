@@ -3,6 +3,7 @@
 
 #include <sys/stat.h>
 
+#include <functional>
 #include <string>
 #include <vector>
 
@@ -16,10 +17,14 @@ int whyNotMovable(const std::string& from, const std::string& into);
 /// flushed, and what a file's copy has on the disk is compared with the file. Blocks; one thread.
 class TreeCopy {
  public:
-  /// Nothing may stand at `to`.
-  TreeCopy(std::string from, std::string to) : from_(std::move(from)), to_(std::move(to)) {}
+  using GoOn = std::function<bool()>;
+
+  /// Nothing may stand at `to`. `goOn` is asked many times a second.
+  TreeCopy(
+      std::string from, std::string to, GoOn goOn = [] { return true; })
+      : from_(std::move(from)), to_(std::move(to)), goOn_(std::move(goOn)) {}
   /// 0 or the error number, after which a part of the copy may be there. EBUSY: the source changed meanwhile; EIO: the
-  /// disk gave back something else than it was given.
+  /// disk gave back something else than it was given; ECANCELED: it was told to end.
   int run() { return copy(from_, to_); }
   bool isFolder() const { return !copied_.empty() && S_ISDIR(copied_.front().info.st_mode); }
   /// True while everything that run() copied is still as it was.
@@ -31,11 +36,13 @@ class TreeCopy {
     struct stat info;
   };
   int copy(const std::string& from, const std::string& to);
+  int compareContent(int one, int other) const;
   int copyFile(const std::string& from, const std::string& to, const struct stat& info);
   int copyFolder(const std::string& from, const std::string& to, const struct stat& info);
 
   std::string from_;
   std::string to_;
+  GoOn goOn_;
   std::vector<Copied> copied_;
 };
 

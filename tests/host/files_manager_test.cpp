@@ -292,6 +292,22 @@ TEST_F(FilesManagerTest, ACopyKnowsWhenItsSourceChanged) {
   EXPECT_FALSE(second.sourceIsUnchanged());
 }
 
+TEST_F(FilesManagerTest, ACopyEndsWhereverItIsToldTo) {
+  write(drive + "/tree/a", std::string(300000, 'x'));
+  write(drive + "/tree/b", "b");
+  int questions = 0;
+  TreeCopy whole(drive + "/tree", drive + "/whole", [&] { return ++questions > 0; });
+  ASSERT_EQ(whole.run(), 0);
+  // The folder and two files, and of each file what is copied, in one step and a last one, and what is compared: of the
+  // first in two blocks and the end, of the second in one and the end.
+  EXPECT_EQ(questions, 3 + 2 + 2 + 3 + 2);
+  for (int last = 0; last < questions; ++last) {
+    int asked = 0;
+    TreeCopy copy(drive + "/tree", drive + "/copy " + std::to_string(last), [&] { return asked++ < last; });
+    EXPECT_EQ(copy.run(), ECANCELED) << last;
+  }
+}
+
 TEST_F(FilesManagerTest, TheWalkSeesEveryItemOnceAndFollowsNoLink) {
   write(drive + "/a/file");
   write(drive + "/a/.hidden/x");
