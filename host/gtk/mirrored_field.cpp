@@ -1,6 +1,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/mirrored_field.h"
 
+#include <unicode/ubidi.h>
+#include <unicode/unistr.h>
+
 #include "host/gtk/mirrored_text.h"
 #include "host/support/texts.h"
 
@@ -8,9 +11,16 @@ namespace vaelo {
 
 namespace {
 
-float xalignOf(TextAlignment alignment) {
-  if (alignment == TextAlignment::Center) return 0.5F;
-  return alignment == TextAlignment::Right ? 1 : 0;
+/// The toolkit counts from where the text itself begins; the model means sides, or where the interface begins.
+float xalignOf(const TextField& field, GtkWidget* entry) {
+  if (field.textAlignment() == TextAlignment::Center) return 0.5F;
+  const icu::UnicodeString text = icu::UnicodeString::fromUTF8(field.text());
+  const UBiDiDirection own = ubidi_getBaseDirection(text.getBuffer(), text.length());
+  const bool interfaceTurned = gtk_widget_get_direction(entry) == GTK_TEXT_DIR_RTL;
+  const bool textTurned = own == UBIDI_NEUTRAL ? interfaceTurned : own == UBIDI_RTL;
+  const bool right =
+      field.textAlignment() == TextAlignment::Natural ? interfaceTurned : field.textAlignment() == TextAlignment::Right;
+  return right == textTurned ? 0 : 1;
 }
 
 }  // namespace
@@ -52,7 +62,7 @@ void MirroredField::update() {
     gtk_editable_set_text(GTK_EDITABLE(entry_), field_->text().c_str());
   }
   gtk_entry_set_placeholder_text(entry, field_->placeholder().empty() ? nullptr : field_->placeholder().c_str());
-  gtk_editable_set_alignment(GTK_EDITABLE(entry_), xalignOf(field_->textAlignment()));
+  gtk_editable_set_alignment(GTK_EDITABLE(entry_), xalignOf(*field_, entry_));
   PangoAttrList* attributes = attributesOf(field_->font());
   gtk_entry_set_attributes(entry, attributes);
   pango_attr_list_unref(attributes);
