@@ -27,6 +27,7 @@ std::shared_ptr<ThumbnailImageView> ThumbnailImageView::initWithFrame(const Rect
   view->thumbnailView_->setContentMode(ContentMode::TopLeft);
   // A small thumbnail stays crisp when it is enlarged.
   view->thumbnailView_->setMagnificationFilter(MagnificationFilter::Nearest);
+  view->thumbnailView_->setAccessibilityLabel(Platform::current().formatting.localizedString("Thumbnail"));
   view->addSubview(view->thumbnailView_);
   return view;
 }

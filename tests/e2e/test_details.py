@@ -34,7 +34,7 @@ class Upright(Details):
     size = (360, 720)
 
     def test_the_facts_are_below_the_picture_and_the_buttons_below_them(self):
-        picture = self.row("GtkPicture", "image")
+        picture = self.row("Thumbnail", "image")
         facts = self.row("Kind", "label")
         share = self.row("Share", "push button")
         self.assertGreater(facts[3], picture[3] + picture[5])
@@ -45,7 +45,7 @@ class Wide(Details):
     size = (1280, 800)
 
     def test_the_facts_are_beside_the_picture(self):
-        picture = self.row("GtkPicture", "image")
+        picture = self.row("Thumbnail", "image")
         facts = self.row("Kind", "label")
         self.assertGreater(facts[2], picture[2] + picture[4])
 

@@ -81,6 +81,8 @@ void MirroredPicture::update() {
     const GRef<GdkPaintable> large(times > 1 ? magnified(GDK_TEXTURE(picture), times) : nullptr);
     gtk_picture_set_paintable(GTK_PICTURE(area_), large ? large.get() : picture);
   }
+  gtk_accessible_update_property(GTK_ACCESSIBLE(area_), GTK_ACCESSIBLE_PROPERTY_LABEL, view_.accessibilityLabel().c_str(),
+                                 -1);
   if (view_.borderWidth() > 0) {
     gtk_widget_add_css_class(area_, BorderClass);
   } else {
