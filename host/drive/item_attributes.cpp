@@ -38,6 +38,11 @@ std::optional<std::string> sharedItemRoleAt(const std::string& physical) {
   return role;
 }
 
+bool extensionIsHiddenAt(const std::string& physical) {
+  if (const auto promise = promiseAt(physical)) return promise->extensionHidden;
+  return extendedAttribute(physical, "user.vaelo.hidden-extension") == "true";
+}
+
 namespace {
 
 /// As they are kept, whatever they are.

@@ -15,6 +15,8 @@ namespace vaelo {
 
 /// SharedItemRoleOwner or SharedItemRoleParticipant; nothing when the item is not shared or the attribute says neither.
 std::optional<std::string> sharedItemRoleAt(const std::string& physical);
+/// Whether a person is to see the item's name without its extension.
+bool extensionIsHiddenAt(const std::string& physical);
 /// Tag names in the order in which they are kept, trimmed, without empty and repeated ones and what is not UTF-8.
 std::vector<std::string> tagNamesAt(const std::string& physical);
 

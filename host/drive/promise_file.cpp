@@ -129,6 +129,7 @@ Result<PromiseInfo> readPromise(const std::string& promisePath) {
   info.modified = date(value("Modified"));
   info.created = date(value("Created"));
   info.package = keyFileBool(keys, group, "Package", false);
+  info.extensionHidden = keyFileBool(keys, group, "ExtensionHidden", false);
   const std::optional<std::string> share = value("Share");
   if (share == SharedItemRoleOwner || share == SharedItemRoleParticipant) info.share = share;
   info.tags = keyFileList(keys, group, "Tags").value_or(std::vector<std::string>());
@@ -148,6 +149,7 @@ std::optional<Error> writePromise(const std::string& folder, const PromiseInfo& 
   if (info.modified) set("Modified", text(*info.modified));
   if (info.created) set("Created", text(*info.created));
   set("Package", info.package ? "true" : "false");
+  if (info.extensionHidden) set("ExtensionHidden", "true");
   if (info.share) set("Share", *info.share);
   std::vector<const char*> tags;
   for (const std::string& tag : info.tags) tags.push_back(tag.c_str());

@@ -23,6 +23,7 @@ struct PromiseInfo {
   std::optional<Date> modified;
   std::optional<Date> created;
   bool package = false;              ///< the item is a package (a folder shown as a document)
+  bool extensionHidden = false;      ///< a person sees the name without its extension
   std::optional<std::string> share;  ///< SharedItemRoleOwner or SharedItemRoleParticipant
   std::vector<std::string> tags;     ///< in the order in which they are kept
   std::optional<std::int64_t> documentID;

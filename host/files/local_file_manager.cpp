@@ -11,6 +11,7 @@
 #include <climits>
 #include <cstdio>
 
+#include "host/drive/item_attributes.h"
 #include "host/drive/promise_file.h"
 #include "host/files/file_move.h"
 #include "host/files/file_times.h"
@@ -60,6 +61,7 @@ Result<FileAttributes> LocalFileManager::attributesOfItemAtPath(const std::strin
   attributes.size = Value(static_cast<std::uint64_t>(info.stx_size));
   attributes.modificationDate = dateOf(info.stx_mtime);
   if (info.stx_mask & STATX_BTIME) attributes.creationDate = dateOf(info.stx_btime);
+  attributes.extensionHidden = extensionIsHiddenAt(path);
   return attributes;
 }
 

@@ -10,6 +10,7 @@
 #include <cstdlib>
 
 #include "host/drive/alias_file.h"
+#include "host/drive/bookmark_file.h"
 #include "host/drive/item_attributes.h"
 #include "host/drive/packages.h"
 #include "host/drive/promise_file.h"
@@ -53,7 +54,7 @@ class LocalResourceValues::Reader {
       case ResourceKey::IsRegularFile:
         return promise_ ? !promise_->package : S_ISREG(info_.stx_mode);
       case ResourceKey::HasHiddenExtension:
-        return false;
+        return extensionIsHidden();
       case ResourceKey::ParentDirectoryURL:
         return url_.deletingLastPathComponent();
       case ResourceKey::IsShared:
@@ -74,8 +75,18 @@ class LocalResourceValues::Reader {
   bool isFolder() const { return promise_ ? promise_->package : S_ISDIR(info_.stx_mode); }
   bool isPackage() const { return promise_ ? promise_->package : S_ISDIR(info_.stx_mode) && isPackageName(name_); }
   bool isAlias() const { return !promise_ && S_ISREG(info_.stx_mode) && isAliasName(name_) && readAliasFile(url_.path()); }
+  /// By the item's own wish; that of a reference says how it is stored, not what it is called.
+  bool extensionIsHidden() const {
+    if (url_.pathExtension().empty() || (isFolder() && !isPackage())) return false;
+    if (promise_) return promise_->extensionHidden;
+    const bool isBookmark = S_ISREG(info_.stx_mode) && isBookmarkName(name_);
+    return isBookmark || isAlias() || extensionIsHiddenAt(url_.path());
+  }
   /// A person reads text, whatever bytes the name has.
-  std::string displayName() const { return takeString(g_filename_display_name(name_.c_str())); }
+  std::string displayName() const {
+    const std::size_t extension = extensionIsHidden() ? url_.pathExtension().size() + 1 : 0;
+    return takeString(g_filename_display_name(name_.substr(0, name_.size() - extension).c_str()));
+  }
   std::string typeIdentifier() const {
     if (!promise_ && S_ISLNK(info_.stx_mode)) return "public.symlink";
     if (isFolder() && !isPackage()) return "public.folder";

@@ -76,6 +76,7 @@ class ContractPlatform {
   virtual void addLibrary(const std::string& identifier, const LibraryFacts& facts) = 0;
   virtual void setTags(const std::string& path, const std::vector<std::string>& tags) = 0;
   virtual void setShareRole(const std::string& path, const std::string& role) = 0;
+  virtual void hideExtension(const std::string& path) = 0;
   virtual void setModified(const std::string& path, Date date) = 0;
   // What another program does without coordination. Folders above are made as needed.
   virtual void renameBehind(const std::string& from, const std::string& to) = 0;

@@ -141,6 +141,7 @@ class HostContractPlatform : public ContractPlatform {
   void setShareRole(const std::string& path, const std::string& role) override {
     setAttribute(path, "user.vaelo.share", role);
   }
+  void hideExtension(const std::string& path) override { setAttribute(path, "user.vaelo.hidden-extension", "true"); }
   void setModified(const std::string& path, Date date) override {
     using namespace std::chrono;
     const auto whole = floor<seconds>(date);

@@ -58,6 +58,7 @@ class MemoryContractPlatform : public ContractPlatform {
     memory_.disk.items[path].tags = tags;
   }
   void setShareRole(const std::string& path, const std::string& role) override { memory_.disk.items[path].shareRole = role; }
+  void hideExtension(const std::string& path) override { memory_.disk.items[path].attributes.extensionHidden = true; }
   void setModified(const std::string& path, Date date) override {
     memory_.disk.items[path].attributes.modificationDate = date;
   }

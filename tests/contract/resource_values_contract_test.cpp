@@ -46,6 +46,28 @@ TEST_P(ResourceValuesContract, AFileIsAFile) {
   }
 }
 
+TEST_P(ResourceValuesContract, AHiddenExtensionIsNotShown) {
+  for (const char* name : {"letter.tar.gz", "plain"}) platform->hideExtension(add(name).path());
+  platform->addFolder(inDrive("Plans.old").path());
+  platform->addFolder(inDrive("Draft.textbundle").path());
+  for (const char* name : {"Plans.old", "Draft.textbundle"}) platform->hideExtension(inDrive(name).path());
+  platform->addBookmark(inDrive("far.pdf.vaelobookmark").path(), outside("far.pdf"));
+  platform->addAlias(inDrive("link.desktop").path(), outside("far.pdf"));
+  const std::pair<const char*, const char*> shown[] = {{"letter.tar.gz", "letter.tar"},
+                                                       {"Draft.textbundle", "Draft"},
+                                                       {"far.pdf.vaelobookmark", "far.pdf"},
+                                                       {"link.desktop", "link"},
+                                                       {"plain", "plain"},
+                                                       {"Plans.old", "Plans.old"}};
+  for (const auto& [name, expected] : shown) {
+    const URL url = inDrive(name);
+    EXPECT_EQ(promised(url, K::Name), Value(name));
+    EXPECT_EQ(promised(url, K::LocalizedName), Value(expected));
+    EXPECT_EQ(promised(url, K::HasHiddenExtension), Value(std::string(name) != expected)) << name;
+  }
+  EXPECT_TRUE(platform->files().attributesOfItemAtPath(inDrive("letter.tar.gz").path()).value->extensionHidden);
+}
+
 TEST_P(ResourceValuesContract, AFolderHasNoSize) {
   platform->addFolder(inDrive("Plans").path());
   const URL url = inDrive("Plans", true);

@@ -1,5 +1,6 @@
 # SPDX-License-Identifier: GPL-3.0-or-later
 """Names and moves, their refusals and how they are taken back, in a real window; each seen on the disk."""
+import os
 import unittest
 
 from harness import wait_for
@@ -30,6 +31,21 @@ class Names(ItemsWindow):
     def test_a_name_without_extension_takes_one(self):
         self.rename("Plain", "Notes.txt")
         self.on_disk("Notes.txt")
+
+    def test_a_hidden_extension_is_neither_shown_nor_lost(self):
+        app = self.app
+        os.setxattr(self.drive / "Report.txt", "user.vaelo.hidden-extension", b"true")
+        app.key("F5")
+        wait_for("the row without its extension", lambda: app.find("Report,", "list item"))
+        self.menu("Report,", "r")
+        app.wait("Enter a new name for this item.")
+        # The caret stands at the end of all that is shown.
+        app.key(*["BackSpace"] * len("Report"))
+        app.type("Summary")
+        app.key("Return")
+        self.on_disk("Summary.txt")
+        self.assertEqual(os.getxattr(self.drive / "Summary.txt", "user.vaelo.hidden-extension"), b"true")
+        app.wait("Summary,", "list item")
 
     def test_names_that_are_refused_keep_the_prompt_and_the_item(self):
         app = self.app

@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <fcntl.h>
+#include <sys/xattr.h>
 
 #include <cerrno>
 #include <map>
@@ -44,6 +45,26 @@ TEST(FolderReader, TellsKindsApart) {
       {"to folder", EntryKind::FolderLink},  {"to document", EntryKind::Symlink},
       {"broken", EntryKind::Symlink},        {"circle", EntryKind::Symlink}};
   EXPECT_EQ(kindsIn(folder.path()), expected);
+}
+
+TEST(FolderReader, NamesAreShownWithoutHiddenExtensions) {
+  const TestFolder folder;
+  const auto shown = [&folder](const char* name, EntryKind kind) {
+    folder.write(name);
+    return readDetails(folder.path() + "/" + name, kind, 40)->displayName;
+  };
+  EXPECT_EQ(shown("Far.pdf.vaelobookmark", EntryKind::Bookmark), "Far.pdf");
+  EXPECT_EQ(shown("Link.desktop", EntryKind::Alias), "Link");
+  EXPECT_EQ(shown("letter.txt", EntryKind::Document), "");
+  if (lsetxattr((folder.path() + "/letter.txt").c_str(), "user.vaelo.hidden-extension", "true", 4, 0) == 0) {
+    EXPECT_EQ(shown("letter.txt", EntryKind::Document), "letter");
+  }
+  PromiseInfo info;
+  info.name = "Plan.pdf";
+  info.extensionHidden = true;
+  ASSERT_FALSE(writePromise(folder.path(), info));
+  EXPECT_EQ(readDetails(folder.path() + "/Plan.pdf", EntryKind::Promise, 40)->displayName, "Plan");
+  EXPECT_TRUE(readPromise(promisePathFor(folder.path() + "/Plan.pdf")).value->extensionHidden);
 }
 
 TEST(FolderReader, PromisesStandUnderTheirItemsName) {

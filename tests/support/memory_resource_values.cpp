@@ -22,6 +22,16 @@ std::string readableText(const std::string& name) {
   return text;
 }
 
+bool hidesExtension(const MemoryItem& item, const URL& url) {
+  if (url.pathExtension().empty() || (item.isFolder() && !isMemoryPackage(url))) return false;
+  return item.attributes.extensionHidden || item.bookmarkTarget || item.aliasTarget;
+}
+
+std::string shownName(const MemoryItem& item, const URL& url) {
+  const std::string name = url.lastPathComponent();
+  return hidesExtension(item, url) ? name.substr(0, name.size() - url.pathExtension().size() - 1) : name;
+}
+
 }  // namespace
 
 std::string MemoryResourceValues::typeOf(const MemoryItem& item, const URL& url) {
@@ -38,7 +48,7 @@ Value MemoryResourceValues::valueOf(MemoryItem& item, const URL& url, ResourceKe
     case ResourceKey::Name:
       return url.lastPathComponent();
     case ResourceKey::LocalizedName:
-      return readableText(url.lastPathComponent());
+      return readableText(shownName(item, url));
     case ResourceKey::TypeIdentifier:
       return typeOf(item, url);
     case ResourceKey::LocalizedTypeDescription: {
@@ -60,7 +70,7 @@ Value MemoryResourceValues::valueOf(MemoryItem& item, const URL& url, ResourceKe
     case ResourceKey::IsRegularFile:
       return !isFolder && item.type() != FileType::SymbolicLink;
     case ResourceKey::HasHiddenExtension:
-      return item.attributes.extensionHidden;
+      return hidesExtension(item, url);
     case ResourceKey::ParentDirectoryURL:
       return url.deletingLastPathComponent();
     case ResourceKey::IsShared:

@@ -12,6 +12,7 @@
 #include <initializer_list>
 #include <optional>
 
+#include "host/drive/item_attributes.h"
 #include "host/drive/promise_file.h"
 #include "host/files/icu_formatting.h"
 #include "host/files/user_locale.h"
@@ -19,6 +20,7 @@
 #include "host/gtk/thumbnails/thumbnail_cache.h"
 #include "host/gtk/thumbnails/thumbnail_maker.h"
 #include "host/support/texts.h"
+#include "platform/url.h"
 
 namespace vaelo {
 namespace {
@@ -63,6 +65,15 @@ std::string countText(long count) {
   return count < 0 ? std::string() : formatting().localizedCount(".DICT.ITEMS.%d", count);
 }
 
+std::string nameWithoutExtension(const std::string& path) {
+  const std::string name = path.substr(path.rfind('/') + 1);
+  char* text = g_filename_display_name(name.substr(0, name.size() - URL(path).pathExtension().size()).c_str());
+  std::string shown(text);
+  g_free(text);
+  if (shown.ends_with('.')) shown.pop_back();
+  return shown;
+}
+
 }  // namespace
 
 std::shared_ptr<const ItemDetails> readDetails(const std::string& path, EntryKind kind, int thumbnailPixels) {
@@ -71,6 +82,7 @@ std::shared_ptr<const ItemDetails> readDetails(const std::string& path, EntryKin
     std::string size;
     std::string date;
     if (const auto promise = readPromise(promisePathFor(path))) {
+      if (promise.value->extensionHidden) details->displayName = nameWithoutExtension(path);
       if (promise.value->size) size = sizeText(promise.value->size);
       if (promise.value->modified)
         date = dateText(std::chrono::duration<double>(promise.value->modified->time_since_epoch()).count());
@@ -84,6 +96,9 @@ std::shared_ptr<const ItemDetails> readDetails(const std::string& path, EntryKin
   }
   struct statx status;
   if (statx(AT_FDCWD, path.c_str(), AT_STATX_DONT_SYNC, STATX_TYPE | STATX_SIZE | STATX_MTIME, &status) != 0) return details;
+  if (kind == EntryKind::Bookmark || kind == EntryKind::Alias || extensionIsHiddenAt(path)) {
+    details->displayName = nameWithoutExtension(path);
+  }
   const std::string date = dateText(static_cast<double>(status.stx_mtime.tv_sec));
   if (!S_ISREG(status.stx_mode)) {
     details->secondLine = date;

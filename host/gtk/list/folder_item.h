@@ -13,6 +13,7 @@ namespace vaelo {
 
 /// What is read of an entry once its row is seen.
 struct ItemDetails {
+  std::string displayName;          ///< UTF-8, for an item whose extension is hidden; else empty
   std::string secondLine;           ///< UTF-8, ready to show
   GdkTexture* thumbnail = nullptr;  ///< owned
   bool mayHaveThumbnail = false;    ///< one is missing that could be made

@@ -76,12 +76,16 @@ PangoLayout* makeLayout(GtkWidget* widget, const std::string& text, bool small, 
   return layout;
 }
 
+const std::string& nameOf(const FolderItem& item) {
+  return item.details && !item.details->displayName.empty() ? item.details->displayName : item.displayName;
+}
+
 void makeLayouts(Row* row) {
   if (row->name) return;
   GtkWidget* widget = GTK_WIDGET(row);
   const FolderItem& item = folderItemOf(row->item);
   const bool grid = row->context->grid;
-  row->name = makeLayout(widget, item.displayName, false, grid, grid ? 2 : 1);
+  row->name = makeLayout(widget, nameOf(item), false, grid, grid ? 2 : 1);
   std::string second = item.details ? item.details->secondLine : std::string();
   if (second.empty() && isPromised(item.kind)) second = _("Not downloaded");
   row->second = makeLayout(widget, second, true, grid, 1);
@@ -247,7 +251,7 @@ void tellAccessibility(Row* row) {
   GtkWidget* listItem = gtk_widget_get_parent(GTK_WIDGET(row));
   if (!listItem) return;
   const FolderItem& item = folderItemOf(row->item);
-  std::string label = item.displayName;
+  std::string label = nameOf(item);
   if (item.details && !item.details->secondLine.empty()) {
     label = listedText(label, item.details->secondLine);
   } else if (isPromised(item.kind)) {
