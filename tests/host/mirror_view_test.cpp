@@ -192,6 +192,36 @@ TEST_F(MirrorViewTest, ButtonsArePressedAndFieldsAreTypedIn) {
   EXPECT_EQ(field->text(), "New.txt");
 }
 
+/// Wants to scroll for itself or not.
+struct Scrolling : TextFieldDelegate {
+  bool textFieldShouldScrollToVisibleWhenBecomingFirstResponder(TextField&) override { return byToolkit; }
+  bool byToolkit = true;
+};
+
+TEST_F(MirrorViewTest, AFieldIsScrolledToUnlessItsScreenRefuses) {
+  for (const char* text : {"Size", "Where", "Created", "Modified"}) {
+    LayoutConstraint::makeConstant(*addLabel(text), LayoutAttribute::Height, 200)->setActive(true);
+  }
+  const auto field = std::make_shared<TextField>();
+  const auto delegate = std::make_shared<Scrolling>();
+  field->setDelegate(delegate);
+  column->addArrangedSubview(field);
+  LayoutConstraint::makeConstant(*field, LayoutAttribute::Width, 200)->setActive(true);
+  show();
+  ASSERT_GT(field->frame().y, 800);
+  delegate->byToolkit = false;
+  gtk_widget_grab_focus(widgets().back());
+  settle();
+  EXPECT_TRUE(field->isEditing());
+  EXPECT_EQ(gtk_adjustment_get_value(adjustment()), 0);
+  field->resignFirstResponder();
+  delegate->byToolkit = true;
+  gtk_widget_grab_focus(widgets().back());
+  settle();
+  EXPECT_TRUE(field->isEditing());
+  EXPECT_GT(gtk_adjustment_get_value(adjustment()), 0);
+}
+
 TEST_F(MirrorViewTest, SmallPicturesAreMagnifiedInSquaresAndOnlyOnce) {
   const auto picture = std::make_shared<ImageView>(Rect{20, 100, 45, 45});
   picture->setMagnificationFilter(MagnificationFilter::Nearest);

@@ -7,6 +7,7 @@
 #include "host/gtk/mirror/view_layout.h"
 #include "platform/ui/button.h"
 #include "platform/ui/image_view.h"
+#include "platform/ui/text_field.h"
 
 namespace vaelo {
 
@@ -154,6 +155,8 @@ void ViewMirror::viewChanged(View& view, ViewChange change) {
     case ViewChange::Focus:
     case ViewChange::Selection:
     case ViewChange::Description: {
+      if (auto* field = dynamic_cast<TextField*>(&view); field && change == ViewChange::Focus)
+        scrollToFocusUnlessRefused(*field);
       const auto slot = std::find_if(slots_.begin(), slots_.end(), [&](const auto& each) { return each->view == &view; });
       if (slot != slots_.end()) (*slot)->content->update();
       if (change != ViewChange::Content && change != ViewChange::Appearance) return;
@@ -166,6 +169,13 @@ void ViewMirror::viewChanged(View& view, ViewChange change) {
     gtk_widget_queue_resize(outer_);
     if (change == ViewChange::Scroll) showOffset();
   }
+}
+
+// A screen that scrolls for the keyboard itself doesn't want the toolkit to do it as well.
+void ViewMirror::scrollToFocusUnlessRefused(TextField& field) {
+  const auto asked = field.delegate();
+  const bool refused = field.isEditing() && asked && !asked->textFieldShouldScrollToVisibleWhenBecomingFirstResponder(field);
+  gtk_viewport_set_scroll_to_focus(GTK_VIEWPORT(gtk_scrolled_window_get_child(GTK_SCROLLED_WINDOW(scroller_))), !refused);
 }
 
 void ViewMirror::allocate(int width, int height) {

@@ -12,6 +12,8 @@
 
 namespace vaelo {
 
+class TextField;
+
 /// Shows a tree of views: gives the root the room of its widget, lays out by constraints, puts a widget at the frame of
 /// each view that shows something, and follows what changes. A scroll view below the root scrolls. Main thread.
 class ViewMirror : public ViewObserver {
@@ -39,6 +41,7 @@ class ViewMirror : public ViewObserver {
   void layOut();
   void place();
   void place(Slot& slot);
+  void scrollToFocusUnlessRefused(TextField& field);
   void showOffset();
   void userScrolled();
   void tapped() const;
