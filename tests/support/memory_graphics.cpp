@@ -39,7 +39,11 @@ class RecordedDrawing : public DrawingContext {
 
 }  // namespace
 
-FontMetrics MemoryGraphics::fontMetrics(const Font& font) { return {font.pointSize, font.pointSize, 0, 0, font.pointSize}; }
+FontMetrics MemoryGraphics::fontMetrics(const Font& font) {
+  const double size = font.pointSize;
+  return {
+      .pointSize = size, .ascender = size * 0.75, .descender = size * -0.25, .capHeight = size * 0.5, .lineHeight = size};
+}
 
 Size MemoryGraphics::measure(const std::string& text, const Font& font, double, int) {
   return {static_cast<double>(text.size()) * 5, text.empty() ? 0 : font.pointSize};

@@ -254,6 +254,36 @@ TEST_F(PreviewDetailsTest, ARefusedNameStaysInTheField) {
   EXPECT_FALSE(loggedStarting("DEBUG", "Name is valid")) << "and not tried again";
 }
 
+TEST_F(PreviewDetailsTest, ARefreshInTheMiddleOfAnEditShowsTheCurrentName) {
+  open();
+  begin();
+  field().userSetText("Plan.pdf");
+  details->refreshItem();
+  EXPECT_TRUE(field().isEditing());
+  EXPECT_EQ(field().text(), "Report.pdf");
+}
+
+TEST_F(PreviewDetailsTest, ATapOnTheScreenAtRestChangesNothing) {
+  open();
+  log().clear();
+  details->view()->gestureRecognizers().at(0)->recognize();
+  EXPECT_FALSE(loggedStarting("DEBUG", "ShouldEndEditing"));
+  EXPECT_TRUE(isThere(document));
+}
+
+TEST_F(PreviewDetailsTest, ANameThatWasRestoredRenamesNothingLater) {
+  open();
+  begin();
+  field().userSetText("");
+  field().resignFirstResponder();
+  EXPECT_EQ(field().text(), "Report.pdf");
+  EXPECT_EQ(details->originalFilename(), "Report.pdf");
+  log().clear();
+  begin();
+  field().pressReturn();
+  EXPECT_FALSE(loggedStarting("DEBUG", "Name is valid"));
+}
+
 TEST_F(PreviewDetailsTest, ANewlineEndsTheEditingAndIsNotTyped) {
   open();
   begin();
@@ -271,6 +301,60 @@ TEST_F(PreviewDetailsTest, LeavingKeepsTheTypedTextAndEndsTheKeyboardsNotices) {
   details->scrollView()->setContentInset({1, 2, 3, 4});
   memory.notifications.post({KeyboardWillHideNotification, {}});
   EXPECT_EQ(details->scrollView()->contentInset(), (EdgeInsets{1, 2, 3, 4}));
+}
+
+/// Keeps how the screen was animated.
+struct Animations : ViewObserver {
+  void viewChanged(View&, ViewChange) override {}
+  void animationWillBegin(View&, const Animation& animation) override { begun.push_back(animation); }
+  void animationDidEnd(View&) override {}
+  void viewWillBeDestroyed(View&) override {}
+  std::vector<Animation> begun;
+};
+
+TEST_F(PreviewDetailsTest, TheScreenMovesWithTheKeyboard) {
+  open();
+  Animations animations;
+  details->view()->setObserver(&animations);
+  KeyboardNotice notice;
+  notice.seconds = 0.4;
+  notice.curve = AnimationCurve::EaseOut;
+  for (const char* name : {KeyboardWillShowNotification, KeyboardWillHideNotification}) {
+    animations.begun.clear();
+    memory.notifications.post({name, notice.userInfo()});
+    ASSERT_THAT(animations.begun, SizeIs(1));
+    EXPECT_EQ(animations.begun[0].seconds, 0.4);
+    EXPECT_EQ(animations.begun[0].curve, AnimationCurve::EaseOut);
+    EXPECT_TRUE(animations.begun[0].layoutSubviews);
+    EXPECT_TRUE(animations.begun[0].beginFromCurrentState);
+  }
+  details->view()->setObserver(nullptr);
+}
+
+TEST_F(PreviewDetailsTest, WhatIsHigherThanTheScreenLeavesNoRoomToTheKeyboard) {
+  open();
+  ScrollView& scroll = *details->scrollView();
+  scroll.setFrame({0, 0, 360, 600});
+  scroll.setContentSize({360, 100});
+  scroll.setContentInset({10, 1, 2, 3});
+  details->contentView()->setFrame({0, 0, 360, 600});
+  details->wrapperView()->setFrame({0, 0, 360, 600});
+  details->mainStackView()->setFrame({0, 0, 360, 700});
+  details->fileDetailsView()->setFrame({0, 300, 360, 400});
+  details->filenameStackView()->setFrame({0, 20, 360, 60});
+  field().setFrame({8, 7, 344, 46});
+  KeyboardNotice notice;
+  notice.beginFrame = {0, 720, 360, 250};
+  notice.endFrame = {0, 470, 360, 260};
+  memory.notifications.post({KeyboardWillShowNotification, notice.userInfo()});
+  EXPECT_EQ(scroll.contentInset().bottom, 280) << "250 - 0 + 30";
+  EXPECT_EQ(scroll.contentOffset(), (Point{0, 0})) << "100 - 600 + 280 is above the top";
+  scroll.setContentSize({360, 900});
+  memory.notifications.post({KeyboardWillShowNotification, notice.userInfo()});
+  EXPECT_EQ(scroll.contentOffset(), (Point{0, 287})) << "327 - 10 - 30; as far as 580 would do";
+  details->fileDetailsView()->setFrame({0, 0, 360, 400});
+  memory.notifications.post({KeyboardWillShowNotification, notice.userInfo()});
+  EXPECT_EQ(scroll.contentOffset(), (Point{0, 0})) << "27 - 10 - 30 is above the top";
 }
 
 TEST_F(PreviewDetailsTest, TheKeyboardMakesRoomForTheField) {
