@@ -11,6 +11,15 @@ using ::testing::ElementsAre;
 using ::testing::IsEmpty;
 using ::testing::SizeIs;
 
+/// Keeps how the screen was animated.
+struct Animations : ViewObserver {
+  void viewChanged(View&, ViewChange) override {}
+  void animationWillBegin(View&, const Animation& animation) override { begun.push_back(animation); }
+  void animationDidEnd(View&) override {}
+  void viewWillBeDestroyed(View&) override {}
+  std::vector<Animation> begun;
+};
+
 class PreviewDetailsTest : public PreviewFixture {
  protected:
   /// Shows the details of the document.
@@ -97,6 +106,31 @@ TEST_F(PreviewDetailsTest, ASizeThatIsWiderThanHighTurnsTheScreen) {
   EXPECT_EQ(field().text(), *manager->item()->localizedName()) << "refreshed";
 }
 
+TEST_F(PreviewDetailsTest, AnotherSizeMeasuresTheDetailsAgain) {
+  open();
+  struct : Animations {
+    void viewChanged(View&, ViewChange change) override { changes.push_back(change); }
+    std::vector<ViewChange> changes;
+  } seen;
+  details->fileDetailsView()->setObserver(&seen);
+  TransitionCoordinator coordinator;
+  details->viewWillTransitionToSize({400, 500}, coordinator);
+  EXPECT_THAT(seen.changes, ::testing::Contains(ViewChange::Constraints));
+  details->fileDetailsView()->setObserver(nullptr);
+}
+
+TEST_F(PreviewDetailsTest, AnotherOrientationHasOtherMargins) {
+  TraitCollection traits;
+  traits.horizontalSizeClass = traits.verticalSizeClass = SizeClass::Regular;
+  window->setTraitCollection(traits);
+  open();
+  EXPECT_EQ(details->parentBottomConstraint()->constant(), -17);
+  memory.screens.deviceShown.orientation = InterfaceOrientation::LandscapeRight;
+  TransitionCoordinator coordinator;
+  details->viewWillTransitionToSize({1280, 800}, coordinator);
+  EXPECT_EQ(details->parentBottomConstraint()->constant(), 0);
+}
+
 TEST_F(PreviewDetailsTest, RefreshShowsTheItem) {
   open();
   const std::string name = *manager->item()->localizedName();
@@ -110,10 +144,14 @@ TEST_F(PreviewDetailsTest, RefreshShowsTheItem) {
   manager->item()->setHasHiddenExtension(true);
   details->refreshItem();
   EXPECT_EQ(details->originalSuffix(), std::nullopt);
+  field().setPlaceholder("name");
+  EXPECT_TRUE(details->toolbarItems().at(0)->enabled());
   manager->setItemUpdatePreview(nullptr, false);
   details->refreshItem();
   EXPECT_EQ(details->originalFilename(), std::nullopt);
   EXPECT_EQ(field().text(), "");
+  EXPECT_EQ(field().placeholder(), "");
+  EXPECT_FALSE(details->toolbarItems().at(0)->enabled()) << "there is nothing to act on";
 }
 
 TEST_F(PreviewDetailsTest, TheDefaultApplicationHasAButton) {
@@ -138,6 +176,15 @@ TEST_F(PreviewDetailsTest, TheDefaultApplicationHasAButton) {
   EXPECT_EQ(details->fileDetailsView()->arrangedSubviews()[3], details->openInAppButton());
   details->openInAppButton()->sendActions(ControlEvent::TouchUpInside);
   EXPECT_TRUE(logged("INFO", "================= Pressed Open in <app>"));
+}
+
+TEST_F(PreviewDetailsTest, AnApplicationThatOpensNothingInPlaceHasNoButton) {
+  const URL text = addFile("Plans/Notes.txt");
+  giveOwningApplication(text);
+  memory.launch.rankedByPath.at(text.path()).value->at(0).second.at(0).supportsOpenInPlace = false;
+  manager = makeManager(1);
+  manager->previewItem(DRItem::initWithURL(text));
+  EXPECT_EQ(manager->detailsViewController()->openInAppButton(), nullptr);
 }
 
 TEST_F(PreviewDetailsTest, WithoutAnApplicationThereIsNoButton) {
@@ -254,6 +301,18 @@ TEST_F(PreviewDetailsTest, ARefusedNameStaysInTheField) {
   EXPECT_FALSE(loggedStarting("DEBUG", "Name is valid")) << "and not tried again";
 }
 
+TEST_F(PreviewDetailsTest, DoneEndsTheEditingEvenOfARefusedName) {
+  addFile("Plans/Taken.pdf");
+  open();
+  begin();
+  field().userSetText("Taken.pdf");
+  details->navigationItem().rightBarButtonItem()->press();
+  EXPECT_FALSE(field().isEditing());
+  ASSERT_NE(presentedAlert(), nullptr) << "what went wrong is told";
+  EXPECT_EQ(details->originalFilename(), "Report.pdf");
+  EXPECT_TRUE(isThere(document));
+}
+
 TEST_F(PreviewDetailsTest, ARefreshInTheMiddleOfAnEditShowsTheCurrentName) {
   open();
   begin();
@@ -302,15 +361,6 @@ TEST_F(PreviewDetailsTest, LeavingKeepsTheTypedTextAndEndsTheKeyboardsNotices) {
   memory.notifications.post({KeyboardWillHideNotification, {}});
   EXPECT_EQ(details->scrollView()->contentInset(), (EdgeInsets{1, 2, 3, 4}));
 }
-
-/// Keeps how the screen was animated.
-struct Animations : ViewObserver {
-  void viewChanged(View&, ViewChange) override {}
-  void animationWillBegin(View&, const Animation& animation) override { begun.push_back(animation); }
-  void animationDidEnd(View&) override {}
-  void viewWillBeDestroyed(View&) override {}
-  std::vector<Animation> begun;
-};
 
 TEST_F(PreviewDetailsTest, TheScreenMovesWithTheKeyboard) {
   open();
