@@ -295,6 +295,10 @@ TEST_F(InfoViewsTest, AThumbnailStaysInTheMiddleOfItsViewWhereverThatIs) {
   view->setItem(shown);
   view->layoutIfNeeded();
   EXPECT_EQ(view->thumbnailView()->frame(), (Rect{80, 120, 240, 160}));
+  shown->setThumbnail(std::make_shared<MemoryImage>(Size{20, 30}, std::vector<std::string>()));
+  view->setItem(shown);
+  view->layoutIfNeeded();
+  EXPECT_EQ(view->thumbnailView()->frame(), (Rect{120, 80, 160, 240})) << "another image is placed anew";
 }
 
 TEST_F(InfoViewsTest, LargeScreensHaveLargerMargins) {
