@@ -66,6 +66,16 @@ TEST(TextLinesTest, ThereIsAMostOfLines) {
   EXPECT_TRUE(lines.isFull());
 }
 
+TEST(TextLinesTest, TheLongestLineIsKnown) {
+  TextLines lines(10, 100);
+  lines.arrange("ab\nabc");
+  EXPECT_EQ(lines.longestLine(), 3U);
+  lines.arrange("de\nü\n");
+  EXPECT_EQ(lines.longestLine(), 5U) << "it goes on in the next piece";
+  lines.arrange("abcdefghijklmno");
+  EXPECT_EQ(lines.longestLine(), 10U);
+}
+
 class TextLoadTest : public testing::Test {
  protected:
   void SetUp() override {
@@ -136,6 +146,28 @@ TEST_F(TextLoadTest, WhereTheFileWasNeverWrittenTheTextEnds) {
   EXPECT_TRUE(load_->progress().shortened);
   EXPECT_EQ(load_->progress().bytesRead, content.size());
   EXPECT_EQ(load_->progress().documentBytes, 3U << 20);
+}
+
+TEST_F(TextLoadTest, SourceIsAnalysedUnlessItsLinesAreLong) {
+  const auto isAnalysed = [this] { return gtk_source_buffer_get_language(load_->buffer()) != nullptr; };
+  const std::string usual = "function add(a, b) { return a + b; }\n";
+  std::string many;
+  while (many.size() < 200'000) many += usual;
+  const std::string longLine = "x = '" + std::string(301, 'y') + "';\n";
+  load("a.js", many);
+  ASSERT_TRUE(waitUntil([this] { return load_->finished(); }));
+  EXPECT_TRUE(load_->isSource());
+  EXPECT_TRUE(isAnalysed());
+  load("long.js", usual + longLine);
+  ASSERT_TRUE(waitUntil([this] { return load_->finished(); }));
+  EXPECT_TRUE(load_->isSource());
+  EXPECT_FALSE(isAnalysed());
+  load("late.js", many + longLine);
+  ASSERT_TRUE(waitUntil([this] { return load_->finished(); }));
+  EXPECT_FALSE(isAnalysed());
+  load("a.txt", usual);
+  ASSERT_TRUE(waitUntil([this] { return load_->finished(); }));
+  EXPECT_FALSE(load_->isSource());
 }
 
 TEST_F(TextLoadTest, LeavingInTheMiddleEndsIt) {

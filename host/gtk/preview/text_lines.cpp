@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/preview/text_lines.h"
 
+#include <algorithm>
 #include <utility>
 
 namespace vaelo {
@@ -11,6 +12,7 @@ constexpr std::string_view ParagraphSeparator = "\xe2\x80\xa9";
 
 void TextLines::endLine(std::string& arranged) {
   arranged += '\n';
+  longest_ = std::max(longest_, characters_);
   characters_ = 0;
   ++lines_;
 }
@@ -33,11 +35,13 @@ std::string TextLines::arrange(std::string_view text) {
     const bool begins = (static_cast<unsigned char>(byte) & 0xc0) != 0x80;
     if (begins && characters_++ == mostCharacters_) {
       brokeLines_ = true;
+      --characters_;
       endLine(arranged);
       characters_ = 1;
     }
     arranged += byte;
   }
+  longest_ = std::max(longest_, characters_);
   return arranged;
 }
 

@@ -16,6 +16,8 @@ class TextLines {
   /// The next piece of a text; valid UTF-8 that ends with a whole character.
   std::string arrange(std::string_view text);
   bool brokeLines() const { return brokeLines_; }
+  /// In characters, of the lines so far.
+  std::size_t longestLine() const { return longest_; }
   /// There are as many lines as there may be; the rest was left out.
   bool isFull() const { return lines_ >= mostLines_; }
 
@@ -26,6 +28,7 @@ class TextLines {
   std::size_t mostLines_;
   std::size_t lines_ = 0;
   std::size_t characters_ = 0;  // of the line
+  std::size_t longest_ = 0;
   bool afterReturn_ = false;
   bool brokeLines_ = false;
 };

@@ -13,6 +13,8 @@ constexpr std::size_t SliceBytes = 32 * 1024;
 constexpr int AppendPriority = GDK_PRIORITY_REDRAW + 2;
 // Marks of syntax take several times the memory of the text.
 constexpr std::uint64_t MostHighlighted = 8 * 1024 * 1024;
+// A line is highlighted in one go, in a time that grows with the square of its length.
+constexpr std::size_t LongestHighlighted = 300;
 
 // The end of the whole characters in the next slice.
 std::size_t sliceEnd(const std::string& text, std::size_t begin) {
@@ -36,12 +38,10 @@ TextLoad::TextLoad(const std::string& path, const std::string& name, const std::
 
 TextLoad::~TextLoad() { g_clear_handle_id(&idle_, g_source_remove); }
 
-void TextLoad::prepareLanguage() {
-  GtkSourceLanguageManager* languages = gtk_source_language_manager_get_default();
-  GtkSourceLanguage* language = gtk_source_language_manager_guess_language(languages, name_.c_str(), contentType_.c_str());
-  if (!language) return;
-  gtk_source_buffer_set_language(buffer_.get(), language);
-  gtk_source_buffer_set_highlight_syntax(buffer_.get(), piece_.documentBytes <= MostHighlighted);
+// A buffer that has a language is analysed, even when nothing of that is shown.
+void TextLoad::applyLanguage() {
+  const bool isHighlighted = piece_.documentBytes <= MostHighlighted && piece_.longestLine <= LongestHighlighted;
+  gtk_source_buffer_set_language(buffer_.get(), isHighlighted ? language_ : nullptr);
 }
 
 void TextLoad::received(TextPiece piece) {
@@ -57,8 +57,12 @@ void TextLoad::received(TextPiece piece) {
   appended_ = 0;
   if (!begun_) {
     begun_ = true;
-    prepareLanguage();
+    language_ = gtk_source_language_manager_guess_language(gtk_source_language_manager_get_default(), name_.c_str(),
+                                                           contentType_.c_str());
+    applyLanguage();
     if (!append()) return events_.advanced();
+  } else {
+    applyLanguage();
   }
   idle_ = g_idle_add_full(
       AppendPriority,

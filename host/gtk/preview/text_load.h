@@ -27,6 +27,8 @@ class TextLoad {
   TextLoad& operator=(const TextLoad&) = delete;
 
   GtkSourceBuffer* buffer() const { return buffer_.get(); }
+  /// True when it is in a language of programs, even when it is too large to be highlighted.
+  bool isSource() const { return language_ != nullptr; }
   bool finished() const { return finished_; }
   /// What was read so far, without its text.
   const TextPiece& progress() const { return piece_; }
@@ -34,13 +36,14 @@ class TextLoad {
  private:
   void received(TextPiece piece);
   bool append();
-  void prepareLanguage();
+  void applyLanguage();
 
   std::string name_;
   std::string contentType_;
   Events events_;
   TextReader reader_;
   GRef<GtkSourceBuffer> buffer_;
+  GtkSourceLanguage* language_ = nullptr;  // of the manager's
   TextPiece piece_;
   std::size_t appended_ = 0;  // of the piece
   bool begun_ = false;

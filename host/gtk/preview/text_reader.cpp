@@ -53,6 +53,7 @@ struct TextReader::Reading {
     piece.last = ended || reachedMost || lines.isFull();
     piece.shortened = piece.last && bytesRead < documentBytes;
     piece.brokeLines = lines.brokeLines();
+    piece.longestLine = lines.longestLine();
     piece.bytesRead = bytesRead;
     piece.documentBytes = documentBytes;
     return piece;

@@ -25,6 +25,7 @@ struct TextPiece {
   bool last = false;
   bool shortened = false;       ///< with the last piece: the document goes on, but not for us
   bool brokeLines = false;      ///< lines were too long, and go on in the next
+  std::size_t longestLine = 0;  ///< in characters, up to here
   std::uint64_t bytesRead = 0;  ///< of the document, up to here
   std::uint64_t documentBytes = 0;
 };

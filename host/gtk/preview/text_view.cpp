@@ -100,8 +100,7 @@ class TextView : public DocumentView {
     applyStyle();
     find_.setBuffer(current_->buffer());
     gtk_text_view_set_buffer(GTK_TEXT_VIEW(view_), buffer);
-    const bool isSource = gtk_source_buffer_get_language(current_->buffer()) != nullptr;
-    gtk_source_view_set_show_line_numbers(GTK_SOURCE_VIEW(view_), isSource && !current_->progress().brokeLines);
+    gtk_source_view_set_show_line_numbers(GTK_SOURCE_VIEW(view_), current_->isSource() && !current_->progress().brokeLines);
     GtkTextIter place;
     gtk_text_buffer_get_iter_at_line(buffer, &place, line);
     gtk_text_buffer_place_cursor(buffer, &place);
