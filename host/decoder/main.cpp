@@ -1,11 +1,13 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
-// vaelo-preview-decoder KIND: reads documents for the previews, apart from the application. On standard input is a
-// SOCK_SEQPACKET socket; the first message on it is the document's path, and the open document when it may be another one by
-// now; each further one is a request.
+// vaelo-preview-decoder: reads documents for the previews, apart from the application. On standard input is a SOCK_SEQPACKET
+// socket; the first message on it is the kind of document, a blank and its path, and the open document when it may be
+// another one by now; each further one is a request.
 #include <fcntl.h>
 #include <sys/stat.h>
 
+#include <algorithm>
 #include <cerrno>
+#include <string>
 
 #include "host/decoder/decoder.h"
 #include "host/decoder/sandbox.h"
@@ -33,15 +35,17 @@ UniqueFd openDocument(DecoderMessage named, const char*& problem) {
 
 }  // namespace
 
-int main(int argc, char** argv) {
-  if (argc != 2) return 2;
+int main() {
   constexpr int socket = 0;
   vaelo::enterSandbox();
   std::optional<DecoderMessage> named = vaelo::receiveDecoderMessage(socket);
   if (!named) return 0;
+  const std::size_t blank = std::min(named->text.find(' '), named->text.size());
+  const std::string kind = named->text.substr(0, blank);
+  named->text.erase(0, blank + 1);
   const char* problem = nullptr;
   UniqueFd document = openDocument(std::move(*named), problem);
-  std::unique_ptr<vaelo::Decoder> decoder = problem ? nullptr : vaelo::makeDecoder(argv[1], std::move(document));
+  std::unique_ptr<vaelo::Decoder> decoder = problem ? nullptr : vaelo::makeDecoder(kind, std::move(document));
   if (!problem && !decoder) problem = vaelo::DecoderError::Unsupported;
   while (const std::optional<DecoderMessage> request = vaelo::receiveDecoderMessage(socket)) {
     const DecoderMessage answer = problem ? error(problem) : decoder->answer(request->text);

@@ -9,6 +9,7 @@
 #include "host/gtk/drive_application.h"
 #include "host/gtk/gtk_screens.h"
 #include "host/gtk/gtk_window.h"
+#include "host/gtk/preview/decoder_starter.h"
 #include "host/gtk/preview/portable_document_marks.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/message_catalogue.h"
@@ -149,6 +150,7 @@ void GtkApplicationLoop::beginService() {
 void GtkApplicationLoop::activate(std::uint32_t timestamp) {
   if (!delegate_) launch({});
   present(timestamp);
+  startDecoderAhead();
 }
 
 void GtkApplicationLoop::present(std::uint32_t timestamp) {

@@ -5,9 +5,9 @@
 
 #include <chrono>
 #include <cstdio>
-#include <sstream>
 
 #include "host/gtk/preview/document_view.h"
+#include "tests/host/child_processes.h"
 #include "tests/host/list_test_folder.h"
 #include "tests/host/preview_page_support.h"
 
@@ -31,23 +31,6 @@ long statusValue(const std::string& name) {
 }
 
 void forgetPeak() { std::ofstream("/proc/self/clear_refs") << "5"; }
-
-/// The processes that this one started and that still run.
-int children() {
-  int found = 0;
-  const std::string self = std::to_string(::getpid());
-  for (const auto& entry : std::filesystem::directory_iterator("/proc")) {
-    std::ifstream file(entry.path() / "stat");
-    std::string line;
-    if (!std::getline(file, line)) continue;
-    std::istringstream rest(line.substr(line.rfind(')') + 1));
-    std::string state;
-    std::string parent;
-    rest >> state >> parent;
-    found += parent == self && state != "Z";
-  }
-  return found;
-}
 
 class BadInputCorpusTest : public preview_test::PreviewPageTest {
  protected:
@@ -151,7 +134,7 @@ class BadInputCorpusTest : public preview_test::PreviewPageTest {
     EXPECT_LT(statusValue("VmRSS") - before, MostGrowth);
     EXPECT_TRUE(list_test::waitUntil([] {
       g_main_context_wakeup(nullptr);
-      return children() == 0;
+      return childProcesses().size() <= 1;  // one waits for the next document
     })) << "a decoder is left";
     rusage usage = {};
     ASSERT_EQ(::getrusage(RUSAGE_CHILDREN, &usage), 0);

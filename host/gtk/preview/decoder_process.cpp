@@ -3,30 +3,14 @@
 
 #include <gio/gio.h>
 #include <glib-unix.h>
-#include <sys/socket.h>
 
+#include <algorithm>
 #include <deque>
-#include <filesystem>
-#include <vector>
 
-#include "host/support/glib_ptr.h"
+#include "host/gtk/preview/decoder_starter.h"
 #include "host/support/texts.h"
 
 namespace vaelo {
-
-namespace {
-
-// Beside the application where it is built, one folder up for its tests, else where it is installed.
-std::string decoderPath() {
-  const std::filesystem::path self = takeString(g_file_read_link("/proc/self/exe", nullptr));
-  for (const std::filesystem::path& folder : {self.parent_path(), self.parent_path().parent_path()}) {
-    const std::filesystem::path found = folder / "vaelo-preview-decoder";
-    if (g_file_test(found.c_str(), G_FILE_TEST_IS_EXECUTABLE)) return found;
-  }
-  return VAELO_LIBEXEC_DIR "/vaelo-preview-decoder";
-}
-
-}  // namespace
 
 struct DecoderProcess::State : std::enable_shared_from_this<DecoderProcess::State> {
   struct Request {
@@ -42,13 +26,12 @@ struct DecoderProcess::State : std::enable_shared_from_this<DecoderProcess::Stat
   guint timer = 0;
 
   void start(const std::string& kind, const std::string& path, UniqueFd document) {
-    int ends[2];
-    if (::socketpair(AF_UNIX, SOCK_SEQPACKET | SOCK_CLOEXEC, 0, ends) != 0) return end(DecoderError::Crashed);
-    socket = UniqueFd(ends[0]);
-    const GRef<GSubprocessLauncher> launcher(g_subprocess_launcher_new(G_SUBPROCESS_FLAGS_NONE));
-    g_subprocess_launcher_take_stdin_fd(launcher.get(), ends[1]);
-    process.reset(g_subprocess_launcher_spawn(launcher.get(), nullptr, decoderPath().c_str(), kind.c_str(), nullptr));
-    if (!process || !sendDecoderMessage(socket.get(), {path, std::move(document)})) return end(DecoderError::Crashed);
+    StartedDecoder started = takeStartedDecoder();
+    socket = std::move(started.socket);
+    process = std::move(started.process);
+    if (!process || !sendDecoderMessage(socket.get(), {kind + " " + path, std::move(document)})) {
+      return end(DecoderError::Crashed);
+    }
     watch = g_unix_fd_add(
         socket.get(), static_cast<GIOCondition>(G_IO_IN | G_IO_HUP),
         +[](int, GIOCondition, gpointer self) -> gboolean { return static_cast<State*>(self)->answered(); }, this);
