@@ -1,0 +1,168 @@
+// SPDX-License-Identifier: GPL-3.0-or-later
+// A preview's page in a window, with the real platform below it, for the programs that time previews.
+#pragma once
+
+#include <adwaita.h>
+#include <malloc.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <ctime>
+#include <fstream>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "host/gtk/gtk_screens.h"
+#include "host/gtk/preview/preview_page.h"
+#include "host/host_platform.h"
+#include "host/support/graphics_device.h"
+
+namespace vaelo::bench {
+
+inline double now() { return static_cast<double>(g_get_monotonic_time()) / 1000; }
+
+inline double median(std::vector<double> values) {
+  std::sort(values.begin(), values.end());
+  return values[values.size() / 2];
+}
+
+/// Without what the allocator keeps for later.
+inline long residentKibibytes() {
+  ::malloc_trim(0);
+  std::ifstream file("/proc/self/statm");
+  long total = 0;
+  long resident = 0;
+  file >> total >> resident;
+  return resident * (::sysconf(_SC_PAGESIZE) / 1024);
+}
+
+/// How long the main loop's turns take, between two times that it waits for events: what the processor did for them, so that
+/// it doesn't matter what else the machine does. The main loop waits for no disk and no other process, which would count
+/// too.
+class Turns {
+ public:
+  static void watch() {
+    waitForEvents() = g_main_context_get_poll_func(nullptr);
+    g_main_context_set_poll_func(nullptr, poll);
+  }
+  static void forget() { all().clear(); }
+  static double longest() { return all().empty() ? 0 : *std::max_element(all().begin(), all().end()); }
+  static std::size_t count() { return all().size(); }
+
+ private:
+  static GPollFunc& waitForEvents() {
+    static GPollFunc function = nullptr;
+    return function;
+  }
+  static std::vector<double>& all() {
+    static std::vector<double> turns;
+    return turns;
+  }
+  static int poll(GPollFD* fds, guint count, int timeout) {
+    static double begun = 0;
+    if (begun > 0) all().push_back(worked() - begun);
+    const int result = waitForEvents()(fds, count, timeout);
+    begun = worked();
+    return result;
+  }
+  static double worked() {
+    timespec time = {};
+    ::clock_gettime(CLOCK_THREAD_CPUTIME_ID, &time);
+    return static_cast<double>(time.tv_sec) * 1e3 + static_cast<double>(time.tv_nsec) / 1e6;
+  }
+};
+
+class PreviewWindow : public PreviewControllerDataSource, public std::enable_shared_from_this<PreviewWindow> {
+ public:
+  /// `folder` gets the platform's own files.
+  static std::shared_ptr<PreviewWindow> open(const std::string& folder) {
+    drawWithoutGLWhereItIsEmulated();
+    g_setenv("XDG_DATA_HOME", (folder + "/share").c_str(), TRUE);
+    gtk_init();
+    adw_init();
+    std::shared_ptr<PreviewWindow> window(new PreviewWindow(folder));
+    window->controller_->setDataSource(window);
+    window->page_ = std::make_unique<PreviewPage>(window->controller_, [] {});
+    window->showPage();
+    window->paint();
+    return window;
+  }
+  ~PreviewWindow() override { gtk_window_destroy(GTK_WINDOW(window_)); }
+
+  /// From the tap on: until the first screen of the document is painted, in milliseconds.
+  double show(const std::string& path) {
+    const double begun = now();
+    items_ = {URL(path)};
+    controller_->reloadData();
+    while (!isShown()) g_main_context_iteration(nullptr, TRUE);
+    paint();
+    return now() - begun;
+  }
+  void showNothing() {
+    items_.clear();
+    controller_->reloadData();
+    paint();
+  }
+  /// Until what was asked for by now is painted.
+  void paint() {
+    bool painted = false;
+    GdkFrameClock* clock = gtk_widget_get_frame_clock(window_);
+    const gulong handler =
+        g_signal_connect(clock, "after-paint", G_CALLBACK(+[](GdkFrameClock*, bool* flag) { *flag = true; }), &painted);
+    gtk_widget_queue_draw(window_);
+    while (!painted) g_main_context_iteration(nullptr, TRUE);
+    g_signal_handler_disconnect(clock, handler);
+  }
+  static void run(double milliseconds) {
+    const double end = now() + milliseconds;
+    const guint waking = g_timeout_add(
+        5, [](gpointer) -> gboolean { return G_SOURCE_CONTINUE; }, nullptr);
+    while (now() < end) g_main_context_iteration(nullptr, TRUE);
+    g_source_remove(waking);
+  }
+  /// Something else in the window, for comparison.
+  void showOther(GtkWidget* child) { gtk_window_set_child(GTK_WINDOW(window_), child); }
+  void showPage() { gtk_window_set_child(GTK_WINDOW(window_), page_->widget()); }
+  GtkWidget* shownView() const { return gtk_stack_get_visible_child(GTK_STACK(page_->widget())); }
+
+  static constexpr int Width = 800;
+  static constexpr int Height = 760;
+
+ private:
+  class NoApplication : public Application {
+   public:
+    int run(int, char**, std::function<std::shared_ptr<ApplicationDelegate>()>) override { return 0; }
+    bool isRightToLeft() override { return false; }
+    std::string description() override { return ""; }
+  };
+
+  explicit PreviewWindow(const std::string& folder)
+      : platform_({folder + "/data", folder + "/preferences.ini", folder + "/restoration.ini"}),
+        screens_(platform_.drive(), platform_.syncedStore()),
+        window_(gtk_window_new()),
+        controller_(std::make_shared<PreviewController>()) {
+    platform_.install(application_, screens_);
+    gtk_window_set_default_size(GTK_WINDOW(window_), Width, Height);
+    gtk_window_present(GTK_WINDOW(window_));
+  }
+
+  // Of the page's own places each has a name.
+  bool isShown() const {
+    GtkStack* stack = GTK_STACK(page_->widget());
+    return !gtk_stack_page_get_name(gtk_stack_get_page(stack, gtk_stack_get_visible_child(stack)));
+  }
+
+  std::size_t numberOfPreviewItemsInPreviewController(PreviewController&) override { return items_.size(); }
+  URL previewControllerPreviewItemAtIndex(PreviewController&, std::size_t index) override { return items_.at(index); }
+
+  HostPlatform platform_;
+  GtkScreens screens_;
+  NoApplication application_;
+  GtkWidget* window_;
+  std::vector<URL> items_;
+  std::shared_ptr<PreviewController> controller_;
+  std::unique_ptr<PreviewPage> page_;
+};
+
+}  // namespace vaelo::bench
