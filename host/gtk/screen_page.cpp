@@ -21,6 +21,8 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
       toolbar_(gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 6)),
       goBack_(std::move(goBack)) {
   adw_header_bar_set_title_widget(ADW_HEADER_BAR(header_), title_);
+  // A title exactly in the middle would need as much room on its other side as the buttons take: more than a phone has.
+  adw_header_bar_set_centering_policy(ADW_HEADER_BAR(header_), ADW_CENTERING_POLICY_LOOSE);
   gtk_widget_set_tooltip_text(back_, _("Back"));
   gtk_accessible_update_property(GTK_ACCESSIBLE(back_), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Back"), -1);
   g_signal_connect_swapped(back_, "clicked", G_CALLBACK(+[](ScreenPage* self) { self->goBack_(); }), this);

@@ -135,7 +135,13 @@ class App:
 
     def show_window(self, size):
         self.window = wait_for("the window", self.find_window).split()[0]
-        self.desktop.tool("xdotool", "windowsize", "--sync", self.window, str(size[0]), str(size[1]))
+        # A window that is narrow takes less room in its header bar, and may be narrower still.
+        for _ in range(10):
+            self.desktop.tool("xdotool", "windowsize", self.window, str(size[0]), str(size[1]))
+            pause(0.1)
+            geometry = self.desktop.tool("xdotool", "getwindowgeometry", self.window)
+            if f"Geometry: {size[0]}x{size[1]}" in geometry:
+                break
         self.desktop.tool("xdotool", "windowmove", self.window, "0", "0")
 
     def find_window(self):
