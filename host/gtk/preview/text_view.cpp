@@ -67,6 +67,8 @@ class TextView : public DocumentView {
 
   ~TextView() override {
     g_signal_handler_disconnect(adw_style_manager_get_default(), styleChange_);
+    gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scrolled_), nullptr);
+    dropLineNumbers();
     g_object_unref(box_);
   }
 
@@ -89,6 +91,17 @@ class TextView : public DocumentView {
   bool closeFind() override { return find_.close(); }
 
  private:
+  // What counts the lines keeps the view, which keeps it: neither would ever go by itself.
+  void dropLineNumbers() {
+    GtkSourceGutter* gutter = gtk_source_view_get_gutter(GTK_SOURCE_VIEW(view_), GTK_TEXT_WINDOW_LEFT);
+    GtkWidget* next = nullptr;
+    for (GtkWidget* each = gtk_widget_get_first_child(GTK_WIDGET(gutter)); each; each = next) {
+      next = gtk_widget_get_next_sibling(each);
+      if (GTK_SOURCE_IS_GUTTER_RENDERER(each)) gtk_source_gutter_remove(gutter, GTK_SOURCE_GUTTER_RENDERER(each));
+    }
+    g_object_run_dispose(G_OBJECT(view_));
+  }
+
   // A document read anew takes the old one's place when what the user looks at is there.
   void showNext() {
     GtkTextBuffer* buffer = GTK_TEXT_BUFFER(next_->buffer());
