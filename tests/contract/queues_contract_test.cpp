@@ -52,7 +52,7 @@ TEST_P(QueuesContract, ABlockThatIsAddedByABlockRunsAfterThoseThatWait) {
 }
 
 TEST_P(QueuesContract, DelayedBlocksRunInTheOrderOfTheirTimes) {
-  queues().main().after(60ms, note("late"));
+  queues().main().after(500ms, note("late"));
   queues().main().after(20ms, note("early"));
   queues().main().async(note("now"));
   EXPECT_TRUE(untilNoted(3));
