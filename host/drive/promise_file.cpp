@@ -25,7 +25,10 @@ std::string longPromiseNameFor(std::string_view logicalName) {
   for (const char c : logicalName) hash = (hash ^ static_cast<unsigned char>(c)) * 0x100000001b3u;
   char digits[hashDigits + 1];
   std::snprintf(digits, sizeof digits, "%016llx", static_cast<unsigned long long>(hash));
-  return "." + std::string(digits) + std::string(longSuffix);
+  std::string name(1, '.');
+  name += digits;
+  name += longSuffix;
+  return name;
 }
 
 bool isLongPromiseName(std::string_view name) {
