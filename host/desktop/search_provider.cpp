@@ -171,11 +171,24 @@ void SearchProvider::called(const std::string& method, GVariant* arguments, GDBu
   g_dbus_method_invocation_return_value(call, nullptr);
   if (method == "ActivateResult") {
     GVariant* id = g_variant_get_child_value(arguments, 0);
-    events_.chosen(g_variant_get_string(id, nullptr), numberAt(arguments, 2));
+    choose(g_variant_get_string(id, nullptr), numberAt(arguments, 2));
     g_variant_unref(id);
   } else {
     events_.continued(joined(stringsAt(arguments, 0)), numberAt(arguments, 1));
   }
+}
+
+void SearchProvider::choose(const std::string& id, std::uint32_t timestamp) {
+  // The application asks for the item on the main thread, where nobody should wait for a walk of the whole mirror.
+  worker_.run([this, &drive = drive_, gate = gate_, id, timestamp,
+               hold = std::make_shared<Hold>()]() mutable -> std::function<void()> {
+    const std::lock_guard lock(gate->mutex);
+    if (gate->closed) return nullptr;
+    itemWithID(drive, id);
+    return [this, gate, id, timestamp, hold = std::move(hold)] {
+      if (!gate->closed) events_.chosen(id, timestamp);
+    };
+  });
 }
 
 void SearchProvider::search(const std::vector<std::string>& terms, GDBusMethodInvocation* call) {

@@ -40,6 +40,7 @@ class SearchProvider {
 
  private:
   void called(const std::string& method, GVariant* arguments, GDBusMethodInvocation* call);
+  void choose(const std::string& id, std::uint32_t timestamp);
   void search(const std::vector<std::string>& terms, GDBusMethodInvocation* call);
   void describe(const std::vector<std::string>& ids, GDBusMethodInvocation* call);
 

@@ -53,11 +53,13 @@ std::vector<DocumentRow> carriedRows(const std::string& mirror) {
 
 }  // namespace
 
-DocumentIndex::DocumentIndex(const DriveLayout& layout, LogSink& log, std::function<void()> rebuilt)
+DocumentIndex::DocumentIndex(const DriveLayout& layout, LogSink& log, std::function<void()> rebuilt,
+                             std::chrono::milliseconds walksAgainAfter)
     : layout_(layout),
       log_(log),
       database_(
-          layout.indexFile(), log, [&layout] { return carriedRows(layout.mirrorRoot()); }, std::move(rebuilt)) {}
+          layout.indexFile(), log, [&layout] { return carriedRows(layout.mirrorRoot()); }, std::move(rebuilt)),
+      walksAgainAfter_(walksAgainAfter) {}
 
 Result<std::int64_t> DocumentIndex::documentIDFor(const std::string& path, bool create) {
   if (path.empty() || path.front() != '/' || path.find('\0') != std::string::npos) return notFound(path);
@@ -150,6 +152,7 @@ std::optional<IndexedDocument> DocumentIndex::locate(const DocumentRow& row) {
     if (there->isSameFile(wanted)) return document(row);
     found = rowFor(row.id, *there, row.path, row.carried);
   }
+  if (!found && wasSoughtInVain(row.id)) return std::nullopt;
   // At its place stands at best a copy: another program moved the document, or replaced it by a new file.
   walkTree(layout_.mirrorRoot(), [&](const std::string& path, const struct stat& status) {
     if (!row.carried && status.st_ino != row.inode) return true;
@@ -159,11 +162,26 @@ std::optional<IndexedDocument> DocumentIndex::locate(const DocumentRow& row) {
     if (exact || !found) found = rowFor(row.id, *item, path, row.carried);
     return !exact;
   });
-  if (!found) return std::nullopt;
+  if (!found) {
+    noteSoughtInVain(row.id);
+    return std::nullopt;
+  }
   if (const auto error = database_.put(*found)) {
     log_.write(LogType::Error, "drive: can't note where a document is: " + error->description());
   }
   return document(*found);
+}
+
+bool DocumentIndex::wasSoughtInVain(std::int64_t id) {
+  const std::lock_guard lock(mutex_);
+  const auto now = std::chrono::steady_clock::now();
+  std::erase_if(soughtInVain_, [&](const auto& sought) { return now - sought.second >= walksAgainAfter_; });
+  return soughtInVain_.contains(id);
+}
+
+void DocumentIndex::noteSoughtInVain(std::int64_t id) {
+  const std::lock_guard lock(mutex_);
+  soughtInVain_[id] = std::chrono::steady_clock::now();
 }
 
 Result<IndexedDocument> DocumentIndex::resolve(std::int64_t id) {

@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
+#include <sys/inotify.h>
 #include <sys/resource.h>
+#include <unistd.h>
 
 #include <csignal>
 #include <set>
@@ -7,11 +9,27 @@
 
 #include "host/drive/document_index.h"
 #include "host/drive/promise_file.h"
+#include "host/support/unique_fd.h"
 #include "tests/host/drive_test_support.h"
 
 namespace vaelo::drive_test {
 
 constexpr const char* idAttribute = "user.vaelo.docid";
+
+/// Whether anybody has read a folder since the last question.
+class FolderReads {
+ public:
+  explicit FolderReads(const std::string& folder) {
+    inotify_add_watch(events_.get(), folder.c_str(), IN_OPEN | IN_ACCESS | IN_ONLYDIR);
+  }
+  bool any() const {
+    char events[4096];
+    return ::read(events_.get(), events, sizeof events) > 0;
+  }
+
+ private:
+  UniqueFd events_{inotify_init1(IN_NONBLOCK | IN_CLOEXEC)};
+};
 
 class DriveIndexTest : public DriveTest {
  protected:
@@ -57,6 +75,21 @@ TEST_F(DriveIndexTest, WhatIsNotThereHasNone) {
   EXPECT_EQ(index->resolve(0).error->code, FileErrorCode::NoSuchFile);
   EXPECT_EQ(index->resolve(-5).error->code, FileErrorCode::NoSuchFile);
   EXPECT_EQ(index->resolve(4711).error->code, FileErrorCode::NoSuchFile);
+}
+
+TEST_F(DriveIndexTest, WhatWasJustSoughtInVainIsNotWalkedForAgain) {
+  FolderReads reads(drive);
+  EXPECT_EQ(placeOf(4711), "nowhere");
+  EXPECT_TRUE(reads.any());
+  EXPECT_EQ(placeOf(4711), "nowhere");
+  EXPECT_FALSE(reads.any());
+  EXPECT_EQ(placeOf(4712), "nowhere");
+  EXPECT_TRUE(reads.any()) << "another identifier";
+  index = std::make_unique<DocumentIndex>(layout, log, nullptr, std::chrono::milliseconds(0));
+  EXPECT_EQ(placeOf(4711), "nowhere");
+  EXPECT_TRUE(reads.any());
+  EXPECT_EQ(placeOf(4711), "nowhere");
+  EXPECT_TRUE(reads.any()) << "after its time";
 }
 
 TEST_F(DriveIndexTest, ItSurvivesWhatOtherProgramsDo) {
