@@ -5,6 +5,7 @@
 #include "items/dr_item.h"
 #include "items/file_utils.h"
 #include "items/vlo_log.h"
+#include "platform/localized.h"
 #include "platform/platform.h"
 #include "platform/ui/screen_factory.h"
 #include "preview/preview_item_manager.h"
@@ -14,8 +15,6 @@ namespace vaelo {
 namespace {
 
 constexpr double QuotaInterval = 300;  // seconds
-
-std::string localized(const char* key) { return Platform::current().formatting.localizedString(key); }
 
 }  // namespace
 

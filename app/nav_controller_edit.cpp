@@ -2,16 +2,11 @@
 #include "app/nav_controller.h"
 #include "fileops/menu_enable_checks.h"
 #include "items/vlo_log.h"
+#include "platform/localized.h"
 #include "platform/platform.h"
 #include "platform/ui/button.h"
 
 namespace vaelo {
-
-namespace {
-
-std::string localized(const char* key) { return Platform::current().formatting.localizedString(key); }
-
-}  // namespace
 
 void NavController::beginEditMode(const BarButtonItemRef&) {
   VLO_USER_ACTION("Pressed Select (begin edit)");

@@ -8,13 +8,12 @@
 #include "items/file_utils.h"
 #include "items/url_additions.h"
 #include "items/vlo_log.h"
+#include "platform/localized.h"
 #include "platform/platform.h"
 
 namespace vaelo {
 
 namespace {
-
-std::string localized(const char* key) { return Platform::current().formatting.localizedString(key); }
 
 std::string counted(const char* key, std::size_t count) {
   return Platform::current().formatting.localizedCount(key, static_cast<std::int64_t>(count));

@@ -4,6 +4,7 @@
 #include "fileops/ui_utils.h"
 #include "items/file_utils.h"
 #include "items/vlo_log.h"
+#include "platform/localized.h"
 #include "platform/platform.h"
 #include "platform/ui/screen_factory.h"
 #include "platform/ui/shared_self.h"
@@ -13,8 +14,6 @@ namespace vaelo {
 namespace {
 
 constexpr double FieldHeightInLines = 1.2;
-
-std::string localized(const char* key) { return Platform::current().formatting.localizedString(key); }
 
 std::string trimmed(const std::string& text) {
   return Platform::current().characterClasses.trimmingWhitespaceAndNewlines(text);

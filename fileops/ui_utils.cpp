@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "fileops/ui_utils.h"
 
+#include "platform/localized.h"
 #include "platform/platform.h"
 #include "platform/ui/alert_controller.h"
 #include "platform/ui/screen_factory.h"
@@ -8,8 +9,6 @@
 namespace vaelo {
 
 namespace {
-
-std::string localized(const char* key) { return Platform::current().formatting.localizedString(key); }
 
 std::string wordsOf(const std::optional<Error>& error) {
   if (error && error->localizedDescription) return *error->localizedDescription;

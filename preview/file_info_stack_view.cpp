@@ -6,6 +6,7 @@
 #include "items/dr_item.h"
 #include "items/file_tags.h"
 #include "items/file_utils.h"
+#include "platform/localized.h"
 #include "platform/platform.h"
 #include "platform/ui/screen_factory.h"
 #include "platform/ui/visual_format.h"
@@ -16,8 +17,6 @@ namespace {
 
 constexpr double RowSpacing = 10;
 constexpr int WhereLines = 4;
-
-std::string localized(const char* key) { return Platform::current().formatting.localizedString(key); }
 
 double valueWidth(const std::shared_ptr<FileInfoCell>& cell) {
   if (!cell) return 0;

@@ -25,8 +25,6 @@ constexpr std::size_t BlockBytes = 64 * 1024;
 constexpr int EntriesOfAnAnswer = 5000;
 constexpr std::chrono::milliseconds TimeOfAnAnswer(400);
 
-DecoderMessage error(const char* reason) { return {std::string("error ") + reason, UniqueFd()}; }
-
 // Without those that run programs of their own, and without lists of files that are elsewhere.
 void supportFilters(archive* opened) {
   for (auto* support :
@@ -87,18 +85,18 @@ DecoderMessage ArchiveDecoder::answer(const std::string& request) {
   if (request == "open") return open(Reading::Archive);
   if (request == "open single") return open(Reading::Single);
   if (request == "next" && archive_) return next();
-  return error(DecoderError::Unsupported);
+  return errorAnswer(DecoderError::Unsupported);
 }
 
 DecoderMessage ArchiveDecoder::open(Reading reading) {
   reading_ = reading;
   archive_.reset(archive_read_new());
-  if (!archive_) return error(DecoderError::TooBig);
+  if (!archive_) return errorAnswer(DecoderError::TooBig);
   supportFilters(archive_.get());
   if (reading == Reading::Single) archive_read_support_format_raw(archive_.get());
   if (reading == Reading::Archive) supportFormats(archive_.get());
   if (reading == Reading::WithoutDirectory) archive_read_support_format_zip_streamable(archive_.get());
-  if (::lseek(document_.get(), 0, SEEK_SET) != 0) return error(DecoderError::Unreadable);
+  if (::lseek(document_.get(), 0, SEEK_SET) != 0) return errorAnswer(DecoderError::Unreadable);
   if (archive_read_open_fd(archive_.get(), document_.get(), BlockBytes) != ARCHIVE_OK) return failure();
   return {"ok", UniqueFd()};
 }
@@ -106,7 +104,7 @@ DecoderMessage ArchiveDecoder::open(Reading reading) {
 DecoderMessage ArchiveDecoder::failure() {
   const char* told = archive_error_string(archive_.get());
   const bool isLocked = archive_read_has_encrypted_entries(archive_.get()) > 0 || (told && std::strstr(told, "ncrypt"));
-  return error(isLocked ? DecoderError::Locked : DecoderError::Damaged);
+  return errorAnswer(isLocked ? DecoderError::Locked : DecoderError::Damaged);
 }
 
 DecoderMessage ArchiveDecoder::next() {
@@ -126,7 +124,7 @@ DecoderMessage ArchiveDecoder::next() {
   std::string answer = "ok " + std::to_string(count) + " " + state;
   if (lines.empty()) return {std::move(answer), UniqueFd()};
   PixelFile file(lines.size());
-  if (!file.data()) return error(DecoderError::TooBig);
+  if (!file.data()) return errorAnswer(DecoderError::TooBig);
   std::memcpy(file.data(), lines.data(), lines.size());
   return {std::move(answer), file.take()};
 }

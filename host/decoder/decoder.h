@@ -16,6 +16,9 @@ class Decoder {
   virtual DecoderMessage answer(const std::string& request) = 0;
 };
 
+/// An answer that says why there is none: a word of decoder_error.h.
+inline DecoderMessage errorAnswer(const char* reason) { return {std::string("error ") + reason, UniqueFd()}; }
+
 /// The decoder of a kind of documents, for the open file; null for an unknown kind.
 std::unique_ptr<Decoder> makeDecoder(const std::string& kind, UniqueFd document);
 

@@ -28,9 +28,8 @@ constexpr std::chrono::milliseconds FindingTakes(60);
 constexpr std::size_t LongestAnswer = 60'000;  // bytes, within DecoderMessage::MaximumText
 constexpr int MostMatchesOnAPage = 500;
 
-DecoderMessage error(const char* reason) { return {std::string("error ") + reason, UniqueFd()}; }
 DecoderMessage ok() { return {"ok", UniqueFd()}; }
-DecoderMessage damaged() { return error(DecoderError::Damaged); }
+DecoderMessage damaged() { return errorAnswer(DecoderError::Damaged); }
 
 double side(double points) { return std::isfinite(points) ? std::clamp(points, SmallestSide, LargestSide) : SmallestSide; }
 
@@ -48,19 +47,19 @@ DecoderMessage DocumentDecoder::answer(const std::string& request) {
   if (command == "text") return text(words);
   if (command == "find") return find(words);
   if (command == "areas") return areas(words);
-  if (command == "mark") return marks_.add(words, pages_) ? ok() : error(DecoderError::Unsupported);
+  if (command == "mark") return marks_.add(words, pages_) ? ok() : errorAnswer(DecoderError::Unsupported);
   if (command == "unmark") {
     marks_.clear();
     return ok();
   }
   if (command == "save") return save();
-  return error(DecoderError::Unsupported);
+  return errorAnswer(DecoderError::Unsupported);
 }
 
 DecoderMessage DocumentDecoder::open(const std::string& password) {
   const char* problem = nullptr;
   document_ = openPortableDocument(original_, password, problem);
-  if (!document_) return error(problem);
+  if (!document_) return errorAnswer(problem);
   password_ = password;
   pages_ = std::min(poppler_document_get_n_pages(document_.get()), MostPages);
   if (pages_ <= 0) return damaged();
@@ -70,7 +69,7 @@ DecoderMessage DocumentDecoder::open(const std::string& password) {
 
 DecoderMessage DocumentDecoder::sizes(std::string_view words) {
   int from = 0;
-  if (!nextNumber(words, from) || from < 0 || from >= pages_) return error(DecoderError::Unsupported);
+  if (!nextNumber(words, from) || from < 0 || from >= pages_) return errorAnswer(DecoderError::Unsupported);
   return {"ok" + sizesFrom(from), UniqueFd()};
 }
 
@@ -103,13 +102,13 @@ DecoderMessage DocumentDecoder::render(std::string_view words) {
   if (!nextNumber(words, index) || !nextNumber(words, scale) || !nextNumber(words, x) || !nextNumber(words, y) ||
       !nextNumber(words, width) || !nextNumber(words, height) || scale <= 0 || scale > LargestScale || x < 0 || y < 0 ||
       width <= 0 || height <= 0 || width > MostPixelsOnASide || height > MostPixelsOnASide || width > MostPixels / height) {
-    return error(DecoderError::Unsupported);
+    return errorAnswer(DecoderError::Unsupported);
   }
   const GRef<PopplerPage> shown = page(index);
   if (!shown) return damaged();
   const int stride = width * 4;
   PixelFile pixels(static_cast<std::size_t>(stride) * static_cast<std::size_t>(height));
-  if (!pixels.data()) return error(DecoderError::TooBig);
+  if (!pixels.data()) return errorAnswer(DecoderError::TooBig);
   cairo_surface_t* surface = cairo_image_surface_create_for_data(pixels.data(), CAIRO_FORMAT_ARGB32, width, height, stride);
   cairo_t* context = cairo_create(surface);
   cairo_set_source_rgb(context, 1, 1, 1);
@@ -132,7 +131,7 @@ DecoderMessage DocumentDecoder::text(std::string_view words) {
   if (found.boxes.empty()) return {"ok 0", UniqueFd()};
   const std::size_t boxBytes = found.boxes.size() * sizeof found.boxes.front();
   PixelFile file(boxBytes + found.text.size());
-  if (!file.data()) return error(DecoderError::TooBig);
+  if (!file.data()) return errorAnswer(DecoderError::TooBig);
   std::memcpy(file.data(), found.boxes.data(), boxBytes);
   std::memcpy(file.data() + boxBytes, found.text.data(), found.text.size());
   return {"ok " + std::to_string(found.boxes.size()), file.take()};
@@ -140,7 +139,7 @@ DecoderMessage DocumentDecoder::text(std::string_view words) {
 
 DecoderMessage DocumentDecoder::find(std::string_view words) {
   int from = 0;
-  if (!nextNumber(words, from) || from < 0 || from >= pages_ || words.empty()) return error(DecoderError::Unsupported);
+  if (!nextNumber(words, from) || from < 0 || from >= pages_ || words.empty()) return errorAnswer(DecoderError::Unsupported);
   const std::string wanted(words);
   const Clock::time_point end = Clock::now() + FindingTakes;
   int next = from;
@@ -171,10 +170,10 @@ DecoderMessage DocumentDecoder::areas(std::string_view words) {
 DecoderMessage DocumentDecoder::save() {
   const char* problem = nullptr;
   UniqueFd marked = marks_.apply(original_, password_, problem);
-  if (!marked) return error(problem);
+  if (!marked) return errorAnswer(problem);
   const GRef<PopplerDocument> readBack = openPortableDocument(marked, password_, problem);
   if (!readBack || std::min(poppler_document_get_n_pages(readBack.get()), MostPages) != pages_) {
-    return error(DecoderError::Unsupported);
+    return errorAnswer(DecoderError::Unsupported);
   }
   return {"ok", std::move(marked)};
 }

@@ -10,6 +10,7 @@
 
 #include "host/decoder/document_ink.h"
 #include "host/decoder/document_words.h"
+#include "host/decoder/page_height.h"
 #include "host/support/decoder_error.h"
 
 namespace vaelo {
@@ -18,12 +19,6 @@ namespace {
 
 constexpr std::size_t MostMarks = 5000;
 constexpr off_t LargestDocument = 256 * 1024 * 1024;  // bytes; the marked one is made in memory
-
-double heightOf(PopplerPage* page) {
-  double height = 0;
-  poppler_page_get_size(page, nullptr, &height);
-  return height;
-}
 
 PopplerColor colourOf(const DocumentMark& mark) {
   const auto part = [&](std::size_t i) { return static_cast<guint16>(std::clamp(mark.colour[i], 0.0, 1.0) * 65535); };

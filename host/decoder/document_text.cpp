@@ -6,25 +6,20 @@
 #include <algorithm>
 
 #include "host/decoder/document_words.h"
+#include "host/decoder/page_height.h"
 #include "host/support/decoder_error.h"
 
 namespace vaelo {
 
 namespace {
 
-constexpr std::size_t MostCharacters = 500'000;  // on a page
+constexpr std::size_t MostPageCharacters = 500'000;  // on a page
 
 // Where the library counts upwards from the lower edge.
 PageBox flipped(const PopplerRectangle& area, double height) {
   const auto top = static_cast<float>(height - std::max(area.y1, area.y2));
   const auto bottom = static_cast<float>(height - std::min(area.y1, area.y2));
   return {static_cast<float>(std::min(area.x1, area.x2)), top, static_cast<float>(std::max(area.x1, area.x2)), bottom};
-}
-
-double heightOf(PopplerPage* page) {
-  double height = 0;
-  poppler_page_get_size(page, nullptr, &height);
-  return height;
 }
 
 std::string oneLine(std::string text) {
@@ -79,7 +74,7 @@ PageText textOf(PopplerPage* page) {
   guint count = 0;
   if (!poppler_page_get_text_layout(page, &boxes, &count)) count = 0;
   const auto characters = static_cast<std::size_t>(g_utf8_strlen(found.text.c_str(), -1));
-  const std::size_t used = std::min({static_cast<std::size_t>(count), characters, MostCharacters});
+  const std::size_t used = std::min({static_cast<std::size_t>(count), characters, MostPageCharacters});
   for (std::size_t i = 0; i < used; ++i) {
     found.boxes.push_back({static_cast<float>(boxes[i].x1), static_cast<float>(boxes[i].y1), static_cast<float>(boxes[i].x2),
                            static_cast<float>(boxes[i].y2)});

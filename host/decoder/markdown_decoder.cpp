@@ -21,8 +21,6 @@ constexpr off_t MostBytes = 1024 * 1024;
 constexpr std::size_t MostForms = 30'000;
 constexpr std::size_t LongestLine = 10'000;  // in bytes; laying a paragraph out takes longer than in proportion
 
-DecoderMessage error(const char* reason) { return {std::string("error ") + reason, UniqueFd()}; }
-
 bool hasLongLine(const std::string& text) {
   for (std::size_t begin = 0; begin < text.size();) {
     const std::size_t end = std::min(text.find('\n', begin), text.size());
@@ -52,13 +50,13 @@ const char* readAll(int file, std::string& bytes) {
 }  // namespace
 
 DecoderMessage MarkdownDecoder::answer(const std::string& request) {
-  if (request != "render") return error(DecoderError::Unsupported);
+  if (request != "render") return errorAnswer(DecoderError::Unsupported);
   std::string bytes;
-  if (const char* problem = readAll(document_.get(), bytes)) return error(problem);
-  if (TextDecoding::isBinary(bytes)) return error(DecoderError::Unsupported);
+  if (const char* problem = readAll(document_.get(), bytes)) return errorAnswer(problem);
+  if (TextDecoding::isBinary(bytes)) return errorAnswer(DecoderError::Unsupported);
   MarkdownText markdown(TextDecoding().decode(bytes, true));
   const std::vector<MarkdownText::Form>& forms = markdown.forms();
-  if (forms.size() > MostForms || hasLongLine(markdown.text())) return error(DecoderError::TooBig);
+  if (forms.size() > MostForms || hasLongLine(markdown.text())) return errorAnswer(DecoderError::TooBig);
   std::string content = markdown.text();
   const std::string answer = "ok " + std::to_string(content.size()) + " " + std::to_string(markdown.characters());
   for (const MarkdownText::Form& form : forms) {
@@ -67,7 +65,7 @@ DecoderMessage MarkdownDecoder::answer(const std::string& request) {
   }
   if (content.empty()) return {answer, UniqueFd()};
   PixelFile file(content.size());
-  if (!file.data()) return error(DecoderError::TooBig);
+  if (!file.data()) return errorAnswer(DecoderError::TooBig);
   std::memcpy(file.data(), content.data(), content.size());
   return {answer, file.take()};
 }

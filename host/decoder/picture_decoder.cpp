@@ -20,8 +20,6 @@ namespace {
 constexpr int LongestSide = 16384;               // of what is drawn at once
 constexpr double MostPixels = 64 * 1024 * 1024;  // of it
 
-DecoderMessage error(const char* reason) { return {std::string("error ") + reason, UniqueFd()}; }
-
 bool isDrawable(PictureSize size) {
   return size.width > 0 && size.height > 0 && size.width <= LongestSide && size.height <= LongestSide &&
          static_cast<double>(size.width) * size.height <= MostPixels;
@@ -61,10 +59,10 @@ DecoderMessage PictureDecoder::answer(const std::string& request) {
   std::string_view words = request;
   const std::string_view verb = nextWord(words);
   if (verb == "whole") return whole(words);
-  if (!picture_) return error(DecoderError::Damaged);
+  if (!picture_) return errorAnswer(DecoderError::Damaged);
   if (verb == "part") return part(words);
   if (verb == "next") return next(words);
-  return error(DecoderError::Unsupported);
+  return errorAnswer(DecoderError::Unsupported);
 }
 
 const char* PictureDecoder::open(PictureSize bounds) {
@@ -84,8 +82,8 @@ const char* PictureDecoder::open(PictureSize bounds) {
 
 DecoderMessage PictureDecoder::whole(std::string_view words) {
   PictureSize bounds;
-  if (!readSize(words, bounds)) return error(DecoderError::Damaged);
-  if (const char* problem = open(bounds)) return error(problem);
+  if (!readSize(words, bounds)) return errorAnswer(DecoderError::Damaged);
+  if (const char* problem = open(bounds)) return errorAnswer(problem);
   const PictureSize size = picture_->size();
   const PictureSource::Features features = picture_->features();
   const PictureSize to = fitPicture(size, bounds, features.scalable);
@@ -104,13 +102,13 @@ DecoderMessage PictureDecoder::part(std::string_view words) {
   const PictureSize size = picture_->size();
   const bool isInside = part.x >= 0 && part.y >= 0 && part.width > 0 && part.height > 0 &&
                         part.x + part.width <= size.width + 0.01 && part.y + part.height <= size.height + 0.01;
-  if (!isRead || !isInside) return error(DecoderError::Damaged);
+  if (!isRead || !isInside) return errorAnswer(DecoderError::Damaged);
   return pixels("ok " + text(to), part, to);
 }
 
 DecoderMessage PictureDecoder::next(std::string_view words) {
   PictureSize bounds;
-  if (!readSize(words, bounds)) return error(DecoderError::Damaged);
+  if (!readSize(words, bounds)) return errorAnswer(DecoderError::Damaged);
   picture_->advance();
   const PictureSize size = picture_->size();
   const PictureSource::Features features = picture_->features();
@@ -121,9 +119,10 @@ DecoderMessage PictureDecoder::next(std::string_view words) {
 
 DecoderMessage PictureDecoder::pixels(std::string text, const PicturePart& part, PictureSize to) {
   PixelFile file(static_cast<std::size_t>(to.width) * static_cast<std::size_t>(to.height) * 4);
-  if (!file.data()) return error(DecoderError::TooBig);
+  if (!file.data()) return errorAnswer(DecoderError::TooBig);
   // NOLINTNEXTLINE(cppcoreguidelines-pro-type-reinterpret-cast): memory of a page of its own
-  if (const char* problem = picture_->draw(part, to, reinterpret_cast<std::uint32_t*>(file.data()))) return error(problem);
+  if (const char* problem = picture_->draw(part, to, reinterpret_cast<std::uint32_t*>(file.data())))
+    return errorAnswer(problem);
   return {std::move(text), file.take()};
 }
 

@@ -12,7 +12,7 @@ namespace vaelo {
 
 namespace {
 
-constexpr const char* group = "Activity";
+constexpr const char* activityGroup = "Activity";
 constexpr const char* infoGroup = "UserInfo";
 constexpr std::chrono::hours oldest(24);
 constexpr std::chrono::minutes clockDifference(10);  // that two devices may have
@@ -65,9 +65,9 @@ std::optional<Date> dateIn(const std::optional<std::string>& text) {
 std::string activityFileText(const ActivityRecord& record) {
   const KeyFile file(g_key_file_new());
   const auto since = std::chrono::floor<std::chrono::seconds>(record.since).time_since_epoch().count();
-  g_key_file_set_string(file.get(), group, "Device", record.deviceName.c_str());
-  g_key_file_set_string(file.get(), group, "Type", record.type.c_str());
-  g_key_file_set_string(file.get(), group, "Since", std::to_string(since).c_str());
+  g_key_file_set_string(file.get(), activityGroup, "Device", record.deviceName.c_str());
+  g_key_file_set_string(file.get(), activityGroup, "Type", record.type.c_str());
+  g_key_file_set_string(file.get(), activityGroup, "Since", std::to_string(since).c_str());
   for (const auto& [key, value] : record.userInfo) {
     if (isPlainWord(key)) g_key_file_set_string(file.get(), infoGroup, key.c_str(), value.c_str());
   }
@@ -80,14 +80,14 @@ Result<ActivityRecord> readActivityFile(const std::string& path, Date now) {
   GKeyFile* keys = file.value->get();
   const auto refused = [&path](const char* reason) { return fileError(FileErrorCode::ReadUnknown, path, reason); };
   ActivityRecord record;
-  record.type = keyFileBytes(keys, group, "Type").value_or("");
+  record.type = keyFileBytes(keys, activityGroup, "Type").value_or("");
   if (!isPlainWord(record.type) || record.type.size() > longestType) return refused("the file says no type of activity");
-  const std::optional<Date> since = dateIn(keyFileBytes(keys, group, "Since"));
+  const std::optional<Date> since = dateIn(keyFileBytes(keys, activityGroup, "Since"));
   if (!since) return refused("the file says no time");
   if (*since < now - oldest) return refused("the activity is too old");
   if (*since > now + clockDifference) return refused("the activity is from the future");
   record.since = *since;
-  record.deviceName = shownName(keyFileBytes(keys, group, "Device").value_or(""));
+  record.deviceName = shownName(keyFileBytes(keys, activityGroup, "Device").value_or(""));
   if (record.deviceName.empty()) record.deviceName = _("another device");
   gchar** names = g_key_file_get_keys(keys, infoGroup, nullptr, nullptr);
   for (gchar** name = names; name && *name; ++name) {

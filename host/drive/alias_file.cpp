@@ -6,10 +6,10 @@
 namespace vaelo {
 
 namespace {
-constexpr std::string_view suffix = ".desktop";
+constexpr std::string_view aliasSuffix = ".desktop";
 }  // namespace
 
-bool isAliasName(std::string_view name) { return name.size() > suffix.size() && name.ends_with(suffix); }
+bool isAliasName(std::string_view name) { return name.size() > aliasSuffix.size() && name.ends_with(aliasSuffix); }
 
 Result<URL> readAliasFile(const std::string& path) {
   const Result<KeyFile> file = readKeyFile(path);

@@ -14,7 +14,7 @@ namespace vaelo {
 
 namespace {
 
-constexpr const char* group = "Container";
+constexpr const char* containerGroup = "Container";
 
 bool isFolder(const std::string& path) {
   struct stat status = {};
@@ -54,24 +54,24 @@ CloudContainerRef LocalContainer::read(const DriveLayout& layout, const std::str
 void LocalContainer::readManifest(const std::string& path, LogSink& log) {
   const Result<KeyFile> file = readKeyFile(path);
   if (!file && file.error->code == FileErrorCode::ReadNoSuchFile) return;
-  if (!file || !g_key_file_has_group(file.value->get(), group)) {
+  if (!file || !g_key_file_has_group(file.value->get(), containerGroup)) {
     const std::string reason = file.error ? file.error->description() : "it has no container in it";
     log.write(LogType::Error, "drive: the manifest of " + localizedName_ + " is broken: " + reason);
     return;
   }
   GKeyFile* keys = file.value->get();
-  if (gchar* name = g_key_file_get_locale_string(keys, group, "Name", nullptr, nullptr)) {
+  if (gchar* name = g_key_file_get_locale_string(keys, containerGroup, "Name", nullptr, nullptr)) {
     if (*name) localizedName_ = name;
     g_free(name);
   }
-  if (const auto types = keyFileList(keys, group, "DocumentTypes")) {
+  if (const auto types = keyFileList(keys, containerGroup, "DocumentTypes")) {
     Array identifiers;
     for (const std::string& type : *types) identifiers.emplace_back(type);
     documentTypes_.emplace();
     if (!identifiers.empty()) documentTypes_->push_back({Value(std::move(identifiers))});
   }
-  folderLevels_ = keyFileBytes(keys, group, "FolderLevels");
-  owners_ = keyFileList(keys, group, "Owners").value_or(std::vector<std::string>());
+  folderLevels_ = keyFileBytes(keys, containerGroup, "FolderLevels");
+  owners_ = keyFileList(keys, containerGroup, "Owners").value_or(std::vector<std::string>());
 }
 
 std::optional<Error> LocalContainer::deleteAllContents() {

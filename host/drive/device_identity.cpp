@@ -12,13 +12,13 @@ namespace vaelo {
 
 namespace {
 
-constexpr const char* group = "Device";
+constexpr const char* deviceGroup = "Device";
 
 DeviceIdentity identityIn(const std::string& file) {
   const Result<KeyFile> keys = readKeyFile(file);
   if (!keys) return {};
-  return {keyFileBytes(keys.value->get(), group, "ID").value_or(""),
-          keyFileBytes(keys.value->get(), group, "Name").value_or("")};
+  return {keyFileBytes(keys.value->get(), deviceGroup, "ID").value_or(""),
+          keyFileBytes(keys.value->get(), deviceGroup, "Name").value_or("")};
 }
 
 }  // namespace
@@ -34,8 +34,8 @@ DeviceIdentity deviceIdentity(const DriveLayout& layout, LogSink& log) {
   if (!isDeviceID(identity.id)) {
     identity.id = takeString(g_uuid_string_random());
     const KeyFile keys(g_key_file_new());
-    g_key_file_set_string(keys.get(), group, "ID", identity.id.c_str());
-    if (!identity.name.empty()) g_key_file_set_string(keys.get(), group, "Name", identity.name.c_str());
+    g_key_file_set_string(keys.get(), deviceGroup, "ID", identity.id.c_str());
+    if (!identity.name.empty()) g_key_file_set_string(keys.get(), deviceGroup, "Name", identity.name.c_str());
     if (const auto error = writeSmallFile(file, keyFileText(keys.get()))) {
       log.write(LogType::Error, "drive: can't keep the identity of this device: " + error->description());
     }

@@ -19,7 +19,7 @@ namespace vaelo {
 
 namespace {
 
-constexpr std::string_view suffix = ".ini";
+constexpr std::string_view activitySuffix = ".ini";
 constexpr std::size_t mostFiles = 64;      // of as many devices; more are somebody's mistake or mischief
 constexpr guint gatherMilliseconds = 100;  // a file is replaced in several steps
 
@@ -97,7 +97,7 @@ class DriveUserActivities::Publisher : public CurrentActivity {
     if (offered) offered->deviceName = device().name;
     const std::string folder = this->folder();
     if (isKept_ && offered == kept_ && folder == keptIn_) return;
-    const std::string name = "/" + device().id + std::string(suffix);
+    const std::string name = "/" + device().id + std::string(activitySuffix);
     // What was told to the devices of another account is no longer so.
     if (isKept_ && kept_ && folder != keptIn_) ::unlink((keptIn_ + name).c_str());
     isKept_ = true;
@@ -138,7 +138,7 @@ class DriveUserActivities::Publisher : public CurrentActivity {
     std::vector<std::string> names;
     const std::unique_ptr<DIR, int (*)(DIR*)> stream(::opendir(folder().c_str()), ::closedir);
     if (!stream) return names;
-    const std::string own = device().id + std::string(suffix);
+    const std::string own = device().id + std::string(activitySuffix);
     while (const dirent* entry = ::readdir(stream.get())) {
       const std::string name = entry->d_name;
       if (name.front() == '.' || name == own) continue;  // temporary files begin so
@@ -153,7 +153,7 @@ class DriveUserActivities::Publisher : public CurrentActivity {
 
   // Nothing, without a reason, for what is no fault: the same document is open here.
   std::optional<OtherActivity> readOther(const std::string& name, std::string& reason) {
-    const std::string id = name.ends_with(suffix) ? name.substr(0, name.size() - suffix.size()) : "";
+    const std::string id = name.ends_with(activitySuffix) ? name.substr(0, name.size() - activitySuffix.size()) : "";
     if (!isDeviceID(id)) {
       reason = "not the name of a device's file";  // not for people
       return std::nullopt;

@@ -28,7 +28,7 @@ constexpr const char* welcomeText =
        "- Hold a finger on an item to see what can be done with it.\n"
        "- Pull the list down to refresh it.\n\n"
        "You may delete this document whenever you like.\n");
-constexpr std::string_view suffix = ".ini";
+constexpr std::string_view accountSuffix = ".ini";
 
 /// From the kernel, so that no two processes of this or another device can come to the same.
 std::string randomToken() {
@@ -68,8 +68,6 @@ KeyFile newAccount(const std::string& name, const std::string& token, const std:
   return file;
 }
 
-std::string trimmed(const std::string& text) { return takeString(g_strstrip(g_strdup(text.c_str()))); }
-
 bool isName(const std::string& name) {
   if (name.empty() || !g_utf8_validate(name.data(), static_cast<gssize>(name.size()), nullptr)) return false;
   if (static_cast<std::size_t>(g_utf8_strlen(name.c_str(), -1)) > LocalAccounts::LongestName) return false;
@@ -101,7 +99,7 @@ class Turn {
 }  // namespace
 
 std::string LocalAccounts::fileOf(const std::string& token) const {
-  return layout_.accountsFolder() + "/" + token + std::string(suffix);
+  return layout_.accountsFolder() + "/" + token + std::string(accountSuffix);
 }
 
 Result<KeyFile> LocalAccounts::currentFile() const { return readKeyFile(layout_.accountFile()); }
@@ -119,7 +117,7 @@ std::vector<LocalAccounts::Known> LocalAccounts::all() const {
   };
   add(layout_.accountFile(), true);
   for (const std::string& name : namesIn(layout_.accountsFolder())) {
-    if (name.ends_with(suffix) && name.front() != '.') add(layout_.accountsFolder() + "/" + name, false);
+    if (name.ends_with(accountSuffix) && name.front() != '.') add(layout_.accountsFolder() + "/" + name, false);
   }
   std::stable_sort(known.begin(), known.end(), [](const Known& one, const Known& other) {
     return g_utf8_collate(one.record.name.c_str(), other.record.name.c_str()) < 0;
@@ -161,7 +159,7 @@ std::optional<Error> LocalAccounts::makeCurrent(GKeyFile* account) const {
 }
 
 std::optional<Error> LocalAccounts::add(const std::string& typed) {
-  const std::string name = trimmed(typed);
+  const std::string name = takeString(g_strstrip(g_strdup(typed.c_str())));
   if (!isName(name)) return fileError(FileErrorCode::WriteInvalidFileName, layout_.accountFile(), "no name for an account");
   const Turn turn(layout_.dataFolder());
   for (const Known& known : all()) {

@@ -18,7 +18,7 @@ constexpr std::string_view shortSuffix = ".vlopromise";
 constexpr std::string_view longSuffix = ".vlopromise-long";
 constexpr std::size_t nameLimit = 255;  // bytes in a name on every file system that we meet
 constexpr std::size_t hashDigits = 16;
-constexpr const char* group = "Promise";
+constexpr const char* promiseGroup = "Promise";
 
 std::string longPromiseNameFor(std::string_view logicalName) {
   std::uint64_t hash = 0xcbf29ce484222325u;  // FNV-1a, 64 bits
@@ -116,7 +116,7 @@ Result<PromiseInfo> readPromise(const std::string& promisePath) {
   const Result<KeyFile> file = readKeyFile(promisePath);
   if (!file) return *file.error;
   GKeyFile* keys = file.value->get();
-  const auto value = [keys](const char* key) { return keyFileBytes(keys, group, key); };
+  const auto value = [keys](const char* key) { return keyFileBytes(keys, promiseGroup, key); };
 
   PromiseInfo info;
   if (const auto logical = logicalNameOfShortPromise(fileName)) {
@@ -131,11 +131,11 @@ Result<PromiseInfo> readPromise(const std::string& promisePath) {
   info.size = integer<std::uint64_t>(value("Size")).value_or(0);
   info.modified = date(value("Modified"));
   info.created = date(value("Created"));
-  info.package = keyFileBool(keys, group, "Package", false);
-  info.extensionHidden = keyFileBool(keys, group, "ExtensionHidden", false);
+  info.package = keyFileBool(keys, promiseGroup, "Package", false);
+  info.extensionHidden = keyFileBool(keys, promiseGroup, "ExtensionHidden", false);
   const std::optional<std::string> share = value("Share");
   if (share == SharedItemRoleOwner || share == SharedItemRoleParticipant) info.share = share;
-  info.tags = keyFileList(keys, group, "Tags").value_or(std::vector<std::string>());
+  info.tags = keyFileList(keys, promiseGroup, "Tags").value_or(std::vector<std::string>());
   info.documentID = integer<std::int64_t>(value("DocumentID"));
   return info;
 }
@@ -145,7 +145,7 @@ std::optional<Error> writePromise(const std::string& folder, const PromiseInfo& 
   if (!isPlainName(info.name)) return fileError(FileErrorCode::WriteInvalidFileName, path, "not the name of an item");
   const KeyFile file(g_key_file_new());
   const auto set = [&file](const char* key, const std::string& value) {
-    g_key_file_set_string(file.get(), group, key, value.c_str());
+    g_key_file_set_string(file.get(), promiseGroup, key, value.c_str());
   };
   set("Name", info.name);
   set("Size", std::to_string(info.size));
@@ -156,7 +156,7 @@ std::optional<Error> writePromise(const std::string& folder, const PromiseInfo& 
   if (info.share) set("Share", *info.share);
   std::vector<const char*> tags;
   for (const std::string& tag : info.tags) tags.push_back(tag.c_str());
-  if (!tags.empty()) g_key_file_set_string_list(file.get(), group, "Tags", tags.data(), tags.size());
+  if (!tags.empty()) g_key_file_set_string_list(file.get(), promiseGroup, "Tags", tags.data(), tags.size());
   if (info.documentID) set("DocumentID", std::to_string(*info.documentID));
   return writeSmallFile(path, keyFileText(file.get()));
 }
@@ -167,9 +167,9 @@ std::optional<Error> setPromiseTags(const std::string& promisePath, const std::v
   std::vector<const char*> texts;
   for (const std::string& tag : tags) texts.push_back(tag.c_str());
   if (texts.empty()) {
-    g_key_file_remove_key(file.value->get(), group, "Tags", nullptr);
+    g_key_file_remove_key(file.value->get(), promiseGroup, "Tags", nullptr);
   } else {
-    g_key_file_set_string_list(file.value->get(), group, "Tags", texts.data(), texts.size());
+    g_key_file_set_string_list(file.value->get(), promiseGroup, "Tags", texts.data(), texts.size());
   }
   return writeSmallFile(promisePath, keyFileText(file.value->get()));
 }
@@ -177,7 +177,7 @@ std::optional<Error> setPromiseTags(const std::string& promisePath, const std::v
 std::optional<Error> setPromiseDocumentID(const std::string& promisePath, std::int64_t documentID) {
   const Result<KeyFile> file = readKeyFile(promisePath);
   if (!file) return file.error;
-  g_key_file_set_int64(file.value->get(), group, "DocumentID", documentID);
+  g_key_file_set_int64(file.value->get(), promiseGroup, "DocumentID", documentID);
   return writeSmallFile(promisePath, keyFileText(file.value->get()));
 }
 

@@ -5,12 +5,12 @@
 
 #include "host/gtk/bar_item_widget.h"
 #include "host/gtk/gtk_window.h"
+#include "host/gtk/touch_size.h"
 
 namespace vaelo {
 
 namespace {
 
-constexpr int TouchSize = 44;
 constexpr int TextWidth = 36;  // characters
 
 struct Pressed {

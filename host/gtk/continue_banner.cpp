@@ -3,13 +3,12 @@
 
 #include <utility>
 
+#include "host/gtk/touch_size.h"
 #include "host/support/texts.h"
 
 namespace vaelo {
 
 namespace {
-
-constexpr int TouchSize = 44;
 
 std::string documentIn(const UserActivity& activity) {
   const Dictionary userInfo = activity.userInfo();

@@ -19,7 +19,7 @@ std::string hostOf(const std::string& address) {
   return host;
 }
 
-std::string bytes(std::int64_t count) {
+std::string byteText(std::int64_t count) {
   return Platform::current().formatting.byteCount(static_cast<std::uint64_t>(count), ByteCountStyle::Binary);
 }
 
@@ -62,7 +62,7 @@ class UpgradeScreen : public ViewController, public HostDialog {
     adw_status_page_set_title(ADW_STATUS_PAGE(page),
                               figures.free == 0 ? _("Your storage is full") : _("Your storage is almost full"));
     const std::string text = filled(_("%1$s of %2$s are free. Your provider %3$s has more."),
-                                    {bytes(figures.free), bytes(figures.total), hostOf(offer_->terms().page)});
+                                    {byteText(figures.free), byteText(figures.total), hostOf(offer_->terms().page)});
     const std::string markup = takeString(g_markup_escape_text(text.c_str(), -1));
     adw_status_page_set_description(ADW_STATUS_PAGE(page), markup.c_str());
 

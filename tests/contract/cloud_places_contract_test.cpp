@@ -15,8 +15,6 @@ class CloudPlacesContract : public ContractTest {
 
 VAELO_CONTRACT_SUITE(CloudPlacesContract);
 
-int code(const std::optional<Error>& error) { return error ? error->code : 0; }
-
 TEST_P(CloudPlacesContract, TheMirrorHoldsItsRootTheContainersAndTheTrash) {
   platform->addFile(inMirror(".Trash/a").path());
   for (const URL& url :

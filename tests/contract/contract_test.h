@@ -13,6 +13,8 @@
 
 namespace vaelo::contract {
 
+inline int code(const std::optional<Error>& error) { return error ? error->code : 0; }
+
 /// The base of all suites. The parameter names the implementation.
 class ContractTest : public ::testing::TestWithParam<const char*> {
  protected:

@@ -35,8 +35,6 @@ class FileManagerContract : public ContractTest {
 
 VAELO_CONTRACT_SUITE(FileManagerContract);
 
-int code(const std::optional<Error>& error) { return error ? error->code : 0; }
-
 TEST_P(FileManagerContract, ExistenceFollowsLinks) {
   bool isDirectory = true;
   platform->addFile(inDrive("file").path());

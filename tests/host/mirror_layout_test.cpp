@@ -50,9 +50,9 @@ TEST(LayoutSolverTest, WithoutAnyRowThereIsStillAnAnswer) {
 }
 
 /// A view with a natural size.
-class Block : public View {
+class SizedView : public View {
  public:
-  Block(double width, double height) : size_{width, height} { setTranslatesAutoresizingMaskIntoConstraints(false); }
+  SizedView(double width, double height) : size_{width, height} { setTranslatesAutoresizingMaskIntoConstraints(false); }
   Size intrinsicContentSize() const override { return size_; }
 
  private:
@@ -61,8 +61,8 @@ class Block : public View {
 
 class ViewLayoutTest : public testing::Test {
  protected:
-  std::shared_ptr<Block> block(double width, double height) {
-    const auto made = std::make_shared<Block>(width, height);
+  std::shared_ptr<SizedView> block(double width, double height) {
+    const auto made = std::make_shared<SizedView>(width, height);
     root->addSubview(made);
     return made;
   }
@@ -114,7 +114,7 @@ TEST_F(ViewLayoutTest, RightToLeftTheLeadingEdgeIsTheRightOne) {
 TEST_F(ViewLayoutTest, FramesOfTheirOwnAreKeptInBothDirections) {
   const auto fixed = std::make_shared<View>(Rect{10, 20, 300, 200});
   root->addSubview(fixed);
-  const auto inside = std::make_shared<Block>(50, 50);
+  const auto inside = std::make_shared<SizedView>(50, 50);
   fixed->addSubview(inside);
   pin(*inside, "H:|[view]", "V:|[view]");
   solve();
@@ -156,8 +156,8 @@ TEST_F(ViewLayoutTest, AStackThatFillsGivesTheRestToWhatHugsLeast) {
   large->setContentHuggingPriority(249, LayoutAxis::Vertical);
   column->addArrangedSubview(large);
   column->addArrangedSubview(facts);
-  facts->addArrangedSubview(std::make_shared<Block>(80, 30));
-  facts->addArrangedSubview(std::make_shared<Block>(60, 20));
+  facts->addArrangedSubview(std::make_shared<SizedView>(80, 30));
+  facts->addArrangedSubview(std::make_shared<SizedView>(60, 20));
   solve();
   expectFrame(*large, {0, 0, 400, 240});
   expectFrame(*facts, {0, 250, 400, 50});
@@ -167,9 +167,9 @@ TEST_F(ViewLayoutTest, AStackThatFillsGivesTheRestToWhatHugsLeast) {
 TEST_F(ViewLayoutTest, EqualPartsLeaveOutWhatIsHidden) {
   const auto row = stack(LayoutAxis::Horizontal, StackAlignment::Center, StackDistribution::FillEqually);
   fill(*row);
-  const auto first = std::make_shared<Block>(10, 30);
-  const auto gone = std::make_shared<Block>(10, 30);
-  const auto second = std::make_shared<Block>(90, 50);
+  const auto first = std::make_shared<SizedView>(10, 30);
+  const auto gone = std::make_shared<SizedView>(10, 30);
+  const auto second = std::make_shared<SizedView>(90, 50);
   for (const auto& part : {first, gone, second}) row->addArrangedSubview(part);
   gone->setHidden(true);
   solve();
@@ -180,7 +180,7 @@ TEST_F(ViewLayoutTest, EqualPartsLeaveOutWhatIsHidden) {
 TEST_F(ViewLayoutTest, EqualSpacingLetsTheGapsGrow) {
   const auto row = stack(LayoutAxis::Horizontal, StackAlignment::Trailing, StackDistribution::EqualSpacing);
   fill(*row);
-  for (int i = 0; i < 3; ++i) row->addArrangedSubview(std::make_shared<Block>(100, 30));
+  for (int i = 0; i < 3; ++i) row->addArrangedSubview(std::make_shared<SizedView>(100, 30));
   solve();
   expectFrame(*row->arrangedSubviews()[1], {150, 270, 100, 30});
   expectFrame(*row->arrangedSubviews()[2], {300, 270, 100, 30});
@@ -189,8 +189,8 @@ TEST_F(ViewLayoutTest, EqualSpacingLetsTheGapsGrow) {
 TEST_F(ViewLayoutTest, AStackIsAsLargeAsWhatItHolds) {
   const auto column = stack(LayoutAxis::Vertical, StackAlignment::Leading, StackDistribution::Fill);
   pin(*column, "H:|-5-[view]", "V:|-5-[view]");
-  column->addArrangedSubview(std::make_shared<Block>(80, 30));
-  column->addArrangedSubview(std::make_shared<Block>(120, 20));
+  column->addArrangedSubview(std::make_shared<SizedView>(80, 30));
+  column->addArrangedSubview(std::make_shared<SizedView>(120, 20));
   solve();
   expectFrame(*column, {5, 5, 120, 60});
   expectFrame(*column->arrangedSubviews()[0], {0, 0, 80, 30});
@@ -200,7 +200,7 @@ TEST_F(ViewLayoutTest, WhereThereIsTooLittleRoomTheFarEdgeGivesWay) {
   const auto column = stack(LayoutAxis::Vertical, StackAlignment::Center, StackDistribution::Fill);
   fill(*column);
   for (int i = 0; i < 2; ++i) {
-    const auto part = std::make_shared<Block>(50, 200);
+    const auto part = std::make_shared<SizedView>(50, 200);
     part->setContentCompressionResistancePriority(LayoutPriority::Required, LayoutAxis::Vertical);
     column->addArrangedSubview(part);
   }

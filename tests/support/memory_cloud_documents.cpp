@@ -9,7 +9,6 @@ namespace vaelo {
 
 namespace {
 
-constexpr int NotInDrive = 7;
 constexpr int NoAccount = 8;
 
 }  // namespace

@@ -11,7 +11,6 @@ namespace {
 constexpr int LinkLimit = 40;
 constexpr std::string_view PromiseSuffix = ".vlopromise";
 constexpr std::string_view LongPromiseSuffix = ".vlopromise-long";
-constexpr std::size_t NameLimit = 255;
 
 std::vector<std::string> components(const std::string& path) {
   std::vector<std::string> names = URL(path).pathComponents();

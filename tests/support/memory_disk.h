@@ -15,6 +15,8 @@ namespace vaelo {
 /// It is the one truth behind the services in memory.
 class MemoryDisk {
  public:
+  static constexpr std::size_t NameLimit = 255;  // bytes
+
   explicit MemoryDisk(std::shared_ptr<MemoryClock> clock) : clock_(std::move(clock)) {}
 
   /// Adds an item, or says anew what it is; folders above are added too.

@@ -8,8 +8,6 @@ namespace vaelo {
 
 namespace {
 
-constexpr std::size_t NameLimit = 255;
-
 Error moveFailure(Error error, const URL& destination) {
   error.userInfo[DestinationFilePathErrorKey] = Value(destination.path());
   return error;
@@ -49,7 +47,7 @@ std::optional<Error> MemoryFileManager::createDirectoryAtURL(const URL& url) {
   for (URL above = url.deletingLastPathComponent(); above.path() != "/"; above = above.deletingLastPathComponent()) {
     if (isThere(above.path()) && !disk_.hasFolder(above.path())) return noSuchItem(url.path());
   }
-  if (url.lastPathComponent().size() > NameLimit) return memoryError(FileErrorCode::WriteUnknown, url.path());
+  if (url.lastPathComponent().size() > MemoryDisk::NameLimit) return memoryError(FileErrorCode::WriteUnknown, url.path());
   if (disk_.isLocked(url.path())) return memoryError(FileErrorCode::WriteNoPermission, url.path());
   disk_.addFolder(disk_.place(url.path()));
   return std::nullopt;
@@ -76,7 +74,7 @@ std::optional<Error> MemoryFileManager::moveItemAtURL(const URL& source, const U
   if (isThere(to)) return moveFailure(memoryError(FileErrorCode::WriteFileExists, to), destination);
   if (URL(to).isInside(URL(from))) return moveFailure(memoryError(FileErrorCode::WriteUnknown, from), destination);
   if (!disk_.hasFolder(URL(to).deletingLastPathComponent().path())) return moveFailure(noSuchItem(from), destination);
-  if (destination.lastPathComponent().size() > NameLimit) {
+  if (destination.lastPathComponent().size() > MemoryDisk::NameLimit) {
     return moveFailure(memoryError(FileErrorCode::WriteUnknown, to), destination);
   }
   if (disk_.isLocked(from) || disk_.isLocked(to)) {

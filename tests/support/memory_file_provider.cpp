@@ -11,7 +11,6 @@ namespace vaelo {
 namespace {
 
 constexpr std::string_view Prefix = "memory:";
-constexpr int NotInDrive = 7;
 
 }  // namespace
 

@@ -8,7 +8,6 @@ namespace {
 using K = ResourceKey;
 
 const URL Item("/drive/mirror/com~marrow~Kestrel/item");
-const Date Noon{std::chrono::hours(12)};
 
 std::uint64_t bytes(int count) { return static_cast<std::uint64_t>(count); }
 

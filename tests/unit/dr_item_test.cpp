@@ -4,17 +4,10 @@
 #include <gtest/gtest.h>
 
 #include "tests/support/memory_platform.h"
+#include "tests/support/test_image.h"
 
 namespace vaelo {
 namespace {
-
-const std::string DrivePath = Drive.path();
-
-class TestImage : public Image {
- public:
-  double width() const override { return 10; }
-  double height() const override { return 10; }
-};
 
 class DRItemTest : public ::testing::Test {
  protected:

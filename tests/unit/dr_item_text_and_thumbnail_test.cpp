@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "items/dr_item.h"
+#include "tests/support/test_image.h"
 #include "tests/unit/items_world.h"
 
 namespace vaelo {
@@ -8,11 +9,6 @@ namespace {
 using K = ResourceKey;
 
 const URL Item("/drive/mirror/com~marrow~Kestrel/item");
-
-struct TestImage : Image {
-  double width() const override { return 1024; }
-  double height() const override { return 1024; }
-};
 
 /// What a record tells of itself, and its thumbnail.
 class DRItemTextTest : public ItemsTest {

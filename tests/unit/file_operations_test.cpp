@@ -7,8 +7,6 @@
 namespace vaelo {
 namespace {
 
-const std::string DrivePath = Drive.path();
-
 class FileOperationsTest : public ::testing::Test {
  protected:
   bool wasCalled(const std::string& call) const { return platform.record.has(call); }

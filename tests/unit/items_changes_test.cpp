@@ -9,7 +9,6 @@ using K = ResourceKey;
 
 const URL A("/drive/mirror/com~marrow~Kestrel/a");
 const URL B("/drive/mirror/com~marrow~Kestrel/b");
-const Date Noon{std::chrono::hours(12)};
 
 std::string text(const URL& url) { return url.absoluteString(); }
 

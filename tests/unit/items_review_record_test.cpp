@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "items/dr_item.h"
+#include "tests/support/test_image.h"
 #include "tests/unit/items_world.h"
 
 namespace vaelo {
@@ -8,13 +9,7 @@ namespace {
 using K = ResourceKey;
 
 const URL Item("/drive/mirror/com~marrow~Kestrel/item");
-const URL Target("/elsewhere/target");
-const Date Noon{std::chrono::hours(12)};
-
-struct TestImage : Image {
-  double width() const override { return 1024; }
-  double height() const override { return 1024; }
-};
+const URL LinkTarget("/elsewhere/target");
 
 /// The corners of a record: refills, reads that don't come about, and fills by hand.
 class ItemsReviewRecordTest : public ItemsTest {
@@ -108,9 +103,9 @@ TEST_F(ItemsReviewRecordTest, aPromiseURLWithoutAResolvedOneIsAPromise) {
 
 TEST_F(ItemsReviewRecordTest, aTargetOfMoreComponentsStaysAsItIs) {
   const auto item = linkFromAttributes("neighbour");
-  world.linkTargets.insert_or_assign(Item.path(), Target);
+  world.linkTargets.insert_or_assign(Item.path(), LinkTarget);
   item->initFromKeysAndValuesWithURL({{K::TypeIdentifier, "public.symlink"}}, Item);
-  EXPECT_EQ(item->resolvedURL(), Target);
+  EXPECT_EQ(item->resolvedURL(), LinkTarget);
 }
 
 TEST_F(ItemsReviewRecordTest, aLinkIsFollowedFromTheURLThatTheReadGives) {
@@ -118,20 +113,20 @@ TEST_F(ItemsReviewRecordTest, aLinkIsFollowedFromTheURLThatTheReadGives) {
   world.addFile(given, {{K::TypeIdentifier, "public.symlink"}});
   world.addFile(Item);
   world.redirected.insert_or_assign(Item.path(), given);
-  world.linkTargets.insert_or_assign(given.path(), Target);
-  EXPECT_EQ(DRItem::initWithURL(Item)->resolvedURL(), Target);
+  world.linkTargets.insert_or_assign(given.path(), LinkTarget);
+  EXPECT_EQ(DRItem::initWithURL(Item)->resolvedURL(), LinkTarget);
 }
 
 TEST_F(ItemsReviewRecordTest, aFollowedLinkIsNoLongerTheObjectOfItsPromiseURL) {
-  world.linkTargets.insert_or_assign(Item.path(), Target);
+  world.linkTargets.insert_or_assign(Item.path(), LinkTarget);
   const auto item = filled({{K::TypeIdentifier, "public.symlink"}});
   EXPECT_EQ(item->promiseURL(), Item) << "asked for before the link was followed";
   EXPECT_TRUE(item->isPromise());
 }
 
 TEST_F(ItemsReviewRecordTest, theSizeOfAPackageBehindALinkIsThatOfTheTarget) {
-  world.linkTargets.insert_or_assign(Item.path(), Target);
-  world.addFile(Target.appendingPathComponent("a"), {{K::FileSize, std::uint64_t{3}}});
+  world.linkTargets.insert_or_assign(Item.path(), LinkTarget);
+  world.addFile(LinkTarget.appendingPathComponent("a"), {{K::FileSize, std::uint64_t{3}}});
   world.addFile(Item.appendingPathComponent("b"), {{K::FileSize, std::uint64_t{50}}});
   const auto item = filled({{K::TypeIdentifier, "public.symlink"}, {K::IsPackage, true}});
   EXPECT_EQ(item->fileSize(), 3u);
@@ -187,13 +182,13 @@ TEST_F(ItemsReviewRecordTest, aSizeAttributeThatIsNoNumberIsAbsent) {
 }
 
 TEST_F(ItemsReviewRecordTest, attributesAreReadOfTheURLAsGiven) {
-  world.bookmarks.insert_or_assign(Item.path(), Target);
+  world.bookmarks.insert_or_assign(Item.path(), LinkTarget);
   world.addFile(Item).attributes.size = std::uint64_t{4};
   const auto item = DRItem::initWithURL(Item);
   EXPECT_EQ(item->localizedName(), "item");
   EXPECT_EQ(item->parentDirectoryURL(), Drive);
   EXPECT_EQ(item->fileSize(), 4u);
-  EXPECT_EQ(item->resolvedURL(), Target);
+  EXPECT_EQ(item->resolvedURL(), LinkTarget);
 }
 
 TEST_F(ItemsReviewRecordTest, withoutAResolvedURLThereIsNoPromiseURLEither) {
@@ -204,7 +199,7 @@ TEST_F(ItemsReviewRecordTest, withoutAResolvedURLThereIsNoPromiseURLEither) {
 }
 
 TEST_F(ItemsReviewRecordTest, anAliasIsFollowedOnlyWithoutAnError) {
-  Result<URL> both(Target);
+  Result<URL> both(LinkTarget);
   both.error = fileError(FileErrorCode::ReadUnknown);
   world.aliasTargets.insert_or_assign(Item.path(), both);
   EXPECT_FALSE(filled({{K::LocalizedTypeDescription, "Alias"}})->resolvedURL());
@@ -284,9 +279,9 @@ TEST_F(ItemsReviewRecordTest, aThumbnailIsReadWhereTheCoordinatorSaysAndClosedWh
 }
 
 TEST_F(ItemsReviewRecordTest, theThumbnailIsThatOfTheLinksTarget) {
-  world.linkTargets.insert_or_assign(Item.path(), Target);
+  world.linkTargets.insert_or_assign(Item.path(), LinkTarget);
   const auto image = std::make_shared<TestImage>();
-  world.addFile(Target, {{K::ThumbnailDictionary, Dictionary{{Thumbnail1024SizeKey, ImageRef(image)}}}});
+  world.addFile(LinkTarget, {{K::ThumbnailDictionary, Dictionary{{Thumbnail1024SizeKey, ImageRef(image)}}}});
   const auto item = filled({{K::TypeIdentifier, "public.symlink"}});
   EXPECT_EQ(item->thumbnail(), image);
   const auto broken = filled({{K::LocalizedTypeDescription, "Alias"}});
@@ -305,11 +300,11 @@ TEST_F(ItemsReviewRecordTest, aRefillForgetsTheThumbnail) {
 
 TEST_F(ItemsReviewRecordTest, whatIsSetIsKept) {
   const auto item = filled();
-  item->setResolvedURL(Target);
+  item->setResolvedURL(LinkTarget);
   item->setLocalizedName("name");
   item->setThumbnail(nullptr);
   item->setThumbnailFetched(true);
-  EXPECT_EQ(item->resolvedURL(), Target);
+  EXPECT_EQ(item->resolvedURL(), LinkTarget);
   EXPECT_EQ(item->localizedName(), "name");
   EXPECT_FALSE(item->thumbnail());
   EXPECT_EQ(item->url(), Item);

@@ -100,6 +100,8 @@ class ItemsWorld : public MemoryPlatform {
   MemoryItem& add(const URL& url, FileType type, ResourceMap said);
 };
 
+inline const Date Noon{std::chrono::hours(12)};
+
 /// The base of all tests of items.
 class ItemsTest : public ::testing::Test {
  protected:

@@ -8,8 +8,6 @@
 namespace vaelo {
 namespace {
 
-const std::string DrivePath = Drive.path();
-
 class NamesAndPlacesTest : public ::testing::Test {
  protected:
   NamesAndPlacesTest() { library = platform.cloud.addContainer("org~example~Sketch", "Sketchbook"); }

@@ -6,22 +6,22 @@
 namespace vaelo {
 namespace {
 
-const URL a("/drive/a");
-const URL b("/drive/b");
-const URL c("/drive/c");
+const URL itemA("/drive/a");
+const URL itemB("/drive/b");
+const URL itemC("/drive/c");
 
 TEST(URLListTest, HasNothingAtFirst) {
   const URLList list;
   EXPECT_EQ(list.size(), 0u);
-  EXPECT_EQ(list.indexOf(a), std::nullopt);
-  EXPECT_TRUE(list.thoseOf({a}).empty());
+  EXPECT_EQ(list.indexOf(itemA), std::nullopt);
+  EXPECT_TRUE(list.thoseOf({itemA}).empty());
 }
 
 TEST(URLListTest, GivesThoseWantedOnceInItsOwnOrder) {
-  const URLList list{c, a, b};
-  EXPECT_EQ(list.thoseOf({b, URL("/drive/other"), c, b}), (std::vector<URL>{c, b}));
-  EXPECT_EQ(list.all(), (std::vector<URL>{c, a, b}));
-  EXPECT_EQ(list.indexOf(a), 1u);
+  const URLList list{itemC, itemA, itemB};
+  EXPECT_EQ(list.thoseOf({itemB, URL("/drive/other"), itemC, itemB}), (std::vector<URL>{itemC, itemB}));
+  EXPECT_EQ(list.all(), (std::vector<URL>{itemC, itemA, itemB}));
+  EXPECT_EQ(list.indexOf(itemA), 1u);
 }
 
 TEST(URLListTest, GuessesThatThoseWantedStandInItsOrder) {
@@ -30,18 +30,18 @@ TEST(URLListTest, GuessesThatThoseWantedStandInItsOrder) {
       10, [](std::size_t i) { return URL("/drive/" + std::to_string(i)); },
       [&guesses](const URL& url, std::size_t guess) -> std::optional<std::size_t> {
         guesses.push_back(guess);
-        if (url == a) return std::nullopt;
+        if (url == itemA) return std::nullopt;
         return std::stoul(url.lastPathComponent());
       });
-  EXPECT_EQ(list.placesOf({list[0], list[1], a, list[5], list[6]}), (std::vector<std::size_t>{0, 1, 5, 6}));
+  EXPECT_EQ(list.placesOf({list[0], list[1], itemA, list[5], list[6]}), (std::vector<std::size_t>{0, 1, 5, 6}));
   EXPECT_EQ(guesses, (std::vector<std::size_t>{0, 1, 2, 2, 6}));
   EXPECT_EQ(list.placesOf({list[5], list[1], list[5]}), (std::vector<std::size_t>{1, 5}));
 }
 
 TEST(URLListTest, KnowsOfItsItemsWhatItIsTold) {
-  const auto at = [](std::size_t) { return a; };
+  const auto at = [](std::size_t) { return itemA; };
   const auto indexOf = [](const URL&, std::size_t) { return std::optional<std::size_t>(0); };
-  EXPECT_EQ(URLList({a}).hint(0), ItemHint::Unknown);
+  EXPECT_EQ(URLList({itemA}).hint(0), ItemHint::Unknown);
   EXPECT_EQ(URLList(1, at, indexOf).hint(0), ItemHint::Unknown);
   EXPECT_EQ(URLList(1, at, indexOf, [](std::size_t) { return ItemHint::Folder; }).hint(0), ItemHint::Folder);
 }

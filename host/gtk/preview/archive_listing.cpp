@@ -13,7 +13,7 @@ namespace vaelo {
 
 namespace {
 
-constexpr std::size_t MostEntries = 100'000;
+constexpr std::size_t MostListedEntries = 100'000;
 constexpr std::int64_t LatestDate = 9'000'000'000;  // in the year 2255; what is said to be later isn't
 constexpr int MostLevels = 40;                      // what is deeper stands in one row with its path
 
@@ -120,7 +120,7 @@ std::uint32_t ArchiveListing::folder(std::uint32_t inside, std::string_view name
 
 // The containing folder itself when there is no more room.
 std::uint32_t ArchiveListing::append(std::uint32_t inside, Entry entry) {
-  if (entries_.size() >= MostEntries) {
+  if (entries_.size() >= MostListedEntries) {
     isFull_ = true;
     return inside;
   }

@@ -13,7 +13,7 @@ namespace {
 // Names in a compressed archive stand between all its content, which may be a day's work.
 constexpr gint64 ListingTakes = 15 * G_TIME_SPAN_SECOND;
 constexpr std::chrono::seconds AnswerTakes(10);
-constexpr int MostEntries = 1'000'000;  // of an answer
+constexpr int MostEntriesOfAnswer = 1'000'000;  // of an answer
 
 }  // namespace
 
@@ -45,7 +45,7 @@ void ArchiveLoad::received(DecoderProcess::Answer answer) {
   const std::string state = answer.text.substr(answer.text.find(' ') + 1);
   if (state == "more") {
     if (g_get_monotonic_time() >= until_) return finish(End::Slow);
-    entries_ += std::clamp(std::atoi(answer.text.c_str()), 0, MostEntries);
+    entries_ += std::clamp(std::atoi(answer.text.c_str()), 0, MostEntriesOfAnswer);
     askForMore();
     return events_.progress(entries_);
   }

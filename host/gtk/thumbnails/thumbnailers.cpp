@@ -42,7 +42,7 @@ std::string typeOf(const std::string& fileName) {
   return takeString(g_content_type_guess(fileName.c_str(), nullptr, 0, nullptr));
 }
 
-std::string filled(const std::string& word, const std::map<char, std::string>& values) {
+std::string withValues(const std::string& word, const std::map<char, std::string>& values) {
   std::string text;
   for (std::size_t i = 0; i < word.size(); ++i) {
     if (word[i] != '%' || i + 1 == word.size()) {
@@ -96,7 +96,7 @@ std::optional<std::vector<std::string>> Thumbnailers::commandFor(const std::stri
                                               {'s', std::to_string(pixels)},
                                               {'%', "%"}};
   std::vector<std::string> words;
-  for (const std::string& word : command->second) words.push_back(filled(word, values));
+  for (const std::string& word : command->second) words.push_back(withValues(word, values));
   return words;
 }
 
