@@ -45,7 +45,7 @@ void keepWithWidget(GtkWidget* widget, std::shared_ptr<void> token) {
 
 }  // namespace
 
-GtkWidget* makeBarItemWidget(const BarButtonItemRef& item) {
+GtkWidget* makeBarItemWidget(const BarButtonItemRef& item, const char* icon) {
   const std::optional<SystemItem>& system = item->systemItem();
   if (system == SystemItem::FlexibleSpace || system == SystemItem::FixedSpace) {
     GtkWidget* space = gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 0);
@@ -61,7 +61,7 @@ GtkWidget* makeBarItemWidget(const BarButtonItemRef& item) {
   // A text that is edited would end at the press and be taken, before Cancel is heard.
   gtk_widget_set_focus_on_click(button, FALSE);
   g_object_set_data(G_OBJECT(button), ItemKey, item.get());
-  const SystemLook look = system ? lookOf(*system) : SystemLook{nullptr, nullptr};
+  const SystemLook look = system ? lookOf(*system) : SystemLook{icon, icon ? item->title().c_str() : nullptr};
   if (look.icon) {
     gtk_button_set_icon_name(GTK_BUTTON(button), look.icon);
     gtk_widget_set_tooltip_text(button, look.label);

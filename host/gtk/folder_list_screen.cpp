@@ -12,13 +12,6 @@ namespace vaelo {
 
 namespace {
 
-GtkWidget* iconButton(const char* icon, const char* label) {
-  GtkWidget* button = gtk_button_new_from_icon_name(icon);
-  gtk_widget_set_tooltip_text(button, label);
-  gtk_accessible_update_property(GTK_ACCESSIBLE(button), GTK_ACCESSIBLE_PROPERTY_LABEL, label, -1);
-  return button;
-}
-
 int actionOf(ListCommand command) {
   switch (command) {
     case ListCommand::Rename:
@@ -50,7 +43,11 @@ std::string titleOf(const URL& folder, CloudDocuments& drive) {
 
 FolderListScreen::FolderListScreen(const URL& folder, CloudDocuments& drive, ScreenFactory& screens, DriveSyncedStore& tags,
                                    bool allContainers)
-    : DocumentListController(folder, allContainers), drive_(drive), screens_(screens), tags_(tags) {
+    : DocumentListController(folder, allContainers),
+      drive_(drive),
+      screens_(screens),
+      tags_(tags),
+      viewMode_([this](bool grid) { folderView().setMode(grid ? FolderView::Mode::Grid : FolderView::Mode::List); }) {
   setTitle(titleOf(folder, drive));
 }
 
@@ -219,21 +216,18 @@ void FolderListScreen::activated(FolderView& view, const std::string& name, cons
   }
 }
 
-std::vector<GtkWidget*> FolderListScreen::headerWidgets() {
-  GtkWidget* search = iconButton("system-search-symbolic", _("Search"));
+std::vector<GtkWidget*> FolderListScreen::headerWidgets(bool narrow) {
+  GtkWidget* search = gtk_button_new_from_icon_name("system-search-symbolic");
+  gtk_widget_set_tooltip_text(search, _("Search"));
+  gtk_accessible_update_property(GTK_ACCESSIBLE(search), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Search"), -1);
   gtk_actionable_set_action_name(GTK_ACTIONABLE(search), "win.search");
-  GtkWidget* mode = iconButton("view-grid-symbolic", _("View as grid"));
-  g_signal_connect(mode, "clicked", G_CALLBACK(+[](GtkButton* button, FolderListScreen* self) {
-                     FolderView& view = self->folderView();
-                     const bool grid = view.mode() != FolderView::Mode::Grid;
-                     view.setMode(grid ? FolderView::Mode::Grid : FolderView::Mode::List);
-                     const char* label = grid ? _("View as list") : _("View as grid");
-                     gtk_button_set_icon_name(button, grid ? "view-list-symbolic" : "view-grid-symbolic");
-                     gtk_widget_set_tooltip_text(GTK_WIDGET(button), label);
-                     gtk_accessible_update_property(GTK_ACCESSIBLE(button), GTK_ACCESSIBLE_PROPERTY_LABEL, label, -1);
-                   }),
-                   this);
-  return {mode, search};
+  if (narrow) return {search};
+  return {viewMode_.makeButton(), search};
+}
+
+const char* FolderListScreen::narrowIcon(const BarButtonItem& item) {
+  const bool selects = !item.systemItem() && &item == navigationItem().rightBarButtonItem().get();
+  return selects ? "selection-mode-symbolic" : nullptr;
 }
 
 bool FolderListScreen::toggleSearch() {

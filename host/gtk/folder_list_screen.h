@@ -8,6 +8,7 @@
 #include "host/gtk/folder_search.h"
 #include "host/gtk/host_screen.h"
 #include "host/gtk/list/folder_view.h"
+#include "host/gtk/view_mode_switch.h"
 #include "platform/cloud_documents.h"
 #include "platform/ui/document_list_controller.h"
 #include "platform/ui/screen_factory.h"
@@ -25,7 +26,9 @@ class FolderListScreen : public DocumentListController, public HostScreen {
   ~FolderListScreen() override;
 
   GtkWidget* contentWidget() override;
-  std::vector<GtkWidget*> headerWidgets() override;
+  std::vector<GtkWidget*> headerWidgets(bool narrow) override;
+  GActionGroup* narrowActions() override { return viewMode_.actions(); }
+  const char* narrowIcon(const BarButtonItem& item) override;
   bool toggleSearch() override;
   bool closeSearch() override;
   void refresh() override { folderView().refresh(); }
@@ -66,6 +69,7 @@ class FolderListScreen : public DocumentListController, public HostScreen {
   CloudDocuments& drive_;
   ScreenFactory& screens_;
   DriveSyncedStore& tags_;
+  ViewModeSwitch viewMode_;
   std::unique_ptr<FolderView> view_;
   std::unique_ptr<FolderView> results_;
   GtkWidget* content_ = nullptr;

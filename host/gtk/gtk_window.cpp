@@ -8,6 +8,7 @@
 #include "host/gtk/folder_picker.h"
 #include "host/gtk/host_dialog.h"
 #include "host/gtk/host_screen.h"
+#include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
 #include "platform/platform.h"
 #include "platform/ui/document_list_controller.h"
@@ -30,6 +31,9 @@ GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds, Dr
   gtk_overlay_set_child(GTK_OVERLAY(overlay_), stack_.widget());
   adw_toast_overlay_set_child(ADW_TOAST_OVERLAY(toasts_), overlay_);
   adw_application_window_set_content(window_, toasts_);
+  const GRef<GMenuItem> grid(g_menu_item_new(_("View as _Grid"), "narrow.grid"));
+  g_menu_item_set_attribute(grid.get(), "hidden-when", "s", "action-missing");
+  g_menu_append_item(menu_, grid.get());
   g_menu_append(menu_, _("Select _All"), "win.select-all");
   g_menu_append(menu_, _("_Refresh"), "win.refresh");
   g_menu_append(menu_, _("A_ccounts…"), "app.accounts");

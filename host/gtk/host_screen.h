@@ -8,6 +8,7 @@
 
 namespace vaelo {
 
+class BarButtonItem;
 class SearchController;
 
 /// The widgets that a screen of the host's own brings along. Main thread.
@@ -16,8 +17,13 @@ class HostScreen {
   virtual ~HostScreen() = default;
   /// What fills the page between its bars; made on first use, owned by the screen.
   virtual GtkWidget* contentWidget() = 0;
-  /// Widgets for the end of the header bar, from the outer edge inwards; made anew for each call.
-  virtual std::vector<GtkWidget*> headerWidgets() { return {}; }
+  /// Widgets for the end of the header bar, from the outer edge inwards; made anew for each call. On a narrow window what
+  /// narrowActions() has needs none.
+  virtual std::vector<GtkWidget*> headerWidgets(bool /*narrow*/) { return {}; }
+  /// What is chosen from the window's menu where the window is too narrow for more buttons; null for nothing.
+  virtual GActionGroup* narrowActions() { return nullptr; }
+  /// The icon that stands for a button's title there; null when the title stands.
+  virtual const char* narrowIcon(const BarButtonItem& /*item*/) { return nullptr; }
   /// The user went to the page's own search, or left it: Ctrl+F, and Escape. False when there is nothing to do.
   virtual bool toggleSearch() { return false; }
   virtual bool closeSearch() { return false; }

@@ -11,6 +11,10 @@
 
 namespace vaelo {
 
+namespace {
+constexpr const char* NarrowActions = "narrow";
+}
+
 ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, GMenuModel* menu, DriveSyncedStore& tags)
     : screen_(std::move(screen)),
       hostScreen_(dynamic_cast<HostScreen*>(screen_.get())),
@@ -18,8 +22,11 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
       header_(adw_header_bar_new()),
       title_(adw_window_title_new(nullptr, nullptr)),
       back_(gtk_button_new_from_icon_name("go-previous-symbolic")),
+      toolbarEdge_(gtk_separator_new(GTK_ORIENTATION_HORIZONTAL)),
       toolbar_(gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 6)),
       goBack_(std::move(goBack)) {
+  // What is in the page looks for its actions here only if this has had a place for them from the beginning.
+  gtk_widget_insert_action_group(box_, NarrowActions, nullptr);
   adw_header_bar_set_title_widget(ADW_HEADER_BAR(header_), title_);
   // A title exactly in the middle would need as much room on its other side as the buttons take: more than a phone has.
   adw_header_bar_set_centering_policy(ADW_HEADER_BAR(header_), ADW_CENTERING_POLICY_LOOSE);
@@ -31,13 +38,14 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
     GtkWidget* button = gtk_menu_button_new();
     gtk_menu_button_set_icon_name(GTK_MENU_BUTTON(button), "open-menu-symbolic");
     gtk_menu_button_set_menu_model(GTK_MENU_BUTTON(button), menu);
+    gtk_menu_button_set_primary(GTK_MENU_BUTTON(button), TRUE);  // F10 opens it
     gtk_widget_set_tooltip_text(button, _("Main Menu"));
     gtk_accessible_update_property(GTK_ACCESSIBLE(button), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Main Menu"), -1);
     adw_header_bar_pack_end(ADW_HEADER_BAR(header_), button);
   }
   gtk_box_append(GTK_BOX(box_), header_);
   if (hostScreen_) {
-    for (GtkWidget* widget : hostScreen_->headerWidgets()) adw_header_bar_pack_end(ADW_HEADER_BAR(header_), widget);
+    showHostWidgets();
     GtkWidget* content = hostScreen_->contentWidget();
     gtk_widget_set_vexpand(content, TRUE);
     gtk_box_append(GTK_BOX(box_), content);
@@ -55,6 +63,7 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
   }
   gtk_widget_add_css_class(toolbar_, "toolbar");
   gtk_widget_set_size_request(toolbar_, -1, 46);
+  gtk_box_append(GTK_BOX(box_), toolbarEdge_);
   gtk_box_append(GTK_BOX(box_), toolbar_);
 
   barToken_ = screen_->navigationItem().changed().connect([this](NavigationItem&) { showBar(); });
@@ -88,7 +97,14 @@ void ScreenPage::setToolbarHidden(bool hidden) {
 }
 
 void ScreenPage::setNarrow(bool narrow) {
+  if (narrow == narrow_) return;
+  narrow_ = narrow;
   adw_header_bar_set_decoration_layout(ADW_HEADER_BAR(header_), narrow ? ":close" : nullptr);
+  if (!hostScreen_) return;
+  // The menu hides what it finds no action for.
+  gtk_widget_insert_action_group(box_, NarrowActions, narrow ? hostScreen_->narrowActions() : nullptr);
+  showHostWidgets();
+  showBar();
 }
 
 void ScreenPage::setBanner(GtkWidget* banner) { gtk_box_insert_child_after(GTK_BOX(box_), banner, header_); }
@@ -106,11 +122,19 @@ void ScreenPage::refresh() {
   if (preview_) preview_->refresh();
 }
 
+void ScreenPage::showHostWidgets() {
+  for (GtkWidget* widget : hostWidgets_) adw_header_bar_remove(ADW_HEADER_BAR(header_), widget);
+  hostWidgets_ = hostScreen_->headerWidgets(narrow_);
+  for (GtkWidget* widget : hostWidgets_) adw_header_bar_pack_end(ADW_HEADER_BAR(header_), widget);
+}
+
 void ScreenPage::showBar() {
   NavigationItem& item = screen_->navigationItem();
   adw_window_title_set_title(ADW_WINDOW_TITLE(title_), item.title().c_str());
   const bool leftTakesPlace = !item.leftBarButtonItems().empty() && !item.leftItemsSupplementBackButton();
   gtk_widget_set_visible(back_, canGoBack_ && !item.hidesBackButton() && !leftTakesPlace);
+  // Who selects on a phone needs the room to read how many.
+  for (GtkWidget* widget : hostWidgets_) gtk_widget_set_visible(widget, !narrow_ || !item.hidesBackButton());
   for (GtkWidget* widget : barWidgets_) adw_header_bar_remove(ADW_HEADER_BAR(header_), widget);
   barWidgets_.clear();
   for (const BarButtonItemRef& left : item.leftBarButtonItems()) {
@@ -118,7 +142,8 @@ void ScreenPage::showBar() {
     adw_header_bar_pack_start(ADW_HEADER_BAR(header_), barWidgets_.back());
   }
   for (const BarButtonItemRef& right : item.rightBarButtonItems()) {
-    barWidgets_.push_back(makeBarItemWidget(right));
+    const char* icon = narrow_ && hostScreen_ ? hostScreen_->narrowIcon(*right) : nullptr;
+    barWidgets_.push_back(makeBarItemWidget(right, icon));
     adw_header_bar_pack_end(ADW_HEADER_BAR(header_), barWidgets_.back());
   }
   for (GtkWidget* widget : preview_ ? preview_->headerWidgets() : std::vector<GtkWidget*>()) {
@@ -130,7 +155,8 @@ void ScreenPage::showBar() {
 void ScreenPage::showToolbar() {
   while (GtkWidget* child = gtk_widget_get_first_child(toolbar_)) gtk_box_remove(GTK_BOX(toolbar_), child);
   for (const BarButtonItemRef& item : screen_->toolbarItems()) gtk_box_append(GTK_BOX(toolbar_), makeBarItemWidget(item));
-  gtk_widget_set_visible(toolbar_, !toolbarHidden_ && !screen_->toolbarItems().empty());
+  const bool shows = !toolbarHidden_ && !screen_->toolbarItems().empty();
+  for (GtkWidget* widget : {toolbarEdge_, toolbar_}) gtk_widget_set_visible(widget, shows);
 }
 
 }  // namespace vaelo

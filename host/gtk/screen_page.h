@@ -40,10 +40,12 @@ class ScreenPage {
   void setBanner(GtkWidget* banner);
   void setCanGoBack(bool can);
   void setToolbarHidden(bool hidden);
-  /// On a narrow window the title needs the room of the buttons that a phone's windows don't have.
+  /// On a narrow window the title needs the room of the buttons that a phone's windows don't have, and of those that can
+  /// be in the menu.
   void setNarrow(bool narrow);
 
  private:
+  void showHostWidgets();
   void showBar();
   void showToolbar();
 
@@ -53,13 +55,16 @@ class ScreenPage {
   GtkWidget* header_;
   GtkWidget* title_;
   GtkWidget* back_;
+  GtkWidget* toolbarEdge_;
   GtkWidget* toolbar_;
+  std::vector<GtkWidget*> hostWidgets_;
   std::vector<GtkWidget*> barWidgets_;
   std::function<void()> goBack_;
   std::unique_ptr<PreviewPage> preview_;
   std::unique_ptr<ViewMirror> mirror_;  // of a screen that has neither content nor a preview
   std::unique_ptr<DetailsTags> tags_;
   bool canGoBack_ = false;
+  bool narrow_ = false;
   bool toolbarHidden_ = true;
   std::shared_ptr<void> barToken_;
   std::shared_ptr<void> screenToken_;

@@ -135,14 +135,17 @@ class App:
 
     def show_window(self, size):
         self.window = wait_for("the window", self.find_window).split()[0]
+        self.resize(*size)
+        self.desktop.tool("xdotool", "windowmove", self.window, "0", "0")
+
+    def resize(self, width, height):
         # A window that is narrow takes less room in its header bar, and may be narrower still.
         for _ in range(10):
-            self.desktop.tool("xdotool", "windowsize", self.window, str(size[0]), str(size[1]))
+            self.desktop.tool("xdotool", "windowsize", self.window, str(width), str(height))
             pause(0.1)
             geometry = self.desktop.tool("xdotool", "getwindowgeometry", self.window)
-            if f"Geometry: {size[0]}x{size[1]}" in geometry:
+            if f"Geometry: {width}x{height}" in geometry:
                 break
-        self.desktop.tool("xdotool", "windowmove", self.window, "0", "0")
 
     def find_window(self):
         if self.process.poll() is not None:

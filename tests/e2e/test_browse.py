@@ -141,6 +141,61 @@ class Browse(unittest.TestCase):
         self.app.wait("Café.txt", "list item")
 
 
+class Narrow(unittest.TestCase):
+    """On a phone the title keeps the room that buttons would take; they are in the menu as long as the window is narrow."""
+
+    def setUp(self):
+        def prepare(app):
+            app.drive.mkdir(parents=True)
+            (app.data / "account.ini").write_text("[Account]\nName=x\nToken=ab\nSignedIn=true\n")
+            for name in ("One.txt", "Two.txt"):
+                (app.drive / name).touch()
+        self.app = App(size=(360, 720), prepare=prepare)
+        self.addCleanup(self.app.close)
+        self.app.wait("Two.txt")
+
+    def are_side_by_side(self):
+        one, two = self.app.find("One.txt"), self.app.find("Two.txt")
+        return one and two and one[3] == two[3]
+
+    def test_the_grid_is_chosen_from_the_menu(self):
+        app = self.app
+        self.assertIsNone(app.find("View as grid"))
+        self.assertFalse(self.are_side_by_side())
+        app.click("Main Menu")
+        app.wait("View as Grid", "menu item")
+        app.key("g")
+        wait_for("the icons", self.are_side_by_side)
+        app.resize(800, 640)
+        app.wait("View as list", "push button")
+        app.click("View as list", "push button")
+        wait_for("the rows", lambda: app.find("One.txt") and not self.are_side_by_side())
+        app.click("Main Menu")
+        app.wait("Refresh", "menu item")
+        self.assertIsNone(app.find("View as Grid"), "the header bar has it")
+        app.key("Escape")
+        app.wait_gone("Refresh")
+        app.resize(360, 720)
+        app.wait_gone("View as grid")
+        app.key("F10")
+        app.wait("View as Grid", "menu item")
+        app.key("g")
+        wait_for("the icons again", self.are_side_by_side)
+
+    def test_selecting_is_an_icon_with_a_name(self):
+        app = self.app
+        self.assertIsNone(app.find("Select", "label"))
+        app.click("Select", "push button")
+        app.wait_title("Select Items")
+        self.assertIsNone(app.find("Search", "push button"), "the count of what is selected has the room")
+        app.click("Two.txt")
+        app.wait_title("1 Item Selected")
+        app.click("Cancel", "push button")
+        app.wait("Search", "push button")
+        app.resize(800, 640)
+        app.wait("Select", "label")
+
+
 class Links(unittest.TestCase):
     def setUp(self):
         self.app = App(demo=True)

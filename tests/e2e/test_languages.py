@@ -12,7 +12,7 @@ from harness import PROGRAM, App, wait_for
 
 
 class Languages(unittest.TestCase):
-    def open(self, **environment):
+    def open(self, size=(800, 640), **environment):
         def prepare(app):
             app.drive.mkdir(parents=True)
             (app.data / "account.ini").write_text("[Account]\nName=x\nToken=ab\nSignedIn=true\n")
@@ -22,7 +22,7 @@ class Languages(unittest.TestCase):
             (app.drive / "Big.bin").touch()
             with (app.drive / "Big.bin").open("wb") as big:
                 big.truncate(1250000)
-        self.app = App(size=(800, 640), prepare=prepare, **environment)
+        self.app = App(size=size, prepare=prepare, **environment)
         self.addCleanup(self.app.close)
         self.app.wait("Report.txt", "list item")
         return self.app
@@ -100,6 +100,20 @@ class Languages(unittest.TestCase):
         self.assertGreater(back[2], 700, "the way back is on the right")
         app.click("ارجع", "push button")
         app.wait("Report.txt", "list item")
+
+    def test_a_phone_shows_the_whole_title_in_every_language(self):
+        def width(app):
+            return wait_for("the title", lambda: [row for row in app.accessibility.showing()
+                                                  if row[:2] == ("label", "Vaelo Drive") and row[3] < 46])[0][4]
+        for language in ("en", "de", "fr", "ar", "ru", "ja"):
+            with self.subTest(language):
+                app = self.open(size=(360, 720), LANGUAGE=language)
+                geometry = app.desktop.tool("xdotool", "getwindowgeometry", app.window)
+                self.assertIn("Geometry: 360x720", geometry)
+                narrow = width(app)
+                app.resize(800, 640)
+                wait_for("the wide window", lambda: app.find("Vaelo Drive", "frame")[4] > 700)
+                self.assertEqual(narrow, width(app), "cut where it is narrow")
 
     def test_the_first_language_of_several_that_is_there(self):
         app = self.open(LANGUAGE="he:en_GB:de")

@@ -44,8 +44,9 @@ class BadInputListTest : public testing::Test {
   }
   GtkWidget* firstRow() const {
     GtkWidget* scroller = gtk_stack_get_visible_child(GTK_STACK(view_->widget()));
-    GtkWidget* list =
+    GtkWidget* clamp =
         GTK_IS_SCROLLED_WINDOW(scroller) ? gtk_scrolled_window_get_child(GTK_SCROLLED_WINDOW(scroller)) : nullptr;
+    GtkWidget* list = clamp ? adw_clamp_scrollable_get_child(ADW_CLAMP_SCROLLABLE(clamp)) : nullptr;
     GtkWidget* item = list ? gtk_widget_get_first_child(list) : nullptr;
     return item ? gtk_widget_get_first_child(item) : nullptr;
   }

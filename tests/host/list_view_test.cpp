@@ -49,7 +49,10 @@ class FolderViewTest : public testing::Test {
     return result;
   }
   GtkWidget* shownPage() const { return gtk_stack_get_visible_child(GTK_STACK(view_->widget())); }
-  GtkWidget* list() const { return gtk_scrolled_window_get_child(GTK_SCROLLED_WINDOW(shownPage())); }
+  GtkWidget* list() const {
+    GtkWidget* clamp = gtk_scrolled_window_get_child(GTK_SCROLLED_WINDOW(shownPage()));
+    return adw_clamp_scrollable_get_child(ADW_CLAMP_SCROLLABLE(clamp));
+  }
 
   TestFolder folder_;
   GtkWidget* window_ = nullptr;
@@ -167,6 +170,20 @@ TEST_F(FolderViewTest, GridShowsTheSameRows) {
     FolderItem* item = view_->model().liveItem("file 0");
     return item && item->details;
   }));
+}
+
+TEST_F(FolderViewTest, RowsFillANarrowWindowAndStandInTheMiddleOfAWideOne) {
+  folder_.write("file");
+  open();
+  const auto place = [this] {
+    graphene_rect_t bounds;
+    return gtk_widget_compute_bounds(list(), view_->widget(), &bounds) ? bounds : *graphene_rect_zero();
+  };
+  gtk_widget_set_size_request(view_->widget(), 600, 400);
+  EXPECT_TRUE(waitUntil([&] { return place().size.width == 600; })) << place().size.width;
+  gtk_widget_set_size_request(view_->widget(), 1200, 400);
+  EXPECT_TRUE(waitUntil([&] { return place().size.width == 840; })) << place().size.width;
+  EXPECT_EQ(place().origin.x, 180);
 }
 
 TEST_F(FolderViewTest, ScrollsToRowsFarAway) {

@@ -13,6 +13,9 @@ namespace {
 
 constexpr guint SpinnerMilliseconds = 250;
 constexpr gint64 PullPause = G_USEC_PER_SEC;
+// Wider rows are read with effort, from their name at one end to their sign at the other.
+constexpr int WidestRows = 840;
+constexpr int WidestGrid = 1600;
 
 const char* reasonOf(int errorNumber) {
   switch (errorNumber) {
@@ -83,7 +86,7 @@ FolderView::~FolderView() {
   g_signal_handlers_disconnect_by_data(list_, this);
   swipe_.reset();
   markDrag_.reset();
-  gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scroller_), nullptr);
+  adw_clamp_scrollable_set_child(clamp_, nullptr);
   folderRowsPart(context_);
   g_object_unref(pages_);
 }
@@ -98,6 +101,9 @@ void FolderView::makePages() {
                      self->refresh();
                    }),
                    this);
+  clamp_ = ADW_CLAMP_SCROLLABLE(adw_clamp_scrollable_new());
+  gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scroller_), GTK_WIDGET(clamp_));
+  gtk_widget_add_css_class(scroller_, "view");  // what is beside the rows looks as they do
   const auto look = [](FolderView* self) { folderRowsScrolled(self->context_); };
   g_signal_connect_swapped(adjustment(), "value-changed", G_CALLBACK(+look), this);
   g_signal_connect_swapped(adjustment(), "value-changed", G_CALLBACK(+[](FolderView* self) { self->swipe_->close(); }),
@@ -140,7 +146,10 @@ void FolderView::makeList() {
   g_signal_connect_swapped(list_, "activate", G_CALLBACK(+press), this);
   context_.list = list_;
   setRubberband();
-  gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scroller_), list_);
+  const int widest = context_.grid ? WidestGrid : WidestRows;
+  adw_clamp_scrollable_set_maximum_size(clamp_, widest);
+  adw_clamp_scrollable_set_tightening_threshold(clamp_, widest);
+  adw_clamp_scrollable_set_child(clamp_, list_);
 }
 
 void FolderView::setMode(Mode mode) {

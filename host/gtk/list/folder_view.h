@@ -157,6 +157,7 @@ class FolderView {
 
   GtkStack* pages_;
   GtkWidget* scroller_;
+  AdwClampScrollable* clamp_;
   GtkWidget* list_ = nullptr;
   GtkWidget* spinner_;
   AdwStatusPage* emptyPage_;
