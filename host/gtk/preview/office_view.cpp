@@ -50,14 +50,16 @@ class OfficeView : public DocumentView {
   OfficeView(const PreviewedDocument& document, DocumentViewEvents events)
       : document_(document), events_(std::move(events)), bin_(GTK_WIDGET(g_object_ref_sink(adw_bin_new()))) {
     convert();
-    progress_ = g_idle_add(
+    // Not as an idle source: a conversion that is quick would be first.
+    progress_ = g_idle_add_full(
+        G_PRIORITY_DEFAULT,
         +[](gpointer data) -> gboolean {
           auto* self = static_cast<OfficeView*>(data);
           self->progress_ = 0;
           self->events_.progress(_("Preparing the document to be shown"));
           return G_SOURCE_REMOVE;
         },
-        this);
+        this, nullptr);
   }
 
   ~OfficeView() override {

@@ -91,7 +91,8 @@ class TextView : public DocumentView {
   bool closeFind() override { return find_.close(); }
 
  private:
-  // What counts the lines keeps the view, which keeps it: neither would ever go by itself.
+  // What counts the lines keeps the view, which keeps it: neither would ever go by itself. So does what it knew of the lines
+  // when it was painted last, of which it lets go when it is painted with nothing to be painted.
   void dropLineNumbers() {
     GtkSourceGutter* gutter = gtk_source_view_get_gutter(GTK_SOURCE_VIEW(view_), GTK_TEXT_WINDOW_LEFT);
     GtkWidget* next = nullptr;
@@ -99,7 +100,8 @@ class TextView : public DocumentView {
       next = gtk_widget_get_next_sibling(each);
       if (GTK_SOURCE_IS_GUTTER_RENDERER(each)) gtk_source_gutter_remove(gutter, GTK_SOURCE_GUTTER_RENDERER(each));
     }
-    g_object_run_dispose(G_OBJECT(view_));
+    const GRef<GtkSnapshot> nothing(gtk_snapshot_new());
+    GTK_WIDGET_GET_CLASS(gutter)->snapshot(GTK_WIDGET(gutter), nothing.get());
   }
 
   // A document read anew takes the old one's place when what the user looks at is there.
