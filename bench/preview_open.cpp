@@ -11,9 +11,11 @@
 
 #include "bench/preview_samples.h"
 #include "bench/preview_window.h"
+#include "host/gtk/cairo_texture.h"
 
 namespace {
 
+using vaelo::takeCairoTexture;
 using vaelo::bench::PreviewWindow;
 
 GtkWidget* photograph(const std::string& path) {
@@ -41,14 +43,9 @@ GtkWidget* firstPage(const std::string& path) {
   cairo_scale(cairo, width / pageWidth, width / pageWidth);
   poppler_page_render(page, cairo);
   cairo_destroy(cairo);
-  cairo_surface_flush(surface);
-  const auto stride = static_cast<gsize>(cairo_image_surface_get_stride(surface));
-  GBytes* pixels = g_bytes_new(cairo_image_surface_get_data(surface), stride * static_cast<gsize>(height));
-  GdkTexture* texture = gdk_memory_texture_new(width, height, GDK_MEMORY_DEFAULT, pixels, stride);
+  GdkTexture* texture = takeCairoTexture(surface);
   GtkWidget* widget = gtk_picture_new_for_paintable(GDK_PAINTABLE(texture));
   g_object_unref(texture);
-  g_bytes_unref(pixels);
-  cairo_surface_destroy(surface);
   g_object_unref(page);
   g_object_unref(document);
   g_free(address);

@@ -4,6 +4,7 @@
 #include <cmath>
 #include <numbers>
 
+#include "host/gtk/cairo_texture.h"
 #include "host/support/glib_ptr.h"
 
 namespace vaelo {
@@ -138,13 +139,7 @@ ImageRef PangoGraphics::renderImage(const Size& size, const std::function<void(D
   cairo_t* cairo = cairo_create(surface);
   drawWithCairo(cairo, draw);
   cairo_destroy(cairo);
-  cairo_surface_flush(surface);
-  const auto stride = static_cast<gsize>(cairo_image_surface_get_stride(surface));
-  GBytes* bytes = g_bytes_new(cairo_image_surface_get_data(surface), stride * static_cast<gsize>(height));
-  GdkTexture* texture = gdk_memory_texture_new(width, height, GDK_MEMORY_DEFAULT, bytes, stride);
-  g_bytes_unref(bytes);
-  cairo_surface_destroy(surface);
-  return std::make_shared<GtkImageData>(GDK_PAINTABLE(texture), size.width, size.height);
+  return std::make_shared<GtkImageData>(GDK_PAINTABLE(takeCairoTexture(surface)), size.width, size.height);
 }
 
 ImageRef PangoGraphics::documentIcon(const std::string& fileName, const std::optional<std::string>&, IconFormat format) {

@@ -6,6 +6,7 @@
 #include <algorithm>
 #include <cmath>
 
+#include "host/gtk/cairo_texture.h"
 #include "host/gtk/pango_graphics.h"
 #include "host/support/glib_ptr.h"
 
@@ -44,13 +45,7 @@ GdkPaintable* magnified(GdkTexture* texture, int times) {
   cairo_paint(cairo);
   cairo_destroy(cairo);
   cairo_surface_destroy(small);
-  cairo_surface_flush(large);
-  const auto stride = static_cast<gsize>(cairo_image_surface_get_stride(large));
-  GBytes* bytes = g_bytes_new(cairo_image_surface_get_data(large), stride * static_cast<gsize>(height * times));
-  GdkTexture* made = gdk_memory_texture_new(width * times, height * times, GDK_MEMORY_DEFAULT, bytes, stride);
-  g_bytes_unref(bytes);
-  cairo_surface_destroy(large);
-  return GDK_PAINTABLE(made);
+  return GDK_PAINTABLE(takeCairoTexture(large));
 }
 
 /// How many times larger than its pixels the picture is shown, rounded up; 1 where it is not to be shown crisp.
