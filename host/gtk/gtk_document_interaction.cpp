@@ -59,6 +59,11 @@ bool GtkDocumentInteraction::presentOptionsMenuFromBarButtonItem(const BarButton
   return present({findBarItemWidget(GTK_WIDGET(window->widget()), *item), std::nullopt});
 }
 
+bool GtkDocumentInteraction::presentOpenInMenu() {
+  const auto window = window_.lock();
+  return window && makeActions(window)->chooseApplication();
+}
+
 bool GtkDocumentInteraction::openInPlaceWith(const ApplicationRecord& application) {
   const auto window = window_.lock();
   return window && makeActions(window)->openWithApplication(application);

@@ -26,6 +26,7 @@ class GtkDocumentInteraction : public DocumentInteractionController {
   }
   bool presentOptionsMenuFromRect(const Rect& rect, const ViewRef& view, bool animated) override;
   bool presentOptionsMenuFromBarButtonItem(const BarButtonItemRef& item, bool animated) override;
+  bool presentOpenInMenu() override;
   bool openInPlaceWith(const ApplicationRecord& application) override;
 
  private:

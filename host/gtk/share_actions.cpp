@@ -128,10 +128,11 @@ bool ShareActions::openWithApplication(const ApplicationRecord& application) {
   return false;
 }
 
-void ShareActions::chooseApplication() {
+bool ShareActions::chooseApplication() {
   const auto window = window_.lock();
-  if (!window || !hasContent()) return;
+  if (!window || !hasContent()) return false;
   chooseApplicationFor(item_.name, window->widget(), [self = shared_from_this()](GAppInfo* app) { self->openWith(app); });
+  return true;
 }
 
 void ShareActions::sendByMail() {

@@ -28,10 +28,11 @@ class ShareActions : public std::enable_shared_from_this<ShareActions> {
   /// Starts the application on the item, with a notice in the window. False when it could not be, which was told.
   bool openWith(GAppInfo* app);
   bool openWithApplication(const ApplicationRecord& application);
+  /// Lets the user choose the application. False when the content is not here, which was told.
+  bool chooseApplication();
 
  private:
   void addApplicationRows(std::vector<ShareRow>& rows);
-  void chooseApplication();
   void sendByMail();
   void sendByBluetooth();
   void copyFile();

@@ -29,6 +29,9 @@ class DocumentInteractionController {
   /// False when there is nothing to offer.
   virtual bool presentOptionsMenuFromRect(const Rect& rect, const ViewRef& view, bool animated) = 0;
   virtual bool presentOptionsMenuFromBarButtonItem(const BarButtonItemRef& item, bool animated) = 0;
+  /// Lets the user choose among all applications, and opens the document itself in the chosen one. False when there is
+  /// nothing to open.
+  virtual bool presentOpenInMenu() = 0;
   /// Hands the document itself, not a copy, to the application. True when it was started.
   virtual bool openInPlaceWith(const ApplicationRecord& application) = 0;
 };

@@ -122,12 +122,24 @@ class Wide(Share):
     def test_any_application_can_be_chosen(self):
         self.share()
         self.choose("Open With Another Application…")
-        self.app.wait("Post", "list item")
+        self.choose_application("Post")
+        self.assertEqual(self.record("org.example.Post"), [str(self.document)])
+
+    def choose_application(self, name):
+        self.app.wait(name, "list item")
         wait_for("the window of applications to have the focus", lambda: "Open With" in subprocess.run(
             ["xdotool", "getwindowfocus", "getwindowname"], env=self.app.desktop.environment, capture_output=True, text=True).stdout)
         names = [row[1] for row in self.app.accessibility.showing() if row[0] == "list item"]
-        self.app.key(*["Down"] * names.index("Post"), "Return")
-        self.assertEqual(self.record("org.example.Post"), [str(self.document)])
+        self.app.key(*["Down"] * names.index(name), "Return")
+
+    def test_a_document_that_is_not_shown_opens_in_any_application(self):
+        document = self.app.drive / "Documents" / "Data.bin"
+        document.write_bytes(bytes(range(256)))
+        self.open("Documents/Data.bin")
+        self.app.click("Open With Another Application", "push button")
+        self.choose_application("Post")
+        self.assertEqual(self.record("org.example.Post"), [str(document)])
+        self.app.wait("Opening “Data.bin” in Post…")
 
     def test_attaches_to_a_message(self):
         self.share()

@@ -47,6 +47,10 @@ class MemoryDocumentInteraction : public DocumentInteractionController {
     fromButton = item;
     return hasSomethingToOffer;
   }
+  bool presentOpenInMenu() override {
+    record_.calls.push_back("open in " + url_.path());
+    return hasSomethingToOffer;
+  }
   bool openInPlaceWith(const ApplicationRecord& application) override {
     record_.calls.push_back("open " + url_.path() + " with " + application.bundleIdentifier);
     return opens;

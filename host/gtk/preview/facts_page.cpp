@@ -6,6 +6,7 @@
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
 #include "platform/platform.h"
+#include "platform/ui/screen_factory.h"
 
 namespace vaelo {
 
@@ -28,29 +29,6 @@ ResourceMap valuesOf(const URL& item) {
 
 bool isHere(const ResourceMap& values) {
   return textOf(values, ResourceKey::DownloadingStatus) != DownloadingStatusNotDownloaded;
-}
-
-void tellFailure(GtkWindow* parent, const std::string& name, const std::string& reason) {
-  GtkWidget* dialog = adw_message_dialog_new(parent, filled(_("“%s” couldn’t be opened."), {name}).c_str(), reason.c_str());
-  adw_message_dialog_add_response(ADW_MESSAGE_DIALOG(dialog), "ok", _("OK"));
-  gtk_window_present(GTK_WINDOW(dialog));
-}
-
-void applicationChosen(GtkDialog* dialog, int response, gpointer) {
-  if (response == GTK_RESPONSE_OK) {
-    const GRef<GAppInfo> app(gtk_app_chooser_get_app_info(GTK_APP_CHOOSER(dialog)));
-    GFile* file = nullptr;
-    g_object_get(dialog, "gfile", &file, nullptr);
-    const GRef<GFile> chosen(file);
-    GList files{file, nullptr, nullptr};
-    const GRef<GdkAppLaunchContext> context(gdk_display_get_app_launch_context(gtk_widget_get_display(GTK_WIDGET(dialog))));
-    GError* error = nullptr;
-    if (app && !g_app_info_launch(app.get(), &files, G_APP_LAUNCH_CONTEXT(context.get()), &error)) {
-      const GErrorPtr owned(error);
-      tellFailure(gtk_window_get_transient_for(GTK_WINDOW(dialog)), takeString(g_file_get_basename(file)), error->message);
-    }
-  }
-  gtk_window_destroy(GTK_WINDOW(dialog));
 }
 
 }  // namespace
@@ -188,11 +166,6 @@ void FactsPage::progressChanged(const std::shared_ptr<Progress>& progress) {
   gtk_accessible_update_property(GTK_ACCESSIBLE(bar_), GTK_ACCESSIBLE_PROPERTY_LABEL, text.c_str(), -1);
 }
 
-void FactsPage::openElsewhere() {
-  const GRef<GFile> file(g_file_new_for_path(path_.c_str()));
-  GtkWidget* chooser = gtk_app_chooser_dialog_new(GTK_WINDOW(gtk_widget_get_root(page_)), GTK_DIALOG_MODAL, file.get());
-  g_signal_connect(chooser, "response", G_CALLBACK(applicationChosen), nullptr);
-  gtk_window_present(GTK_WINDOW(chooser));
-}
+void FactsPage::openElsewhere() { Platform::current().screens.makeDocumentInteraction(URL(path_))->presentOpenInMenu(); }
 
 }  // namespace vaelo
