@@ -16,8 +16,9 @@ int main(int argc, char** argv) {
   vaelo::bench::writePortableDocument(folder.pathOf("document.pdf"), 12);
   vaelo::bench::writeText(folder.pathOf("text.txt"), std::size_t{100} * 1024);
   vaelo::bench::writeText(folder.pathOf("notes.md"), std::size_t{20} * 1024);
+  vaelo::bench::writeText(folder.pathOf("source.cpp"), std::size_t{100} * 1024);
   std::vector<std::string> paths = {folder.pathOf("photograph.jpg"), folder.pathOf("document.pdf"),
-                                    folder.pathOf("text.txt"), folder.pathOf("notes.md")};
+                                    folder.pathOf("text.txt"), folder.pathOf("notes.md"), folder.pathOf("source.cpp")};
   if (argc > 2) paths = {folder.pathOf(argv[2])};
   const auto point = [&](int from, int to) {
     for (int i = from; i < to; ++i) window->show(paths[static_cast<std::size_t>(i) % paths.size()]);

@@ -2,6 +2,7 @@
 #include <gtest/gtest.h>
 
 #include "host/gtk/preview/text_decoding.h"
+#include "host/gtk/preview/text_languages.h"
 #include "host/gtk/preview/text_lines.h"
 #include "host/gtk/preview/text_load.h"
 #include "host/support/decoder_error.h"
@@ -168,6 +169,34 @@ TEST_F(TextLoadTest, SourceIsAnalysedUnlessItsLinesAreLong) {
   load("a.txt", usual);
   ASSERT_TRUE(waitUntil([this] { return load_->finished(); }));
   EXPECT_FALSE(load_->isSource());
+}
+
+// The library takes as long to forget a highlighted text at once as to highlight it.
+TEST_F(TextLoadTest, WhatIsLeftGoesBitByBit) {
+  std::string many;
+  while (many.size() < 3'000'000) many += "function add(a, b) { return a + b; }\n";
+  load("a.js", many);
+  ASSERT_TRUE(waitUntil([this] { return load_->finished(); }));
+  GtkTextBuffer* buffer = GTK_TEXT_BUFFER(load_->buffer());
+  g_object_add_weak_pointer(G_OBJECT(buffer), reinterpret_cast<gpointer*>(&buffer));
+  const int whole = gtk_text_buffer_get_char_count(buffer);
+  load_.reset();
+  ASSERT_NE(buffer, nullptr);
+  ASSERT_TRUE(waitUntil([&] { return !buffer || gtk_text_buffer_get_char_count(buffer) < whole; }));
+  EXPECT_NE(buffer, nullptr) << "not at once";
+  EXPECT_TRUE(waitUntil([&] { return !buffer; }));
+}
+
+TEST_F(TextLoadTest, GrammarsAreReadWithoutBeingValidated) {
+  const char* const* folders = gtk_source_language_manager_get_search_path(textLanguages());
+  EXPECT_TRUE(g_file_test((std::string(folders[0]) + "/language2.rng").c_str(), G_FILE_TEST_IS_REGULAR)) << folders[0];
+  EXPECT_EQ(textLanguages(), textLanguages());
+  GtkSourceLanguageManager* all = textLanguages();
+  for (const char* id : {"cpp", "html", "typescript"}) {
+    const GRef<GtkSourceBuffer> buffer(
+        gtk_source_buffer_new_with_language(gtk_source_language_manager_get_language(all, id)));
+    EXPECT_NE(gtk_source_buffer_get_language(buffer.get()), nullptr) << id;
+  }
 }
 
 TEST_F(TextLoadTest, LeavingInTheMiddleEndsIt) {

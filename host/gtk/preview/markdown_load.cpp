@@ -6,6 +6,7 @@
 #include <charconv>
 
 #include "host/gtk/preview/shared_bytes.h"
+#include "host/gtk/preview/text_buffer_end.h"
 
 namespace vaelo {
 
@@ -57,7 +58,10 @@ MarkdownLoad::MarkdownLoad(const std::string& path, Events events)
       "render", [this](DecoderProcess::Answer answer) { received(std::move(answer)); }, RenderingTakes);
 }
 
-MarkdownLoad::~MarkdownLoad() { g_clear_handle_id(&idle_, g_source_remove); }
+MarkdownLoad::~MarkdownLoad() {
+  g_clear_handle_id(&idle_, g_source_remove);
+  endTextBuffer(std::move(buffer_));
+}
 
 void MarkdownLoad::received(DecoderProcess::Answer answer) {
   if (!answer.error.empty()) return events_.failed(answer.error);

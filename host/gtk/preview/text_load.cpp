@@ -3,6 +3,9 @@
 
 #include <algorithm>
 
+#include "host/gtk/preview/text_buffer_end.h"
+#include "host/gtk/preview/text_languages.h"
+
 namespace vaelo {
 
 namespace {
@@ -33,10 +36,57 @@ TextLoad::TextLoad(const std::string& path, const std::string& name, const std::
       buffer_(gtk_source_buffer_new(nullptr)) {
   gtk_text_buffer_set_enable_undo(GTK_TEXT_BUFFER(buffer_.get()), FALSE);
   gtk_source_buffer_set_highlight_matching_brackets(buffer_.get(), FALSE);
+  inNextTurn(&TextLoad::guessLanguage);
   reader_.next([this](TextPiece piece) { received(std::move(piece)); });
 }
 
-TextLoad::~TextLoad() { g_clear_handle_id(&idle_, g_source_remove); }
+TextLoad::~TextLoad() {
+  g_clear_handle_id(&turn_, g_source_remove);
+  g_clear_handle_id(&idle_, g_source_remove);
+  endTextBuffer(std::move(buffer_));
+}
+
+// For what may hold the main loop for long. Not as an idle source, which would come after other documents' work.
+void TextLoad::inNextTurn(Step step) {
+  step_ = step;
+  turn_ = g_idle_add_full(
+      G_PRIORITY_DEFAULT,
+      +[](gpointer data) -> gboolean {
+        auto* self = static_cast<TextLoad*>(data);
+        self->turn_ = 0;
+        (self->*self->step_)();
+        return G_SOURCE_REMOVE;
+      },
+      this, nullptr);
+}
+
+// The library reads the heads of all grammars when it is asked for the first time, while the document is being read.
+void TextLoad::guessLanguage() {
+  language_ = gtk_source_language_manager_guess_language(textLanguages(), name_.c_str(), contentType_.c_str());
+  if (begun_) inNextTurn(&TextLoad::begin);
+}
+
+// The library reads the grammar of the language.
+void TextLoad::begin() {
+  if (!language_) return fill();
+  inNextTurn(&TextLoad::fill);
+  applyLanguage();
+}
+
+void TextLoad::fill() {
+  if (!append()) return events_.advanced();
+  idle_ = g_idle_add_full(
+      AppendPriority,
+      +[](gpointer data) -> gboolean {
+        auto* self = static_cast<TextLoad*>(data);
+        if (self->append()) return G_SOURCE_CONTINUE;
+        self->idle_ = 0;
+        self->events_.advanced();
+        return G_SOURCE_REMOVE;
+      },
+      this, nullptr);
+  events_.advanced();
+}
 
 // A buffer that has a language is analysed, even when nothing of that is shown.
 void TextLoad::applyLanguage() {
@@ -55,26 +105,12 @@ void TextLoad::received(TextPiece piece) {
   }
   piece_ = std::move(piece);
   appended_ = 0;
-  if (!begun_) {
-    begun_ = true;
-    language_ = gtk_source_language_manager_guess_language(gtk_source_language_manager_get_default(), name_.c_str(),
-                                                           contentType_.c_str());
+  if (begun_) {
     applyLanguage();
-    if (!append()) return events_.advanced();
-  } else {
-    applyLanguage();
+    return fill();
   }
-  idle_ = g_idle_add_full(
-      AppendPriority,
-      +[](gpointer data) -> gboolean {
-        auto* self = static_cast<TextLoad*>(data);
-        if (self->append()) return G_SOURCE_CONTINUE;
-        self->idle_ = 0;
-        self->events_.advanced();
-        return G_SOURCE_REMOVE;
-      },
-      this, nullptr);
-  events_.advanced();
+  begun_ = true;
+  if (!turn_) inNextTurn(&TextLoad::begin);
 }
 
 // True while there is more of the piece.

@@ -34,6 +34,11 @@ class TextLoad {
   const TextPiece& progress() const { return piece_; }
 
  private:
+  using Step = void (TextLoad::*)();
+  void inNextTurn(Step step);
+  void guessLanguage();
+  void begin();
+  void fill();
   void received(TextPiece piece);
   bool append();
   void applyLanguage();
@@ -48,6 +53,8 @@ class TextLoad {
   std::size_t appended_ = 0;  // of the piece
   bool begun_ = false;
   bool finished_ = false;
+  Step step_ = nullptr;
+  guint turn_ = 0;  // in which the step is done
   guint idle_ = 0;
 };
 
