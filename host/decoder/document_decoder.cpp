@@ -7,6 +7,7 @@
 
 #include "host/decoder/document_text.h"
 #include "host/decoder/document_words.h"
+#include "host/decoder/page_painting.h"
 #include "host/decoder/pixel_file.h"
 #include "host/support/decoder_error.h"
 
@@ -47,6 +48,7 @@ DecoderMessage DocumentDecoder::answer(const std::string& request) {
   if (command == "text") return text(words);
   if (command == "find") return find(words);
   if (command == "areas") return areas(words);
+  if (command == "touched") return touched(words);
   if (command == "mark") return marks_.add(words, pages_) ? ok() : errorAnswer(DecoderError::Unsupported);
   if (command == "unmark") {
     marks_.clear();
@@ -58,6 +60,7 @@ DecoderMessage DocumentDecoder::answer(const std::string& request) {
 
 DecoderMessage DocumentDecoder::open(const std::string& password) {
   const char* problem = nullptr;
+  stored_.clear();
   document_ = openPortableDocument(original_, password, problem);
   if (!document_) return errorAnswer(problem);
   password_ = password;
@@ -94,33 +97,23 @@ GRef<PopplerPage> DocumentDecoder::page(int index) const {
 
 DecoderMessage DocumentDecoder::render(std::string_view words) {
   int index = 0;
-  double scale = 0;
-  int x = 0;
-  int y = 0;
-  int width = 0;
-  int height = 0;
-  if (!nextNumber(words, index) || !nextNumber(words, scale) || !nextNumber(words, x) || !nextNumber(words, y) ||
-      !nextNumber(words, width) || !nextNumber(words, height) || scale <= 0 || scale > LargestScale || x < 0 || y < 0 ||
-      width <= 0 || height <= 0 || width > MostPixelsOnASide || height > MostPixelsOnASide || width > MostPixels / height) {
+  PageTile tile;
+  if (!nextNumber(words, index) || !nextNumber(words, tile.scale) || !nextNumber(words, tile.x) ||
+      !nextNumber(words, tile.y) || !nextNumber(words, tile.width) || !nextNumber(words, tile.height) || tile.scale <= 0 ||
+      tile.scale > LargestScale || tile.x < 0 || tile.y < 0 || tile.width <= 0 || tile.height <= 0 ||
+      tile.width > MostPixelsOnASide || tile.height > MostPixelsOnASide || tile.width > MostPixels / tile.height) {
     return errorAnswer(DecoderError::Unsupported);
+  }
+  std::vector<int> hidden;
+  while (!words.empty()) {
+    if (!nextNumber(words, hidden.emplace_back())) return errorAnswer(DecoderError::Unsupported);
   }
   const GRef<PopplerPage> shown = page(index);
   if (!shown) return damaged();
-  const int stride = width * 4;
-  PixelFile pixels(static_cast<std::size_t>(stride) * static_cast<std::size_t>(height));
+  PixelFile pixels(static_cast<std::size_t>(tile.width) * 4 * static_cast<std::size_t>(tile.height));
   if (!pixels.data()) return errorAnswer(DecoderError::TooBig);
-  cairo_surface_t* surface = cairo_image_surface_create_for_data(pixels.data(), CAIRO_FORMAT_ARGB32, width, height, stride);
-  cairo_t* context = cairo_create(surface);
-  cairo_set_source_rgb(context, 1, 1, 1);
-  cairo_paint(context);
-  cairo_translate(context, -x, -y);
-  cairo_scale(context, scale, scale);
-  poppler_page_render(shown.get(), context);
-  const bool drawn = cairo_status(context) == CAIRO_STATUS_SUCCESS;
-  cairo_destroy(context);
-  cairo_surface_finish(surface);
-  cairo_surface_destroy(surface);
-  return drawn ? DecoderMessage{"ok", pixels.take()} : damaged();
+  stored_.hide(shown.get(), hidden);
+  return paintPage(shown.get(), tile, pixels.data()) ? DecoderMessage{"ok", pixels.take()} : damaged();
 }
 
 DecoderMessage DocumentDecoder::text(std::string_view words) {
@@ -166,13 +159,26 @@ DecoderMessage DocumentDecoder::areas(std::string_view words) {
   return {std::move(found), UniqueFd()};
 }
 
+DecoderMessage DocumentDecoder::touched(std::string_view words) {
+  int index = 0;
+  double x = 0;
+  double y = 0;
+  double reach = 0;
+  const bool isPlace = nextNumber(words, index) && nextNumber(words, x) && nextNumber(words, y) && nextNumber(words, reach);
+  const GRef<PopplerPage> read = isPlace ? page(index) : nullptr;
+  if (!read) return damaged();
+  const std::string found = stored_.touched(read.get(), x, y, reach);
+  return {found.empty() ? "ok" : "ok " + found, UniqueFd()};
+}
+
 // What was saved is read back and must be as long as the original: it is going to take the original's place.
 DecoderMessage DocumentDecoder::save() {
   const char* problem = nullptr;
   UniqueFd marked = marks_.apply(original_, password_, problem);
   if (!marked) return errorAnswer(problem);
   const GRef<PopplerDocument> readBack = openPortableDocument(marked, password_, problem);
-  if (!readBack || std::min(poppler_document_get_n_pages(readBack.get()), MostPages) != pages_) {
+  if (!readBack || std::min(poppler_document_get_n_pages(readBack.get()), MostPages) != pages_ ||
+      !marks_.areIn(readBack.get(), document_.get())) {
     return errorAnswer(DecoderError::Unsupported);
   }
   return {"ok", std::move(marked)};

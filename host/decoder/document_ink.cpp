@@ -113,26 +113,40 @@ bool makeInk(char* begin, std::size_t length, const DocumentMark& mark) {
   return true;
 }
 
-// The dictionaries of highlights, one for each mark that isn't a note, in the order of the marks.
-bool makeAllInk(char* data, std::size_t size, const std::vector<DocumentMark>& marks) {
+struct Span {
+  std::size_t begin = 0;
+  std::size_t end = 0;
+};
+
+// The dictionary of the next highlight that is an object. A page may be written anew with highlights in its own dictionary.
+std::optional<Span> nextHighlight(std::string_view text, std::size_t& place) {
   constexpr std::string_view highlight = "/Subtype /Highlight ";
-  constexpr std::string_view begins = " obj";
+  while ((place = text.find(highlight, place)) != std::string_view::npos) {
+    const std::size_t object = text.rfind(" obj", place);
+    const std::size_t end = text.find("endobj", place);
+    if (object == std::string_view::npos || end == std::string_view::npos) break;
+    const std::size_t begin = text.find("<<", object);
+    const std::size_t last = text.rfind(">>", end);
+    const bool isMark = begin < place && last > place && text.substr(begin).starts_with("<</Type /Annot ");
+    place = end;
+    if (isMark) return Span{begin, last + 2};
+  }
+  place = text.size();
+  return std::nullopt;
+}
+
+// One for each highlight and each ink, in the order of the marks.
+bool makeAllInk(char* data, std::size_t size, const std::vector<DocumentMark>& marks) {
   const std::string_view text(data, size);
   std::size_t place = 0;
   for (const DocumentMark& mark : marks) {
-    if (mark.kind == DocumentMark::Kind::Note) continue;
-    place = text.find(highlight, place);
-    if (place == std::string_view::npos) return false;
-    const std::size_t object = text.rfind(begins, place);
-    const std::size_t end = text.find("endobj", place);
-    if (object == std::string_view::npos || end == std::string_view::npos) return false;
-    const std::size_t begin = text.find("<<", object);
-    const std::size_t last = text.rfind(">>", end);
-    if (begin > place || last < place) return false;
-    if (mark.kind == DocumentMark::Kind::Ink && !makeInk(data + begin, last + 2 - begin, mark)) return false;
-    place = end;
+    if (mark.kind != DocumentMark::Kind::Highlight && mark.kind != DocumentMark::Kind::Ink) continue;
+    const std::optional<Span> found = nextHighlight(text, place);
+    if (!found) return false;
+    const bool isInk = mark.kind == DocumentMark::Kind::Ink;
+    if (isInk && !makeInk(data + found->begin, found->end - found->begin, mark)) return false;
   }
-  return text.find(highlight, place) == std::string_view::npos;
+  return !nextHighlight(text, place);
 }
 
 }  // namespace

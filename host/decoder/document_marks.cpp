@@ -7,10 +7,13 @@
 
 #include <algorithm>
 #include <cstdio>
+#include <map>
+#include <set>
 
 #include "host/decoder/document_ink.h"
 #include "host/decoder/document_words.h"
 #include "host/decoder/page_height.h"
+#include "host/decoder/stored_marks.h"
 #include "host/support/decoder_error.h"
 
 namespace vaelo {
@@ -69,6 +72,29 @@ GRef<PopplerAnnot> placeOfInk(PopplerDocument* document, const DocumentMark& mar
   return annotation;
 }
 
+// By pages, as they are before anything is changed.
+std::map<int, std::vector<StoredMark>> storedBy(PopplerDocument* document, const std::vector<DocumentMark>& marks) {
+  std::map<int, std::vector<StoredMark>> stored;
+  for (const DocumentMark& mark : marks) {
+    if (stored.contains(mark.page)) continue;
+    if (const GRef<PopplerPage> page(poppler_document_get_page(document, mark.page)); page) {
+      stored[mark.page] = storedMarksOf(page.get());
+    }
+  }
+  return stored;
+}
+
+bool change(PopplerPage* page, const std::vector<StoredMark>& stored, const DocumentMark& mark) {
+  if (mark.stored >= stored.size()) return false;
+  PopplerAnnot* annotation = stored[mark.stored].annotation.get();
+  if (mark.kind == DocumentMark::Kind::Removal) {
+    poppler_page_remove_annot(page, annotation);
+  } else {
+    poppler_annot_set_contents(annotation, mark.text.c_str());
+  }
+  return true;
+}
+
 template <typename Number>
 bool nextNumbers(std::string_view& words, Number* numbers, std::size_t count) {
   return std::all_of(numbers, numbers + count, [&](Number& number) { return nextNumber(words, number); });
@@ -80,6 +106,13 @@ bool DocumentMarks::add(std::string_view words, int pages) {
   DocumentMark mark;
   const std::string_view kind = nextWord(words);
   if (!nextNumber(words, mark.page) || mark.page < 0 || mark.page >= pages || marks_.size() == MostMarks) return false;
+  if (kind == "remove" || kind == "rewrite") {
+    mark.kind = kind == "remove" ? DocumentMark::Kind::Removal : DocumentMark::Kind::Rewriting;
+    if (!nextNumber(words, mark.stored)) return false;
+    mark.text = words;
+    marks_.push_back(std::move(mark));
+    return true;
+  }
   if (!nextNumbers(words, mark.colour.data(), mark.colour.size())) return false;
   if (kind == "highlight") {
     mark.kind = DocumentMark::Kind::Highlight;
@@ -111,10 +144,15 @@ UniqueFd DocumentMarks::apply(const UniqueFd& original, const std::string& passw
   const GRef<PopplerDocument> document = openPortableDocument(original, password, problem);
   if (!document) return UniqueFd();
   problem = DecoderError::Unsupported;
+  const auto stored = storedBy(document.get(), marks_);
   // In the order in which they were made, which is the order in which they are written.
   for (const DocumentMark& mark : marks_) {
     const GRef<PopplerPage> page(poppler_document_get_page(document.get(), mark.page));
     if (!page) return UniqueFd();
+    if (mark.isChange()) {
+      if (!change(page.get(), stored.at(mark.page), mark)) return UniqueFd();
+      continue;
+    }
     GRef<PopplerAnnot> annotation;
     if (mark.kind == DocumentMark::Kind::Highlight)
       annotation = highlightOf(document.get(), mark.lines, heightOf(page.get()));
@@ -133,6 +171,35 @@ UniqueFd DocumentMarks::apply(const UniqueFd& original, const std::string& passw
   if (std::fflush(nullptr) != 0) return UniqueFd();
   if (!writeInk(marked, status.st_size, marks_)) return UniqueFd();
   return marked;
+}
+
+// What isn't an object of its own in the file is changed by the library, but not written.
+bool DocumentMarks::areIn(PopplerDocument* marked, PopplerDocument* original) const {
+  const auto before = storedBy(original, marks_);
+  const auto after = storedBy(marked, marks_);
+  for (const auto& [page, stored] : before) {
+    const auto here = [page = page](const DocumentMark& mark) { return mark.page == page; };
+    const auto count = [&](auto&& isOne) {
+      return std::count_if(marks_.begin(), marks_.end(),
+                           [&](const DocumentMark& mark) { return here(mark) && isOne(mark); });
+    };
+    const auto added = count([](const DocumentMark& mark) { return !mark.isChange(); });
+    const auto removed = count([](const DocumentMark& mark) { return mark.kind == DocumentMark::Kind::Removal; });
+    const auto found = after.find(page);
+    if (found == after.end()) return false;
+    // With a mark goes the window that other programs show its text in.
+    const auto left = std::ssize(found->second);
+    if (left > std::ssize(stored) + added - removed || (removed == 0 && left < std::ssize(stored) + added)) return false;
+    std::multiset<std::string> texts;
+    for (const StoredMark& mark : found->second) {
+      texts.insert(takeString(poppler_annot_get_contents(mark.annotation.get())));
+    }
+    for (const DocumentMark& mark : marks_) {
+      const bool isText = mark.kind == DocumentMark::Kind::Rewriting || mark.kind == DocumentMark::Kind::Note;
+      if (here(mark) && isText && !texts.contains(mark.text)) return false;
+    }
+  }
+  return true;
 }
 
 }  // namespace vaelo

@@ -15,13 +15,6 @@ namespace {
 
 constexpr std::size_t MostPageCharacters = 500'000;  // on a page
 
-// Where the library counts upwards from the lower edge.
-PageBox flipped(const PopplerRectangle& area, double height) {
-  const auto top = static_cast<float>(height - std::max(area.y1, area.y2));
-  const auto bottom = static_cast<float>(height - std::min(area.y1, area.y2));
-  return {static_cast<float>(std::min(area.x1, area.x2)), top, static_cast<float>(std::max(area.x1, area.x2)), bottom};
-}
-
 std::string oneLine(std::string text) {
   std::replace_if(
       text.begin(), text.end(), [](char c) { return static_cast<unsigned char>(c) < ' '; }, ' ');
@@ -55,6 +48,12 @@ std::string targetOf(PopplerDocument* document, const PopplerDest* dest) {
 }
 
 }  // namespace
+
+PageBox flipped(const PopplerRectangle& area, double height) {
+  const auto top = static_cast<float>(height - std::max(area.y1, area.y2));
+  const auto bottom = static_cast<float>(height - std::min(area.y1, area.y2));
+  return {static_cast<float>(std::min(area.x1, area.x2)), top, static_cast<float>(std::max(area.x1, area.x2)), bottom};
+}
 
 GRef<PopplerDocument> openPortableDocument(const UniqueFd& file, const std::string& password, const char*& problem) {
   GError* error = nullptr;

@@ -21,6 +21,9 @@ struct PageText {
   std::vector<PageBox> boxes;
 };
 
+/// Where the library counts upwards from the lower edge.
+PageBox flipped(const PopplerRectangle& area, double height);
+
 /// Reads the document in the file, which stays open; `password` may be empty. Null with a word of DecoderError in `problem`
 /// when that can't be done.
 GRef<PopplerDocument> openPortableDocument(const UniqueFd& file, const std::string& password, const char*& problem);

@@ -64,7 +64,7 @@ TEST_F(PortableDocumentLinksTest, ANoteIsReadAtOnceAndAgainAfterItWasSaved) {
   screen_->markup().note().setText("Mind the bridge");
   screen_->markup().note().finish();
   click(210, 310);
-  EXPECT_EQ(screen_->linkPopover().text(), "Mind the bridge");
+  EXPECT_EQ(screen_->markup().popover().text(), "Mind the bridge");
   close();
   PortableDocumentMarks::finishAll();
   open();

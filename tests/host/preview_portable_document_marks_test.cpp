@@ -1,73 +1,23 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
-#include <poppler.h>
 #include <sys/resource.h>
 #include <sys/xattr.h>
 
-#include <algorithm>
 #include <csignal>
 #include <filesystem>
 
-#include "tests/host/preview_portable_document_screen_test.h"
+#include "tests/host/preview_portable_document_marking_test.h"
 
 namespace vaelo {
 namespace {
 
+using portable_document_test::marksIn;
+using portable_document_test::pagesIn;
 using portable_document_test::readFile;
+using portable_document_test::ReadMark;
 using portable_document_test::writeDocument;
 
-struct ReadMark {
-  PopplerAnnotType type = POPPLER_ANNOT_UNKNOWN;
-  std::string text;
-  PopplerRectangle area = {};
-};
-
-/// What the library finds on a page of the document, links left out.
-std::vector<ReadMark> marksIn(const std::string& path, int page) {
-  std::vector<ReadMark> found;
-  const std::string uri = "file://" + path;
-  const GRef<PopplerDocument> document(poppler_document_new_from_file(uri.c_str(), nullptr, nullptr));
-  if (!document) return found;
-  const GRef<PopplerPage> read(poppler_document_get_page(document.get(), page));
-  GList* list = poppler_page_get_annot_mapping(read.get());
-  for (GList* each = list; each; each = each->next) {
-    const auto* mapping = static_cast<PopplerAnnotMapping*>(each->data);
-    found.push_back({poppler_annot_get_annot_type(mapping->annot), takeString(poppler_annot_get_contents(mapping->annot)),
-                     mapping->area});
-  }
-  poppler_page_free_annot_mapping(list);
-  return found;
-}
-
-int pagesIn(const std::string& path) {
-  const GRef<PopplerDocument> document(poppler_document_new_from_file(("file://" + path).c_str(), nullptr, nullptr));
-  return document ? poppler_document_get_n_pages(document.get()) : -1;
-}
-
-class PortableDocumentMarksTest : public portable_document_test::ScreenTest {
+class PortableDocumentMarksTest : public portable_document_test::MarkingTest {
  protected:
-  using State = PortableDocumentMarks::State;
-
-  void openToMark(int pages = 2) {
-    writeDocument(path(), pages);
-    original_ = readFile(path());
-    open(true);
-    ASSERT_TRUE(screen_->markup().mayMark());
-    screen_->markup().bar().open(true);
-  }
-  bool waitFor(State state) {
-    return waitUntil([&] { return screen_->markup().marks()->state() == state; });
-  }
-  void drawLine(int page = 0) {
-    screen_->markup().bar().choose(MarkTool::Ink);
-    dragFrom(at(page, 50, 200), at(page, 150, 300));
-  }
-  std::vector<std::string> names() const {
-    std::vector<std::string> found;
-    for (const auto& entry : std::filesystem::directory_iterator(folder_.path())) found.push_back(entry.path().filename());
-    std::sort(found.begin(), found.end());
-    return found;
-  }
-
   /// The tooltips of the buttons for the header bar.
   std::string headerText() {
     std::string text;
@@ -86,8 +36,6 @@ class PortableDocumentMarksTest : public portable_document_test::ScreenTest {
     }
     return text;
   }
-
-  std::string original_;
 };
 
 TEST_F(PortableDocumentMarksTest, HighlightInkAndNoteAreInTheFile) {
@@ -102,7 +50,7 @@ TEST_F(PortableDocumentMarksTest, HighlightInkAndNoteAreInTheFile) {
   screen_->markup().note().setText("Grüße,\nzweite Zeile");
   screen_->markup().note().finish();
   EXPECT_EQ(asked_, 3);
-  ASSERT_EQ(screen_->markup().marks()->marks().size(), 3U);
+  ASSERT_EQ(screen_->markup().marks()->edits().marks().size(), 3U);
   ASSERT_TRUE(waitFor(State::Saved));
 
   const std::vector<ReadMark> marks = marksIn(path(), 0);
@@ -126,7 +74,7 @@ TEST_F(PortableDocumentMarksTest, TheDragOfTheHighlighterMarks) {
   openToMark();
   screen_->markup().bar().choose(MarkTool::Highlight);
   dragFrom(at(0, 30, 55), at(0, 390, 55));
-  ASSERT_TRUE(waitUntil([this] { return screen_->markup().marks()->marks().size() == 1; }));
+  ASSERT_TRUE(waitUntil([this] { return screen_->markup().marks()->edits().marks().size() == 1; }));
   EXPECT_EQ(screen_->selecting().selection().pages(), (std::pair{0, -1}));
   ASSERT_TRUE(waitFor(State::Saved));
   EXPECT_EQ(marksIn(path(), 0).size(), 1U);
@@ -155,7 +103,7 @@ TEST_F(PortableDocumentMarksTest, WhatWasSavedHereIsNotReadAnew) {
   ASSERT_TRUE(waitFor(State::Saved));
   screen_->refresh();
   drawLine();
-  EXPECT_EQ(screen_->markup().marks()->marks().size(), 2U);
+  EXPECT_EQ(screen_->markup().marks()->edits().marks().size(), 2U);
   ASSERT_TRUE(waitFor(State::Saving));
   screen_->refresh();
   ASSERT_TRUE(waitFor(State::Saved));
@@ -207,7 +155,7 @@ TEST_F(PortableDocumentMarksTest, AFailedSaveKeepsTheDocumentAndIsTriedAgain) {
   }
   EXPECT_EQ(readFile(path()), original_);
   EXPECT_EQ(names(), std::vector<std::string>{"a.pdf"});
-  EXPECT_EQ(screen_->markup().marks()->marks().size(), 1U);
+  EXPECT_EQ(screen_->markup().marks()->edits().marks().size(), 1U);
   close();
   PortableDocumentMarks::finishAll();
   EXPECT_EQ(marksIn(path(), 0).size(), 1U);
@@ -264,7 +212,7 @@ TEST_F(PortableDocumentMarksTest, NothingIsMarkedThatMayNotBe) {
   open(true);
   maySave_ = false;
   drawLine();
-  EXPECT_TRUE(screen_->markup().marks()->marks().empty());
+  EXPECT_TRUE(screen_->markup().marks()->edits().marks().empty());
   EXPECT_NE(headerText().find("Mark This Document"), std::string::npos);
 }
 

@@ -8,6 +8,7 @@
 #include <functional>
 #include <sstream>
 #include <string>
+#include <vector>
 
 #include "host/gtk/preview/decoder_process.h"
 #include "tests/host/list_test_folder.h"
@@ -32,15 +33,18 @@ inline void writeDocument(const std::string& path, int pages, double width = 400
   cairo_surface_destroy(surface);
 }
 
-/// A document of one empty page, made by hand, with more words in its page's dictionary and in that of the file.
+/// A document of one empty page, made by hand, with more words in its page's dictionary and in that of the file, and with
+/// more objects, of which the first is 5.
 inline std::string smallDocument(const std::string& pageWords = "", const std::string& content = "",
-                                 const std::string& contentWords = "") {
-  const std::string objects[] = {
+                                 const std::string& contentWords = "", const std::vector<std::string>& more = {}) {
+  std::vector<std::string> objects = {
       "<< /Type /Catalog /Pages 2 0 R >>", "<< /Type /Pages /Kids [3 0 R] /Count 1 >>",
       "<< /Type /Page /Parent 2 0 R /MediaBox [0 0 400 600] /Contents 4 0 R " + pageWords + " >>",
       "<< /Length " + std::to_string(content.size()) + " " + contentWords + " >>\nstream\n" + content + "\nendstream"};
+  objects.insert(objects.end(), more.begin(), more.end());
+  const std::string count = std::to_string(objects.size() + 1);
   std::string text = "%PDF-1.4\n";
-  std::string table = "xref\n0 5\n0000000000 65535 f \n";
+  std::string table = "xref\n0 " + count + "\n0000000000 65535 f \n";
   int number = 0;
   for (const std::string& object : objects) {
     char line[32];
@@ -49,7 +53,7 @@ inline std::string smallDocument(const std::string& pageWords = "", const std::s
     text += std::to_string(++number) + " 0 obj\n" + object + "\nendobj\n";
   }
   const std::size_t start = text.size();
-  return text + table + "trailer\n<< /Size 5 /Root 1 0 R >>\nstartxref\n" + std::to_string(start) + "\n%%EOF\n";
+  return text + table + "trailer\n<< /Size " + count + " /Root 1 0 R >>\nstartxref\n" + std::to_string(start) + "\n%%EOF\n";
 }
 
 inline std::string readFile(const std::string& path) {

@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <array>
 
+#include "host/gtk/preview/popover_text.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
 
@@ -12,21 +13,10 @@ namespace vaelo {
 LinkPopover::LinkPopover(GtkWidget* parent, GtkWidget* content)
     : content_(content),
       popover_(gtk_popover_new()),
-      label_(gtk_label_new(nullptr)),
+      label_(makePopoverText()),
       open_(gtk_button_new_with_label(_("Open Link"))) {
-  gtk_label_set_wrap(GTK_LABEL(label_), TRUE);
-  gtk_label_set_wrap_mode(GTK_LABEL(label_), PANGO_WRAP_WORD_CHAR);
-  gtk_label_set_selectable(GTK_LABEL(label_), TRUE);
-  gtk_label_set_xalign(GTK_LABEL(label_), 0);
-  gtk_label_set_max_width_chars(GTK_LABEL(label_), 32);
   GtkWidget* box = gtk_box_new(GTK_ORIENTATION_VERTICAL, 8);
-  GtkWidget* scrolled = gtk_scrolled_window_new();
-  gtk_scrolled_window_set_policy(GTK_SCROLLED_WINDOW(scrolled), GTK_POLICY_NEVER, GTK_POLICY_AUTOMATIC);
-  gtk_scrolled_window_set_propagate_natural_height(GTK_SCROLLED_WINDOW(scrolled), TRUE);
-  gtk_scrolled_window_set_propagate_natural_width(GTK_SCROLLED_WINDOW(scrolled), TRUE);
-  gtk_scrolled_window_set_max_content_height(GTK_SCROLLED_WINDOW(scrolled), 240);
-  gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scrolled), label_);
-  for (GtkWidget* child : {scrolled, open_}) gtk_box_append(GTK_BOX(box), child);
+  for (GtkWidget* child : {scrolledPopoverText(label_), open_}) gtk_box_append(GTK_BOX(box), child);
   gtk_popover_set_child(GTK_POPOVER(popover_), box);
   gtk_widget_set_parent(popover_, parent);
   g_signal_connect_swapped(open_, "clicked", G_CALLBACK(+[](LinkPopover* self) { self->open(); }), this);

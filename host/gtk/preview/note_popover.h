@@ -18,11 +18,13 @@ class NotePopover {
   NotePopover(const NotePopover&) = delete;
   NotePopover& operator=(const NotePopover&) = delete;
   /// At a place in the parent's coordinates; `written` gets a text that is not empty. One that is open is finished first.
-  void ask(const GdkRectangle& place, std::function<void(const std::string&)> written);
+  /// `text` is that of a note that is there already.
+  void ask(const GdkRectangle& place, std::function<void(const std::string&)> written, const std::string& text = "");
   bool isOpen() const { return gtk_widget_get_visible(popover_); }
   /// Keeps what was written.
   void finish() { gtk_popover_popdown(GTK_POPOVER(popover_)); }
   void giveUp();
+  std::string text() const;
   /// As if it was written by the user.
   void setText(const std::string& text);
 
@@ -32,6 +34,7 @@ class NotePopover {
   GtkWidget* content_;
   GtkWidget* popover_;
   GtkWidget* text_;
+  GtkWidget* done_;
   std::function<void(const std::string&)> written_;
 };
 

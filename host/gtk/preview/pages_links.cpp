@@ -31,7 +31,7 @@ std::optional<PageLink> pageLinkIn(const std::string& line) {
   return link;
 }
 
-void PagesLinks::at(const PagePlace& place, std::function<void(const PageLink&)> found) {
+void PagesLinks::at(const PagePlace& place, std::function<void(const PageLink*)> found) {
   if (pages_.contains(place.page)) return tell(place, found);
   source_.ask("areas " + std::to_string(place.page),
               [this, place, found = std::move(found)](const DecoderProcess::Answer& answer) {
@@ -45,13 +45,13 @@ void PagesLinks::at(const PagePlace& place, std::function<void(const PageLink&)>
               });
 }
 
-void PagesLinks::tell(const PagePlace& place, const std::function<void(const PageLink&)>& found) const {
+void PagesLinks::tell(const PagePlace& place, const std::function<void(const PageLink*)>& found) const {
   const std::vector<PageLink>& links = pages_.at(place.page);
   const auto hit = std::find_if(links.rbegin(), links.rend(), [&](const PageLink& link) {
     return place.x >= link.rect.left && place.x <= link.rect.right && place.y >= link.rect.top &&
            place.y <= link.rect.bottom;
   });
-  if (hit != links.rend()) found(*hit);
+  found(hit == links.rend() ? nullptr : &*hit);
 }
 
 }  // namespace vaelo

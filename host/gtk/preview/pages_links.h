@@ -30,11 +30,11 @@ std::optional<PageLink> pageLinkIn(const std::string& line);
 class PagesLinks {
  public:
   explicit PagesLinks(PortableDocumentSource& source) : source_(source) {}
-  /// `found` is called, later when the page is not read yet, if there is one at the place; the uppermost one.
-  void at(const PagePlace& place, std::function<void(const PageLink&)> found);
+  /// `found` is called, later when the page is not read yet, with the uppermost one at the place; null when there is none.
+  void at(const PagePlace& place, std::function<void(const PageLink*)> found);
 
  private:
-  void tell(const PagePlace& place, const std::function<void(const PageLink&)>& found) const;
+  void tell(const PagePlace& place, const std::function<void(const PageLink*)>& found) const;
 
   PortableDocumentSource& source_;
   std::map<int, std::vector<PageLink>> pages_;

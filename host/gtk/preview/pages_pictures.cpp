@@ -57,6 +57,20 @@ void PagesPictures::want(std::vector<Wanted> wanted, double scale) {
   next();
 }
 
+void PagesPictures::hide(const std::map<int, std::vector<int>>& marks) {
+  for (const auto& [number, hidden] : marks) pages_.try_emplace(number);
+  for (auto& [number, page] : pages_) {
+    const auto found = marks.find(number);
+    const std::vector<int> hidden = found == marks.end() ? std::vector<int>() : found->second;
+    if (page.hidden == hidden) continue;
+    page.hidden = hidden;
+    page.detail = {};
+    page.isOld = true;
+    ++page.version;
+  }
+  next();
+}
+
 std::optional<PagesPictures::Request> PagesPictures::detailFor(const Wanted& wanted) {
   if (!wanted.visible) return std::nullopt;
   const Page& page = pages_[wanted.page];
@@ -90,7 +104,7 @@ std::optional<PagesPictures::Request> PagesPictures::mostImportant() {
     const Page& page = pages_[wanted.page];
     if (!page.problem.empty()) continue;
     const double scale = scaleOfWhole(wanted.size, scale_);
-    if (!page.whole.texture || !sameScale(page.whole.scale, scale)) return wholeOf(wanted);
+    if (!page.whole.texture || page.isOld || !sameScale(page.whole.scale, scale)) return wholeOf(wanted);
     if (sameScale(scale, scale_)) continue;
     if (const auto detail = detailFor(wanted)) return detail;
   }
@@ -108,20 +122,29 @@ void PagesPictures::next() {
   for (const int number : {request->rect.x, request->rect.y, request->rect.width, request->rect.height}) {
     words += " " + std::to_string(number);
   }
+  const Page& page = pages_[request->page];
+  for (const int mark : page.hidden) words += " " + std::to_string(mark);
   source_.ask(
-      std::move(words), [this, asked = *request](DecoderProcess::Answer answer) { received(asked, std::move(answer)); },
+      std::move(words),
+      [this, asked = *request, version = page.version](DecoderProcess::Answer answer) {
+        received(asked, version, std::move(answer));
+      },
       RenderingTakes);
 }
 
-void PagesPictures::received(const Request& request, DecoderProcess::Answer answer) {
+void PagesPictures::received(const Request& request, int version, DecoderProcess::Answer answer) {
   asking_ = false;
   Page& page = pages_[request.page];
   GRef<GdkTexture> texture = takeTexture(std::move(answer.file), request.rect.width, request.rect.height);
-  if (texture) {
-    (request.detail ? page.detail : page.whole) = {std::move(texture), request.scale, request.rect};
-    if (!request.detail && sameScale(request.scale, scale_)) page.detail = {};
-  } else {
+  const bool isOld = version != page.version;
+  if (!texture) {
     page.problem = answer.error.empty() ? DecoderError::Damaged : answer.error;
+  } else if (request.detail) {
+    if (!isOld) page.detail = {std::move(texture), request.scale, request.rect};
+  } else {
+    page.whole = {std::move(texture), request.scale, request.rect};
+    page.isOld = isOld;
+    if (sameScale(request.scale, scale_)) page.detail = {};
   }
   forgetFarPages();
   arrived_();

@@ -31,6 +31,8 @@ class PagesPictures {
 
   /// What is wanted now, the most important first, at so many pixels a point.
   void want(std::vector<Wanted> wanted, double scale);
+  /// From now on pages are painted without these marks of the file, and no others. Until then they look as they did.
+  void hide(const std::map<int, std::vector<int>>& marks);
   /// Draws what there is of the page; false when there is nothing yet.
   bool draw(GtkSnapshot* snapshot, int page, const PageArea& area) const;
   /// Why there will be no picture of the page; empty when nothing speaks against it.
@@ -46,6 +48,9 @@ class PagesPictures {
     Picture whole;
     Picture detail;
     std::string problem;
+    std::vector<int> hidden;  // marks
+    int version = 0;          // counts what was hidden
+    bool isOld = false;       // the whole shows what is hidden by now, or lacks what isn't
   };
   struct Request {
     int page = 0;
@@ -57,7 +62,7 @@ class PagesPictures {
   std::optional<Request> mostImportant();
   std::optional<Request> detailFor(const Wanted& wanted);
   void next();
-  void received(const Request& request, DecoderProcess::Answer answer);
+  void received(const Request& request, int version, DecoderProcess::Answer answer);
   void forgetFarPages();
 
   PortableDocumentSource& source_;

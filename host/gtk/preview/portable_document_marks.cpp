@@ -50,13 +50,22 @@ void PortableDocumentMarks::changed(State state) {
 }
 
 void PortableDocumentMarks::add(PageMark mark) {
-  marks_.push_back(std::move(mark));
+  edits_.add(std::move(mark));
+  saveSoon();
+}
+
+void PortableDocumentMarks::remove(const PageMark& mark) {
+  edits_.remove(mark);
+  saveSoon();
+}
+
+void PortableDocumentMarks::rewrite(const PageMark& mark, std::string text) {
+  edits_.rewrite(mark, std::move(text));
   saveSoon();
 }
 
 bool PortableDocumentMarks::undo() {
-  if (marks_.empty()) return false;
-  marks_.pop_back();
+  if (!edits_.undo()) return false;
   saveSoon();
   return true;
 }
@@ -80,8 +89,8 @@ void PortableDocumentMarks::save() {
   if (!unsaved_ || process_ || state_ == State::Saving) return;
   g_clear_handle_id(&timer_, g_source_remove);
   unsaved_ = false;
-  if (marks_.empty() && !saved_) return changed(State::Unchanged);
-  sent_ = marks_;
+  sent_ = edits_.requests();
+  if (sent_.empty() && !saved_) return changed(State::Unchanged);
   next_ = 0;
   process_ = std::make_unique<DecoderProcess>("document", document_.path,
                                               UniqueFd(::fcntl(document_.file.get(), F_DUPFD_CLOEXEC, 3)));
@@ -96,9 +105,8 @@ void PortableDocumentMarks::takeNext(const DecoderProcess::Answer& answer) {
   if (!answer.error.empty()) return fail(sentenceFor(answer.error));
   const auto self = shared_from_this();
   if (next_ < sent_.size()) {
-    const std::string request = "mark " + wordsOf(sent_[next_++]);
     return process_->ask(
-        request, [self](const DecoderProcess::Answer& taken) { self->takeNext(taken); }, SavingTakes);
+        "mark " + sent_[next_++], [self](const DecoderProcess::Answer& taken) { self->takeNext(taken); }, SavingTakes);
   }
   process_->ask(
       "save", [self](DecoderProcess::Answer saved) { self->write(std::move(saved)); }, SavingTakes);

@@ -9,15 +9,14 @@
 #include <vector>
 
 #include "host/gtk/preview/decoder_process.h"
+#include "host/gtk/preview/mark_edits.h"
 #include "host/gtk/preview/marked_file.h"
-#include "host/gtk/preview/page_mark.h"
 
 namespace vaelo {
 
-/// The marks that a person makes on a document while it is shown. They are saved into it a moment after they were made, all
-/// of them anew each time into the document as it was at first, so that the last one can always be taken back. What is not
-/// saved yet when the view goes is saved all the same: the object lives until then. Main thread; the disk is written from
-/// another one.
+/// What a person does to the marks of a document while it is shown. It is saved into it a moment later, all of it anew each
+/// time into the document as it was at first, so that the last thing can always be taken back. What is not saved yet when
+/// the view goes is saved all the same: the object lives until then. Main thread; the disk is written from another one.
 class PortableDocumentMarks : public std::enable_shared_from_this<PortableDocumentMarks> {
  public:
   struct Document {
@@ -37,10 +36,12 @@ class PortableDocumentMarks : public std::enable_shared_from_this<PortableDocume
   static std::shared_ptr<PortableDocumentMarks> make(Document document, Events events);
   ~PortableDocumentMarks();
 
-  const std::vector<PageMark>& marks() const { return marks_; }
+  const MarkEdits& edits() const { return edits_; }
   State state() const { return state_; }
   void add(PageMark mark);
-  /// False when there is no mark of this time.
+  void remove(const PageMark& mark);
+  void rewrite(const PageMark& mark, std::string text);
+  /// False when there is nothing of this time.
   bool undo();
   /// Saves what isn't saved, now.
   void save();
@@ -63,13 +64,13 @@ class PortableDocumentMarks : public std::enable_shared_from_this<PortableDocume
 
   Document document_;
   Events events_;
-  std::vector<PageMark> marks_;
+  MarkEdits edits_;
   State state_ = State::Unchanged;
-  bool unsaved_ = false;        // there are changes that no saving has begun with
-  UniqueFd saved_;              // the open document as it was saved last
-  FileVersion version_;         // of it, or of the original
-  std::vector<PageMark> sent_;  // those that are being saved
-  std::size_t next_ = 0;        // of them
+  bool unsaved_ = false;           // there are changes that no saving has begun with
+  UniqueFd saved_;                 // the open document as it was saved last
+  FileVersion version_;            // of it, or of the original
+  std::vector<std::string> sent_;  // what is being saved
+  std::size_t next_ = 0;           // of it
   std::unique_ptr<DecoderProcess> process_;
   guint timer_ = 0;
 };

@@ -24,11 +24,13 @@ PortableDocumentMarkup::PortableDocumentMarkup(PagesCanvas& canvas, GtkWidget* h
               if (marks_ && !open) marks_->save();
               if (!open) gtk_widget_grab_focus(canvas_.widget());
             }}),
-      note_(host, canvas.widget()) {}
+      note_(host, canvas.widget()),
+      popover_(host, canvas.widget()) {}
 
 PortableDocumentMarkup::~PortableDocumentMarkup() { end(); }
 
 void PortableDocumentMarkup::begin(PortableDocumentMarks::Document document) {
+  popover_.close();
   // What is being written is meant for the place that it was asked for, which is still on the page.
   if (marks_) std::exchange(marks_, nullptr)->leave();
   stroke_.reset();
@@ -38,6 +40,7 @@ void PortableDocumentMarkup::begin(PortableDocumentMarks::Document document) {
 }
 
 void PortableDocumentMarkup::end() {
+  popover_.close();
   note_.finish();
   stroke_.reset();
   if (marks_) std::exchange(marks_, nullptr)->leave();
@@ -45,8 +48,9 @@ void PortableDocumentMarkup::end() {
 }
 
 void PortableDocumentMarkup::changed() {
-  bar_.show(marks_->state(), !marks_->marks().empty());
+  bar_.show(marks_->state(), !marks_->edits().empty());
   canvas_.redraw();
+  events_.changed();
   if (!isSaving() && !isUnsaved()) events_.settled();
 }
 
@@ -122,13 +126,13 @@ void PortableDocumentMarkup::askForNote(double x, double y) {
 }
 
 bool PortableDocumentMarkup::undo() {
-  if (!marks_ || marks_->marks().empty() || !maySave()) return false;
+  if (!marks_ || marks_->edits().empty() || !maySave()) return false;
   return marks_->undo();
 }
 
 void PortableDocumentMarkup::draw(const PageOverlay& overlay, int page) const {
   if (marks_) {
-    for (const PageMark& mark : marks_->marks()) {
+    for (const PageMark& mark : marks_->edits().marks()) {
       if (mark.page == page) overlay.draw(mark, canvas_.width(), canvas_.height());
     }
   }
@@ -140,16 +144,36 @@ bool PortableDocumentMarkup::isUnsaved() const {
   return marks_ && (marks_->state() == State::Unsaved || marks_->state() == State::Failed);
 }
 
-const PageMark* PortableDocumentMarkup::noteAt(const PagePlace& place) const {
+const PageMark* PortableDocumentMarkup::markAt(const PagePlace& place, double reach) const {
   if (!marks_) return nullptr;
-  const std::vector<PageMark>& all = marks_->marks();
+  const std::vector<PageMark>& all = marks_->edits().marks();
   const auto hit = std::find_if(all.rbegin(), all.rend(), [&](const PageMark& mark) {
-    if (mark.kind != PageMark::Kind::Note || mark.page != place.page) return false;
-    const double x = place.x - mark.points.front()[0];
-    const double y = place.y - mark.points.front()[1];
-    return x >= 0 && y >= 0 && x <= PageMark::NoteSide && y <= PageMark::NoteSide;
+    return mark.page == place.page && isMarkAt(mark, place.x, place.y, reach);
   });
   return hit == all.rend() ? nullptr : &*hit;
+}
+
+void PortableDocumentMarkup::offer(PageMark mark, const GdkRectangle& pointed) {
+  if (!marks_) return;
+  const auto& changed = marks_->edits().changed();
+  const auto now = std::find_if(changed.begin(), changed.end(), [&](const auto& each) { return each.mark.isSame(mark); });
+  if (now != changed.end() && now->removed) return;
+  if (now != changed.end()) mark.text = now->mark.text;
+  MarkPopover::Events events;
+  events.remove = [this, mark] {
+    if (maySave()) marks_->remove(mark);
+  };
+  if (mark.text.size() <= PageMark::LongestNote) events.edit = [this, mark, pointed] { rewrite(mark, pointed); };
+  popover_.show(pointed, mark, std::move(events));
+}
+
+void PortableDocumentMarkup::rewrite(const PageMark& mark, const GdkRectangle& pointed) {
+  note_.ask(
+      pointed,
+      [this, mark](const std::string& text) {
+        if (text != mark.text && maySave()) marks_->rewrite(mark, noteText(text));
+      },
+      mark.text);
 }
 
 }  // namespace vaelo

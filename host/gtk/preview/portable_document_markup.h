@@ -7,6 +7,7 @@
 #include <string>
 #include <vector>
 
+#include "host/gtk/preview/mark_popover.h"
 #include "host/gtk/preview/markup_bar.h"
 #include "host/gtk/preview/note_popover.h"
 #include "host/gtk/preview/pages_canvas.h"
@@ -22,6 +23,7 @@ class PortableDocumentMarkup {
     std::function<bool()> shouldSave;                       ///< asked before each mark
     std::function<void(const std::string& sentence)> tell;  ///< also after this object is gone
     std::function<void()> toolChosen;
+    std::function<void()> changed;  ///< other marks, of the file too
     std::function<void()> settled;  ///< nothing is being saved any more
   };
 
@@ -53,14 +55,18 @@ class PortableDocumentMarkup {
   void askForNote(double x, double y);
   bool undo();
   void draw(const PageOverlay& overlay, int page) const;
-  /// The note of this time at the place; null when there is none.
-  const PageMark* noteAt(const PagePlace& place) const;
+  /// The uppermost mark of this time within some points of the place; null when there is none.
+  const PageMark* markAt(const PagePlace& place, double reach) const;
+  /// Shows what can be done to a mark that was touched, also one of the file, at a place of the host.
+  void offer(PageMark mark, const GdkRectangle& pointed);
 
   const PortableDocumentMarks* marks() const { return marks_.get(); }
   NotePopover& note() { return note_; }
+  MarkPopover& popover() { return popover_; }
 
  private:
   bool add(std::vector<PageMark> marks);
+  void rewrite(const PageMark& mark, const GdkRectangle& pointed);
   bool maySave();
   void changed();
   std::array<double, 2> placeOn(int page, double x, double y) const;
@@ -70,6 +76,7 @@ class PortableDocumentMarkup {
   Events events_;
   MarkupBar bar_;
   NotePopover note_;
+  MarkPopover popover_;
   std::shared_ptr<PortableDocumentMarks> marks_;
   std::optional<PageMark> stroke_;  // while it is drawn
 };

@@ -6,6 +6,7 @@
 #include <algorithm>
 #include <utility>
 
+#include "host/decoder/document_words.h"
 #include "host/support/texts.h"
 
 namespace vaelo {
@@ -15,6 +16,7 @@ namespace {
 constexpr GdkRGBA SelectionColour = {0.21F, 0.52F, 0.89F, 0.35F};
 constexpr GdkRGBA FoundColour = {1, 0.85F, 0, 0.45F};
 constexpr GdkRGBA CurrentColour = {1, 0.45F, 0, 0.6F};
+constexpr double TouchReach = 8;  // pixels around the place that is touched
 
 }  // namespace
 
@@ -39,11 +41,12 @@ PortableDocumentScreen::PortableDocumentScreen(const PreviewedDocument& document
       selecting_(canvas_, pages_,
                  {[this](int page) { return texts_ ? texts_->of(page) : nullptr; }, [this] { return markup_.mayMark(); },
                   [this](int page, std::vector<PageRect> lines) { markup_.highlight(page, std::move(lines)); }}),
-      markup_(canvas_, pages_,
-              {[this] { return events_.shouldSave(); }, notice_.teller(), [this] { toolChosen(); },
-               [this] {
-                 if (std::exchange(refreshWhenSaved_, false)) refresh();
-               }}),
+      markup_(
+          canvas_, pages_,
+          {[this] { return events_.shouldSave(); }, notice_.teller(), [this] { toolChosen(); }, [this] { marksChanged(); },
+           [this] {
+             if (std::exchange(refreshWhenSaved_, false)) refresh();
+           }}),
       linkPopover_(pages_, canvas_.widget()),
       buttons_(markup_.bar(), G_CALLBACK(+[](PortableDocumentScreen* self) { self->toggleFind(); }), this),
       pointer_(
@@ -298,8 +301,16 @@ void PortableDocumentScreen::click(double x, double y) {
   gtk_widget_translate_coordinates(canvas_.widget(), pages_, x, y, &left, &top);
   const GdkRectangle pointed = {static_cast<int>(left), static_cast<int>(top), 1, 1};
   const PagePlace place = canvas_.placeAt(x, y);
-  if (const PageMark* note = markup_.noteAt(place)) return linkPopover_.showNote(pointed, note->text);
-  links_->at(place, [this, pointed](const PageLink& link) { follow(link, pointed); });
+  ++clicks_;
+  const auto made = [this, place] { return markup_.markAt(place, TouchReach / canvas_.zoom()); };
+  if (made() && made()->kind == PageMark::Kind::Note) return markup_.offer(*made(), pointed);
+  links_->at(place, [this, place, pointed, made](const PageLink* link) {
+    // What is highlighted may be a link all the same.
+    if (link && link->kind != PageLink::Kind::Note) return follow(*link, pointed);
+    if (made()) return markup_.offer(*made(), pointed);
+    if (markup_.mayMark()) return askForMark(place, pointed);
+    if (link) follow(*link, pointed);
+  });
 }
 
 void PortableDocumentScreen::follow(const PageLink& link, const GdkRectangle& place) {
@@ -310,6 +321,24 @@ void PortableDocumentScreen::follow(const PageLink& link, const GdkRectangle& pl
   } else {
     linkPopover_.showNote(place, link.text);
   }
+}
+
+// Of the marks that the file has.
+void PortableDocumentScreen::askForMark(const PagePlace& place, const GdkRectangle& pointed) {
+  std::string request = "touched " + std::to_string(place.page);
+  for (const double number : {place.x, place.y, TouchReach / canvas_.zoom()}) appendNumber(request, number);
+  source_->ask(std::move(request),
+               [this, page = place.page, pointed, click = clicks_](const DecoderProcess::Answer& answer) {
+                 const std::optional<TouchedMark> touched = touchedMarkIn(page, answer.text);
+                 // Whoever went on meanwhile has something else in mind.
+                 if (!touched || click != clicks_ || markup_.tool() != MarkTool::None) return;
+                 if (touched->mayBeChanged) return markup_.offer(touched->mark, pointed);
+                 if (touched->mark.kind == PageMark::Kind::Note) linkPopover_.showNote(pointed, touched->mark.text);
+               });
+}
+
+void PortableDocumentScreen::marksChanged() {
+  if (pictures_ && markup_.marks()) pictures_->hide(markup_.marks()->edits().removed());
 }
 
 }  // namespace vaelo

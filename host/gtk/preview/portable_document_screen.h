@@ -63,6 +63,8 @@ class PortableDocumentScreen {
   void beginMarkup(bool mayBeMarked);
   void showFound();
   void follow(const PageLink& link, const GdkRectangle& place);
+  void askForMark(const PagePlace& place, const GdkRectangle& pointed);
+  void marksChanged();
   void load(const std::string& password);
   void opened(const PortableDocumentSource::Opened& opened, const std::string& password);
   void askForSizes(std::size_t known);
@@ -96,6 +98,7 @@ class PortableDocumentScreen {
   std::unique_ptr<PortableDocumentSource> nextSource_;  // while the document is read anew
   bool shown_ = false;
   bool refreshWhenSaved_ = false;
+  int clicks_ = 0;
   bool longPressed_ = false;  // by the finger that is still there
   double lastX_ = 0;          // where it pressed
   double lastY_ = 0;
