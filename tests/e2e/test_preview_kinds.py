@@ -237,8 +237,7 @@ class Kinds(unittest.TestCase):
         self.install_suite(SUITE.format(pause=1, page=self.app.desktop.scratch / "page.pdf"))
         self.open("Letter.odt")
         self.app.wait("Preparing the document to be shown")
-        before = self.colour_of_middle()
-        wait_for("the page", lambda: self.colour_of_middle() != before)
+        wait_for("the page", lambda: self.colour_of_middle() == "srgb(255,255,255)")
         self.leave()
 
     def test_leaving_ends_a_suite_that_hangs(self):
