@@ -7,6 +7,7 @@
 #include <set>
 #include <string>
 
+#include "host/gtk/thumbnails/thumbnail_cache.h"
 #include "platform/image.h"
 #include "platform/queues.h"
 
@@ -20,16 +21,21 @@ class DocumentThumbnails {
   DocumentThumbnails(Queues& queues, std::function<void(const std::string& path)> made);
 
   /// The thumbnail of 1024 pixels, or what there is of it. Null for none; one that can be made is made then. Reads the
-  /// cache.
+  /// cache; a large one is decoded by a thread while it is laid out.
   ImageRef thumbnailOf(const std::string& path);
 
  private:
+  ImageRef comingPicture(const std::string& path, ThumbnailFile file);
+  bool isDamaged(const std::string& path);
+  void foundDamaged(const std::string& path);
   void make(const std::string& path);
 
   const std::function<void(const std::string&)> made_;
   std::mutex mutex_;
   std::set<std::string> making_;           // guarded by mutex_
-  std::shared_ptr<OperationQueue> maker_;  // last, so that it ends before what its operations use
+  std::set<std::string> damaged_;          // guarded by mutex_; whose large ones can't be decoded
+  std::shared_ptr<OperationQueue> maker_;  // these last, so that they end before what their operations use
+  std::shared_ptr<OperationQueue> decoder_;
 };
 
 }  // namespace vaelo

@@ -3,10 +3,10 @@
 
 #include <algorithm>
 #include <cstdlib>
-#include <cstring>
-#include <string_view>
+#include <utility>
 
 #include "host/drive/small_file.h"
+#include "host/gtk/thumbnails/thumbnail_png.h"
 #include "host/support/glib_ptr.h"
 
 namespace vaelo {
@@ -28,33 +28,38 @@ const Folder& folderFor(int pixels) {
   return Folders[3];
 }
 
-/// Before anything is decoded: a picture may claim to be larger than the memory.
-bool isPngOfThumbnailSize(const std::string& bytes) {
-  constexpr std::string_view signature("\x89PNG\r\n\x1a\n\0\0\0\rIHDR", 16);
-  // The loader is content with what is cut off.
-  constexpr std::string_view end("\0\0\0\0IEND\xae\x42\x60\x82", 12);
-  if (bytes.size() < 24 || !bytes.starts_with(signature) || !bytes.ends_with(end)) return false;
-  const auto number = [&bytes](std::size_t at) {
-    std::uint32_t value = 0;
-    for (std::size_t i = at; i < at + 4; ++i) value = value << 8 | static_cast<unsigned char>(bytes[i]);
-    return value;
-  };
-  const auto isSide = [](std::uint32_t side) { return side >= 1 && side <= LargestThumbnail; };
-  return isSide(number(16)) && isSide(number(20));
+bool isOfVersion(const ThumbnailPng& png, const std::string& uri, std::int64_t modified) {
+  // Some programs leave the name out; one that is there must be the file's.
+  return (!png.uri || uri == *png.uri) && png.modified && std::strtoll(png.modified->c_str(), nullptr, 10) == modified;
 }
 
-bool isOfVersion(GdkPixbuf* picture, const std::string& uri, std::int64_t modified) {
-  const char* shown = gdk_pixbuf_get_option(picture, "tEXt::Thumb::URI");
-  const char* version = gdk_pixbuf_get_option(picture, "tEXt::Thumb::MTime");
-  // Some programs leave the name out; one that is there must be the file's.
-  return (!shown || uri == shown) && version && std::strtoll(version, nullptr, 10) == modified;
+/// The file at that place, unless it is no thumbnail of this version.
+std::optional<ThumbnailFile> fileOfVersion(const std::string& place, const std::string& uri, std::int64_t modified) {
+  Result<std::string> bytes = readSmallFile(place, LargestThumbnailFile);
+  const std::optional<ThumbnailPng> png = bytes ? thumbnailPng(*bytes.value) : std::nullopt;
+  if (!png || !isOfVersion(*png, uri, modified)) return std::nullopt;
+  return ThumbnailFile{std::move(*bytes.value), png->width, png->height};
+}
+
+std::optional<ThumbnailFile> fileIn(const std::string& cacheFolder, const Folder& folder, const ThumbnailName& name,
+                                    std::int64_t modified) {
+  return fileOfVersion(cacheFolder + "/thumbnails/" + folder.name + "/" + name.file, name.uri, modified);
+}
+
+GRef<GdkPixbuf> decoded(const std::string& bytes) {
+  const GRef<GdkPixbufLoader> loader(gdk_pixbuf_loader_new_with_type("png", nullptr));
+  if (!loader) return nullptr;
+  const bool written =
+      gdk_pixbuf_loader_write(loader.get(), reinterpret_cast<const guchar*>(bytes.data()), bytes.size(), nullptr);
+  const bool whole = gdk_pixbuf_loader_close(loader.get(), nullptr);
+  GdkPixbuf* picture = written && whole ? gdk_pixbuf_loader_get_pixbuf(loader.get()) : nullptr;
+  return GRef<GdkPixbuf>(picture ? GDK_PIXBUF(g_object_ref(picture)) : nullptr);
 }
 
 GRef<GdkPixbuf> pictureIn(const std::string& cacheFolder, const Folder& folder, const ThumbnailName& name,
                           std::int64_t modified) {
-  GRef<GdkPixbuf> picture(readThumbnail(cacheFolder + "/thumbnails/" + folder.name + "/" + name.file));
-  if (picture && !isOfVersion(picture.get(), name.uri, modified)) picture.reset();
-  return picture;
+  const std::optional<ThumbnailFile> file = fileIn(cacheFolder, folder, name, modified);
+  return file ? decoded(file->bytes) : nullptr;
 }
 
 }  // namespace
@@ -73,14 +78,18 @@ int thumbnailSideFor(int pixels) { return folderFor(pixels).side; }
 
 GdkPixbuf* readThumbnail(const std::string& file) {
   const Result<std::string> bytes = readSmallFile(file, LargestThumbnailFile);
-  if (!bytes || !isPngOfThumbnailSize(*bytes.value)) return nullptr;
-  const GRef<GdkPixbufLoader> loader(gdk_pixbuf_loader_new_with_type("png", nullptr));
-  if (!loader) return nullptr;
-  const bool written = gdk_pixbuf_loader_write(loader.get(), reinterpret_cast<const guchar*>(bytes.value->data()),
-                                               bytes.value->size(), nullptr);
-  const bool whole = gdk_pixbuf_loader_close(loader.get(), nullptr);
-  GdkPixbuf* picture = written && whole ? gdk_pixbuf_loader_get_pixbuf(loader.get()) : nullptr;
-  return picture ? GDK_PIXBUF(g_object_ref(picture)) : nullptr;
+  return bytes && thumbnailPng(*bytes.value) ? decoded(*bytes.value).release() : nullptr;
+}
+
+std::optional<ThumbnailFile> cachedThumbnailFile(const std::string& cacheFolder, const std::string& path,
+                                                 std::int64_t modified, int pixels) {
+  const std::optional<ThumbnailName> name = thumbnailNameOf(path);
+  return name ? fileIn(cacheFolder, folderFor(pixels), *name, modified) : std::nullopt;
+}
+
+GdkTexture* decodedThumbnail(const ThumbnailFile& file) {
+  const GRef<GdkPixbuf> picture = decoded(file.bytes);
+  return picture ? gdk_texture_new_for_pixbuf(picture.get()) : nullptr;
 }
 
 GdkTexture* cachedThumbnail(const std::string& cacheFolder, const std::string& path, std::int64_t modified, int pixels) {
@@ -109,7 +118,7 @@ bool hasThumbnail(const std::string& cacheFolder, const std::string& path, std::
   const std::optional<ThumbnailName> name = thumbnailNameOf(path);
   if (!name) return false;
   return std::any_of(std::begin(Folders), std::end(Folders), [&](const Folder& folder) {
-    return folder.side >= std::min(pixels, LargestThumbnail) && pictureIn(cacheFolder, folder, *name, modified);
+    return folder.side >= std::min(pixels, LargestThumbnail) && fileIn(cacheFolder, folder, *name, modified);
   });
 }
 
@@ -124,8 +133,7 @@ void rememberFailure(const std::string& cacheFolder, const std::string& path, st
 bool hasFailed(const std::string& cacheFolder, const std::string& path, std::int64_t modified) {
   const std::optional<ThumbnailName> name = thumbnailNameOf(path);
   if (!name) return true;
-  const GRef<GdkPixbuf> mark(readThumbnail(cacheFolder + FailuresFolder + "/" + name->file));
-  return mark && isOfVersion(mark.get(), name->uri, modified);
+  return fileOfVersion(cacheFolder + FailuresFolder + "/" + name->file, name->uri, modified).has_value();
 }
 
 bool storeThumbnail(const std::string& file, GdkPixbuf* picture, const std::string& uri, std::int64_t modified) {

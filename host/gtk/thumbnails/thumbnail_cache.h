@@ -30,6 +30,18 @@ int thumbnailSideFor(int pixels);
 /// The picture in a PNG file, null unless it is a whole one of a size that thumbnails have. Owned by the caller.
 GdkPixbuf* readThumbnail(const std::string& file);
 
+/// A thumbnail that is yet to be decoded.
+struct ThumbnailFile {
+  std::string bytes;
+  int width = 0;  ///< pixels, as it says
+  int height = 0;
+};
+/// What the cache keeps of this version of a file (see below) for just that size.
+std::optional<ThumbnailFile> cachedThumbnailFile(const std::string& cacheFolder, const std::string& path,
+                                                 std::int64_t modified, int pixels);
+/// Null when it is damaged. Owned by the caller.
+GdkTexture* decodedThumbnail(const ThumbnailFile& file);
+
 /// The picture that the cache keeps of a file, at most `pixels` wide and high, the smallest that is large enough or else the
 /// largest there is; null when there is none or when it is of another file or another version of it (`modified`: the file's
 /// own time, seconds since 1970). Owned by the caller. Looks up only: makes nothing, and never opens the file itself.
