@@ -6,7 +6,8 @@ namespace vaelo {
 namespace {
 
 constexpr gint64 EndingSlice = 6000;  // microseconds
-constexpr int LinesAtOnce = 100;
+// A highlighted text takes a time that grows with the square of what goes at once.
+constexpr int LinesAtOnce = 4;
 
 }  // namespace
 
