@@ -26,10 +26,10 @@ def walk(node, depth=0):
         return
     for i in range(min(node.get_child_count(), 2000)):
         child = node.get_child_at_index(i)
-        if child is None:
+        # What doesn't show holds nothing that does.
+        if child is None or not child.get_state_set().contains(Atspi.StateType.VISIBLE):
             continue
-        if child.get_state_set().contains(Atspi.StateType.VISIBLE):
-            tell(child)
+        tell(child)
         walk(child, depth + 1)
 
 

@@ -24,14 +24,14 @@ def pause(seconds):
 
 
 def wait_for(what, condition, patience=PATIENCE):
-    """The first true answer of `condition`; fails with `what` after `patience` seconds."""
+    """The first true answer of `condition`; fails with `what`, words or what answers them, after `patience` seconds."""
     end = time.monotonic() + patience
     while time.monotonic() < end:
         answer = condition()
         if answer:
             return answer
         pause(0.05)
-    raise AssertionError(f"waited {patience} s for: {what}")
+    raise AssertionError(f"waited {patience} s for: {what() if callable(what) else what}")
 
 
 class Desktop:
@@ -171,7 +171,7 @@ class App:
         return next((row for row in self.accessibility.showing() if row[1].startswith(name) and role in (None, row[0])), None)
 
     def wait(self, name, role=None):
-        return wait_for(f"“{name}” to show; showing: {self.names()[:40]}", lambda: self.find(name, role))
+        return wait_for(lambda: f"“{name}” to show; showing: {self.names()[:40]}", lambda: self.find(name, role))
 
     def wait_gone(self, name):
         wait_for(f"“{name}” to go", lambda: not self.find(name))
@@ -191,7 +191,7 @@ class App:
 
     def wait_title(self, title):
         """Until the header bar of the page that shows has the title."""
-        wait_for(f"the title “{title}”; showing: {self.names()[:20]}",
+        wait_for(lambda: f"the title “{title}”; showing: {self.names()[:20]}",
                  lambda: any(row[0] == "label" and row[1] == title and row[3] < 46 for row in self.accessibility.showing()))
 
     def wait_log(self, text):

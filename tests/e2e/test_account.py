@@ -34,7 +34,7 @@ class Account(unittest.TestCase):
     def press(self, name, role="push button"):
         """A button of the dialog that is in front, whose places are told within its own window."""
         app = self.app
-        rows = wait_for(f"“{name}” in the dialog; showing: {app.names()[:40]}",
+        rows = wait_for(lambda: f"“{name}” in the dialog; showing: {app.names()[:40]}",
                         lambda: [row for row in app.accessibility.showing() if row[1].startswith(name) and row[0] == role])
         geometry = dict(line.split("=") for line in
                         app.desktop.tool("xdotool", "getwindowfocus", "getwindowgeometry", "--shell").splitlines()

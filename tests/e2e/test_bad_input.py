@@ -258,7 +258,7 @@ class Unreadable(BadInput):
     def test_a_document_says_so_in_its_preview(self):
         app = self.start(lambda app: (app.drive / "Keep.txt").chmod(0), OrdinaryApp)
         self.open_folder(app, "Keep.txt")
-        wait_for(f"a reason; showing {app.names()}",
+        wait_for(lambda: f"a reason; showing {app.names()}",
                  lambda: any("permission" in name.lower() for name in app.names()))
         app.key("Escape")
         app.wait_title("Vaelo Drive")

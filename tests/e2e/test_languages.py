@@ -28,7 +28,7 @@ class Languages(unittest.TestCase):
         return self.app
 
     def showing(self, text):
-        wait_for(f"“{text}” to show; showing: {self.app.names()[:60]}", lambda: any(text in name for name in self.app.names()))
+        wait_for(lambda: f"“{text}” to show; showing: {self.app.names()[:60]}", lambda: any(text in name for name in self.app.names()))
 
     def installed(self, name):
         """The environment of a system on which the locale is installed."""

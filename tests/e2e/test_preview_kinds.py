@@ -123,7 +123,7 @@ class Kinds(unittest.TestCase):
         Kinds.opened = name
 
     def wait_sentence(self, sentence):
-        wait_for(f"“{sentence}” in {self.app.names()[:60]}", lambda: any(sentence in name for name in self.app.names()))
+        wait_for(lambda: f"“{sentence}” in {self.app.names()[:60]}", lambda: any(sentence in name for name in self.app.names()))
 
     def leave(self):
         self.app.key("Escape")
