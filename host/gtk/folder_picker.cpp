@@ -54,7 +54,10 @@ void FolderPicker::build(GtkWindow* over) {
   int width = 0;
   int height = 0;
   gtk_window_get_default_size(over, &width, &height);
-  gtk_window_set_default_size(GTK_WINDOW(window_), std::min(width, 440), std::min(height, 600));
+  // On a phone it takes the whole screen.
+  constexpr int narrowBelow = 480;
+  gtk_window_set_default_size(GTK_WINDOW(window_), std::min(width, 440),
+                              width < narrowBelow ? height : std::min(height, 600));
   GtkWidget* box = gtk_box_new(GTK_ORIENTATION_VERTICAL, 0);
   GtkWidget* header = adw_header_bar_new();
   adw_header_bar_set_show_end_title_buttons(ADW_HEADER_BAR(header), FALSE);

@@ -28,9 +28,10 @@ GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds, Dr
   gtk_window_set_icon_name(widget(), "com.marrow.VaeloDrive");
   gtk_window_set_default_size(widget(), static_cast<int>(bounds.width), static_cast<int>(bounds.height));
   gtk_widget_set_size_request(GTK_WIDGET(window_), 360, 294);
-  gtk_overlay_set_child(GTK_OVERLAY(overlay_), stack_.widget());
-  adw_toast_overlay_set_child(ADW_TOAST_OVERLAY(toasts_), overlay_);
-  adw_application_window_set_content(window_, toasts_);
+  adw_toast_overlay_set_child(ADW_TOAST_OVERLAY(toasts_), stack_.widget());
+  // A message may stand at the bottom still when a sheet rises from there, whose answers it must not hide.
+  gtk_overlay_set_child(GTK_OVERLAY(overlay_), toasts_);
+  adw_application_window_set_content(window_, overlay_);
   const GRef<GMenuItem> grid(g_menu_item_new(_("View as _Grid"), "narrow.grid"));
   g_menu_item_set_attribute(grid.get(), "hidden-when", "s", "action-missing");
   g_menu_append_item(menu_, grid.get());

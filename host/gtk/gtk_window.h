@@ -29,7 +29,7 @@ class GtkWindowHost : public Window, private NavigationHost, private Presentatio
 
   void makeKeyAndVisible() override;
   GtkWindow* widget() const { return GTK_WINDOW(window_); }
-  /// Holds the pages as its child; what lies over them all is put on it.
+  /// Holds the pages and the messages over them as its child; what lies over them all is put on it.
   GtkOverlay* overlay() const { return GTK_OVERLAY(overlay_); }
   /// A short message at the bottom of the window. One that stays goes when the user closes it.
   void showToast(const std::string& text, bool stays = false);

@@ -42,6 +42,7 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
     gtk_widget_set_tooltip_text(button, _("Main Menu"));
     gtk_accessible_update_property(GTK_ACCESSIBLE(button), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Main Menu"), -1);
     adw_header_bar_pack_end(ADW_HEADER_BAR(header_), button);
+    menuButton_ = button;
   }
   gtk_box_append(GTK_BOX(box_), header_);
   if (hostScreen_) {
@@ -100,10 +101,11 @@ void ScreenPage::setNarrow(bool narrow) {
   if (narrow == narrow_) return;
   narrow_ = narrow;
   adw_header_bar_set_decoration_layout(ADW_HEADER_BAR(header_), narrow ? ":close" : nullptr);
-  if (!hostScreen_) return;
-  // The menu hides what it finds no action for.
-  gtk_widget_insert_action_group(box_, NarrowActions, narrow ? hostScreen_->narrowActions() : nullptr);
-  showHostWidgets();
+  if (hostScreen_) {
+    // The menu hides what it finds no action for.
+    gtk_widget_insert_action_group(box_, NarrowActions, narrow ? hostScreen_->narrowActions() : nullptr);
+    showHostWidgets();
+  }
   showBar();
 }
 
@@ -146,16 +148,33 @@ void ScreenPage::showBar() {
     barWidgets_.push_back(makeBarItemWidget(right, icon));
     adw_header_bar_pack_end(ADW_HEADER_BAR(header_), barWidgets_.back());
   }
-  for (GtkWidget* widget : preview_ ? preview_->headerWidgets() : std::vector<GtkWidget*>()) {
+  // Where there is Cancel in the place of the way back, there is Done as well; items are selected by help of the menu.
+  if (menuButton_) gtk_widget_set_visible(menuButton_, !narrow_ || hostScreen_ || !leftTakesPlace);
+  if (preview_) showPreviewWidgets();
+}
+
+void ScreenPage::showPreviewWidgets() {
+  std::vector<GtkWidget*> inHeader;
+  if (!narrow_) inHeader = preview_->buttons();
+  for (GtkWidget* widget : preview_->viewWidgets()) inHeader.push_back(widget);
+  for (GtkWidget* widget : inHeader) {
     barWidgets_.push_back(widget);
     adw_header_bar_pack_end(ADW_HEADER_BAR(header_), widget);
   }
+  showToolbar();
 }
 
 void ScreenPage::showToolbar() {
   while (GtkWidget* child = gtk_widget_get_first_child(toolbar_)) gtk_box_remove(GTK_BOX(toolbar_), child);
   for (const BarButtonItemRef& item : screen_->toolbarItems()) gtk_box_append(GTK_BOX(toolbar_), makeBarItemWidget(item));
-  const bool shows = !toolbarHidden_ && !screen_->toolbarItems().empty();
+  std::vector<GtkWidget*> buttons;
+  if (preview_ && narrow_) buttons = preview_->buttons();
+  for (GtkWidget* button : buttons) {
+    gtk_widget_set_hexpand(button, TRUE);
+    gtk_widget_set_halign(button, GTK_ALIGN_CENTER);
+    gtk_box_append(GTK_BOX(toolbar_), button);
+  }
+  const bool shows = !buttons.empty() || (!toolbarHidden_ && !screen_->toolbarItems().empty());
   for (GtkWidget* widget : {toolbarEdge_, toolbar_}) gtk_widget_set_visible(widget, shows);
 }
 

@@ -47,6 +47,8 @@ class ScreenPage {
  private:
   void showHostWidgets();
   void showBar();
+  /// The buttons of a preview stand in the header bar, or where it is narrow in the toolbar.
+  void showPreviewWidgets();
   void showToolbar();
 
   ViewControllerRef screen_;
@@ -57,6 +59,7 @@ class ScreenPage {
   GtkWidget* back_;
   GtkWidget* toolbarEdge_;
   GtkWidget* toolbar_;
+  GtkWidget* menuButton_ = nullptr;
   std::vector<GtkWidget*> hostWidgets_;
   std::vector<GtkWidget*> barWidgets_;
   std::function<void()> goBack_;

@@ -148,7 +148,7 @@ class Narrow(unittest.TestCase):
         def prepare(app):
             app.drive.mkdir(parents=True)
             (app.data / "account.ini").write_text("[Account]\nName=x\nToken=ab\nSignedIn=true\n")
-            for name in ("One.txt", "Two.txt"):
+            for name in ("One.txt", "Two.txt", "A photograph.png"):  # no other application opens pictures
                 (app.drive / name).touch()
         self.app = App(size=(360, 720), prepare=prepare)
         self.addCleanup(self.app.close)
@@ -181,6 +181,19 @@ class Narrow(unittest.TestCase):
         app.wait("View as Grid", "menu item")
         app.key("g")
         wait_for("the icons again", self.are_side_by_side)
+
+    def test_a_preview_has_its_buttons_below_and_its_whole_name_above(self):
+        def title():
+            return next(row for row in app.accessibility.showing() if row[:2] == ("label", "A photograph.png") and row[3] < 46)
+        app = self.app
+        app.click("A photograph.png", "list item")
+        app.wait_title("A photograph.png")
+        for name in ("Share", "Delete", "Move"):
+            self.assertGreater(app.wait(name, "push button")[3], 600)
+        narrow = title()[4]
+        app.resize(800, 640)
+        wait_for("the buttons above", lambda: all(app.wait(name, "push button")[3] < 46 for name in ("Share", "Delete", "Move")))
+        self.assertEqual(narrow, title()[4], "cut where it is narrow")
 
     def test_selecting_is_an_icon_with_a_name(self):
         app = self.app

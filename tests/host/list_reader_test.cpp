@@ -82,6 +82,7 @@ TEST(FolderReader, PromisesStandUnderTheirItemsName) {
   const auto details = readDetails(folder.path() + "/Plan.pdf", EntryKind::Promise, 40);
   EXPECT_EQ(details->secondLine.rfind("Not downloaded", 0), 0U) << details->secondLine;
   EXPECT_NE(details->secondLine.find("1 KB"), std::string::npos) << details->secondLine;
+  EXPECT_EQ(details->shortLine, "Not downloaded");
 
   folder.write("Plan.pdf");
   EXPECT_EQ(kindsIn(folder.path()).at("Plan.pdf"), EntryKind::Document);
@@ -123,6 +124,8 @@ TEST(DetailsReader, CountsWhatAFolderLists) {
   EXPECT_EQ(readDetails(folder.path() + "/many", EntryKind::Folder, 40)->secondLine, "2 items");
   EXPECT_EQ(readDetails(folder.path() + "/one", EntryKind::Folder, 40)->secondLine, "1 item");
   EXPECT_NE(readDetails(folder.path() + "/file", EntryKind::Document, 40)->secondLine.find("3 KB"), std::string::npos);
+  EXPECT_EQ(readDetails(folder.path() + "/file", EntryKind::Document, 40)->shortLine, "3 KB");
+  EXPECT_EQ(readDetails(folder.path() + "/many", EntryKind::Folder, 40)->shortLine, "2 items");
   EXPECT_EQ(readDetails(folder.path() + "/gone", EntryKind::Document, 40)->secondLine, "");
 }
 

@@ -51,14 +51,12 @@ IcuFormatting& formatting() {
 
 std::string sizeText(std::uint64_t bytes) { return formatting().byteCount(bytes, ByteCountStyle::File); }
 
-std::string joinedText(std::initializer_list<std::string> parts) {
-  std::string text;
-  for (const std::string& part : parts) {
-    if (part.empty()) continue;
-    if (!text.empty()) text += " · ";
-    text += part;
+void setFacts(ItemDetails& details, std::initializer_list<std::string> facts) {
+  for (const std::string& fact : facts) {
+    if (fact.empty()) continue;
+    if (details.shortLine.empty()) details.shortLine = fact;
+    details.secondLine += (details.secondLine.empty() ? "" : " · ") + fact;
   }
-  return text;
 }
 
 std::string countText(long count) {
@@ -87,11 +85,11 @@ std::shared_ptr<const ItemDetails> readDetails(const std::string& path, EntryKin
       if (promise.value->modified)
         date = dateText(std::chrono::duration<double>(promise.value->modified->time_since_epoch()).count());
     }
-    details->secondLine = joinedText({_("Not downloaded"), size, date});
+    setFacts(*details, {_("Not downloaded"), size, date});
     return details;
   }
   if (isListedAsFolder(kind)) {
-    details->secondLine = countText(countEntries(AT_FDCWD, path.c_str()));
+    setFacts(*details, {countText(countEntries(AT_FDCWD, path.c_str()))});
     return details;
   }
   struct statx status;
@@ -101,10 +99,10 @@ std::shared_ptr<const ItemDetails> readDetails(const std::string& path, EntryKin
   }
   const std::string date = dateText(static_cast<double>(status.stx_mtime.tv_sec));
   if (!S_ISREG(status.stx_mode)) {
-    details->secondLine = date;
+    setFacts(*details, {date});
     return details;
   }
-  details->secondLine = joinedText({sizeText(status.stx_size), date});
+  setFacts(*details, {sizeText(status.stx_size), date});
   const char* cache = g_get_user_cache_dir();
   details->thumbnail = cachedThumbnail(cache, path, status.stx_mtime.tv_sec, thumbnailPixels);
   details->mayHaveThumbnail = !details->thumbnail && status.stx_size > 0 &&

@@ -15,6 +15,7 @@ namespace vaelo {
 struct ItemDetails {
   std::string displayName;          ///< UTF-8, for an item whose extension is hidden; else empty
   std::string secondLine;           ///< UTF-8, ready to show
+  std::string shortLine;            ///< what stands first in it, for below an icon
   GdkTexture* thumbnail = nullptr;  ///< owned
   bool mayHaveThumbnail = false;    ///< one is missing that could be made
   ItemDetails() = default;

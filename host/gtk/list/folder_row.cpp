@@ -14,7 +14,7 @@ constexpr int Gap = 12;
 constexpr int MarkSize = 22;
 constexpr int CloudSize = 16;
 constexpr int LeastRowHeight = 48;
-constexpr int CellWidth = 112;
+constexpr int CellWidth = 100;
 
 struct Row {
   GtkWidget parent;
@@ -86,7 +86,8 @@ void makeLayouts(Row* row) {
   const FolderItem& item = folderItemOf(row->item);
   const bool grid = row->context->grid;
   row->name = makeLayout(widget, nameOf(item), false, grid, grid ? 2 : 1);
-  std::string second = item.details ? item.details->secondLine : std::string();
+  std::string second;
+  if (item.details) second = grid ? item.details->shortLine : item.details->secondLine;
   if (second.empty() && isPromised(item.kind)) second = _("Not downloaded");
   row->second = makeLayout(widget, second, true, grid, 1);
 }

@@ -137,7 +137,7 @@ void FolderView::makeList() {
   const auto press = [](FolderView* self, guint position) { self->pressed(position); };
   if (context_.grid) {
     list_ = gtk_grid_view_new(model, factory);
-    gtk_grid_view_set_max_columns(GTK_GRID_VIEW(list_), 12);
+    gtk_grid_view_set_max_columns(GTK_GRID_VIEW(list_), 10);
     gtk_grid_view_set_single_click_activate(GTK_GRID_VIEW(list_), TRUE);
   } else {
     list_ = gtk_list_view_new(model, factory);

@@ -118,7 +118,14 @@ class ArchiveView : public DocumentView {
         note_(makePreviewNote()) {
     GtkWidget* scrolled = gtk_scrolled_window_new();
     gtk_scrolled_window_set_policy(GTK_SCROLLED_WINDOW(scrolled), GTK_POLICY_NEVER, GTK_POLICY_AUTOMATIC);
-    gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scrolled), list_);
+    // As the lists of folders: wider rows are read with effort.
+    constexpr int widest = 840;
+    GtkWidget* clamp = adw_clamp_scrollable_new();
+    adw_clamp_scrollable_set_maximum_size(ADW_CLAMP_SCROLLABLE(clamp), widest);
+    adw_clamp_scrollable_set_tightening_threshold(ADW_CLAMP_SCROLLABLE(clamp), widest);
+    adw_clamp_scrollable_set_child(ADW_CLAMP_SCROLLABLE(clamp), list_);
+    gtk_widget_add_css_class(scrolled, "view");
+    gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scrolled), clamp);
     gtk_list_view_set_single_click_activate(GTK_LIST_VIEW(list_), TRUE);
     gtk_accessible_update_property(GTK_ACCESSIBLE(list_), GTK_ACCESSIBLE_PROPERTY_LABEL, document_.name.c_str(), -1);
     g_signal_connect(list_, "activate", G_CALLBACK(+[](GtkListView* list, guint position, gpointer) {

@@ -54,15 +54,17 @@ std::optional<URL> PreviewPage::item() const {
   return controller_->itemAtIndex(0);
 }
 
-std::vector<GtkWidget*> PreviewPage::headerWidgets() const {
+std::vector<GtkWidget*> PreviewPage::buttons() const {
   std::vector<GtkWidget*> widgets;
   if (item()) widgets.push_back(makeBarItemWidget(share_.item()));
   for (const BarButtonItemRef& item : controller_->additionalRightBarButtonItems())
     widgets.push_back(makeBarItemWidget(item));
-  if (view_ && gtk_stack_get_visible_child(GTK_STACK(stack_)) == view_->widget()) {
-    for (GtkWidget* widget : view_->headerWidgets()) widgets.push_back(widget);
-  }
   return widgets;
+}
+
+std::vector<GtkWidget*> PreviewPage::viewWidgets() const {
+  if (!view_ || gtk_stack_get_visible_child(GTK_STACK(stack_)) != view_->widget()) return {};
+  return view_->headerWidgets();
 }
 
 void PreviewPage::changed(PreviewChange change) {

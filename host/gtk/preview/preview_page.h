@@ -21,7 +21,7 @@ namespace vaelo {
 /// thread; nothing that reads the document runs there.
 class PreviewPage {
  public:
-  /// `headerChanged` is called when headerWidgets() would answer something else.
+  /// `headerChanged` is called when they would answer something else.
   PreviewPage(std::shared_ptr<PreviewController> controller, std::function<void()> headerChanged,
               std::chrono::milliseconds patience = PreviewedDocument().patience);
   ~PreviewPage();
@@ -29,8 +29,9 @@ class PreviewPage {
   PreviewPage& operator=(const PreviewPage&) = delete;
   GtkWidget* widget() const { return stack_; }
 
-  /// The controller's own bar buttons and the shown view's widgets, from the outer edge inwards; made anew for each call.
-  std::vector<GtkWidget*> headerWidgets() const;
+  /// The controller's own bar buttons, and the shown view's widgets, from the outer edge inwards; made anew for each call.
+  std::vector<GtkWidget*> buttons() const;
+  std::vector<GtkWidget*> viewWidgets() const;
   bool toggleFind() { return view_ && view_->toggleFind(); }
   bool closeFind() { return view_ && view_->closeFind(); }
   /// Reads the document anew.
