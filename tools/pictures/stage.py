@@ -115,6 +115,7 @@ class Stage:
     def choose(self, text):
         """From the menu that is open. Places in it are told as if it had not been moved to be on the screen."""
         name = self.text(text)
+        self.point_nowhere()  # a tooltip would lie over the menu
         self.settle()
 
         def found():
@@ -141,6 +142,9 @@ class Stage:
         if mode == "preview":
             self.app.wait_title(pathlib.PurePath(path).name)
 
+    def point_nowhere(self):
+        self.app.mouse("mousemove", str(self.size[0] - 1), str(self.size[1] - 1))
+
     def capture(self):
         path = self.app.desktop.scratch / "picture.png"
         self.app.desktop.tool("import", "-silent", "-window", "root", str(path))
@@ -160,8 +164,7 @@ class Stage:
 
     def shot(self, name):
         self.latest = name
-        # Where it points at nothing.
-        self.app.mouse("mousemove", str(self.size[0] - 1), str(self.size[1] - 1))
+        self.point_nowhere()
         # What is done next waits for it, too.
         picture = self.settle()
         if name not in self.wanted:
