@@ -168,11 +168,15 @@ void GtkWindowHost::stackChanged(const Stack&, const Stack& newStack, bool anima
     widgets.push_back(page->widget());
   }
   followTop();
+  latestStack_ = newStack;
   stack_.setPages(widgets, animated, [this, newStack, done = std::move(done)] {
-    std::erase_if(pages_, [&](const auto& entry) {
-      return std::none_of(newStack.begin(), newStack.end(),
-                          [&](const ViewControllerRef& screen) { return screen.get() == entry.first; });
-    });
+    const auto holds = [](const Stack& stack, const ViewController* screen) {
+      return std::any_of(stack.begin(), stack.end(), [&](const ViewControllerRef& held) { return held.get() == screen; });
+    };
+    // A later change ends the slide of an earlier one: the pages that it has made stay, and those that slid in still have to
+    // slide out.
+    std::erase_if(pages_,
+                  [&](const auto& entry) { return !holds(newStack, entry.first) && !holds(latestStack_, entry.first); });
     done();
   });
 }

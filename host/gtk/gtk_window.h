@@ -70,6 +70,7 @@ class GtkWindowHost : public Window, private NavigationHost, private Presentatio
   PageStack stack_;
   std::function<GtkWidget*()> makeBanner_;
   std::map<ViewController*, std::unique_ptr<ScreenPage>> pages_;
+  Stack latestStack_;
   std::map<ViewController*, GtkWindow*> dialogs_;
   std::map<ViewController*, std::unique_ptr<ActionSheet>> sheets_;
   std::shared_ptr<void> topToken_;

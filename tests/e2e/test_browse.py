@@ -223,6 +223,15 @@ class Links(unittest.TestCase):
         app.key("Escape")
         app.wait_title("Projects")
 
+    def test_links_that_come_while_the_window_still_slides_are_shown(self):
+        app = self.app
+        for _ in range(3):
+            for document, mode in (("Pictures/Photo%25203.jpg", "details"), ("Pictures/Photo%25202.jpg", "preview")):
+                status, said = app.link(f"vaelodriveapp:{app.drive}/{document}?mode={mode}")
+                self.assertEqual(status, 0, said)
+            app.wait_title("Photo 2.jpg")
+        self.assertNotIn("CRITICAL", app.log())
+
     def test_bad_links_are_refused_and_nothing_else_happens(self):
         app = self.app
         trash = app.data / "mirror" / ".Trash" / "Thrown away.txt"
