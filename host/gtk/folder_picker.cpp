@@ -51,9 +51,8 @@ void FolderPicker::build(GtkWindow* over) {
   gtk_window_set_transient_for(GTK_WINDOW(window_), over);
   gtk_window_set_modal(GTK_WINDOW(window_), TRUE);
   gtk_window_set_title(GTK_WINDOW(window_), _("Move"));
-  int width = 0;
-  int height = 0;
-  gtk_window_get_default_size(over, &width, &height);
+  const int width = gtk_widget_get_width(GTK_WIDGET(over));
+  const int height = gtk_widget_get_height(GTK_WIDGET(over));
   // On a phone it takes the whole screen.
   constexpr int narrowBelow = 480;
   gtk_window_set_default_size(GTK_WINDOW(window_), std::min(width, 440),

@@ -44,9 +44,13 @@ GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds, Dr
     if (const auto controller = navigation()) controller->userWentBackTo(left);
     followTop();
   });
-  for (const char* property : {"notify::default-width", "notify::default-height"}) {
-    g_signal_connect_swapped(window_, property, G_CALLBACK(+[](GtkWindowHost* self) { self->sizeChanged(); }), this);
+  const auto changed = [](GtkWindowHost* self) { self->sizeChanged(); };
+  for (const char* property :
+       {"notify::default-width", "notify::default-height", "notify::maximized", "notify::fullscreened"}) {
+    g_signal_connect_swapped(window_, property, G_CALLBACK(+changed), this);
   }
+  gtk_widget_realize(GTK_WIDGET(window_));
+  g_signal_connect_swapped(surface(), "layout", G_CALLBACK(+changed), this);
   setTraitCollection(traitsFor(static_cast<int>(bounds.width), static_cast<int>(bounds.height)));
   setPresentationHost(this);
 }
@@ -55,6 +59,7 @@ GtkWindowHost::~GtkWindowHost() {
   setPresentationHost(nullptr);
   if (const auto controller = navigation()) controller->setHost(nullptr);
   g_signal_handlers_disconnect_by_data(window_, this);
+  if (surface()) g_signal_handlers_disconnect_by_data(surface(), this);
   sheets_.clear();
   stack_.setPages({}, false, nullptr);
   pages_.clear();
@@ -329,6 +334,11 @@ void GtkWindowHost::sizeChanged() {
   int width = 0;
   int height = 0;
   gtk_window_get_default_size(widget(), &width, &height);
+  // With the whole screen, as a phone gives it, that is only what it would come back to.
+  if (surface() && (gtk_window_is_maximized(widget()) || gtk_window_is_fullscreen(widget()))) {
+    width = gdk_surface_get_width(surface());
+    height = gdk_surface_get_height(surface());
+  }
   if (width <= 0 || height <= 0) return;
   setTraitCollection(traitsFor(width, height));
   for (const auto& [screen, page] : pages_) {

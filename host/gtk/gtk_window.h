@@ -46,6 +46,8 @@ class GtkWindowHost : public Window, private NavigationHost, private Presentatio
                std::function<void()> done) override;
   void dismiss(const ViewControllerRef& presented, bool animated, std::function<void()> done) override;
 
+  /// Null once the window is gone.
+  GdkSurface* surface() const { return gtk_native_get_surface(GTK_NATIVE(window_)); }
   std::shared_ptr<NavigationController> navigation() const;
   /// Unless the screen on top takes the way back away.
   void goBack();

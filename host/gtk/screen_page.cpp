@@ -149,7 +149,8 @@ void ScreenPage::showBar() {
     adw_header_bar_pack_end(ADW_HEADER_BAR(header_), barWidgets_.back());
   }
   // Where there is Cancel in the place of the way back, there is Done as well; items are selected by help of the menu.
-  if (menuButton_) gtk_widget_set_visible(menuButton_, !narrow_ || hostScreen_ || !leftTakesPlace);
+  const bool mustBeAnswered = leftTakesPlace || item.hidesBackButton();
+  if (menuButton_) gtk_widget_set_visible(menuButton_, !narrow_ || hostScreen_ || !mustBeAnswered);
   if (preview_) showPreviewWidgets();
 }
 

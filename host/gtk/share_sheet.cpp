@@ -7,6 +7,7 @@
 
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
+#include "platform/platform.h"
 
 namespace vaelo {
 
@@ -19,7 +20,7 @@ void deleteCallback(gpointer held, GClosure*) { delete static_cast<Callback*>(he
 std::string factsOf(const SharedItem& item) {
   const std::string kind = takeString(g_content_type_get_description(item.contentType.c_str()));
   if (item.folder) return kind;
-  return kind + " · " + takeString(g_format_size(item.size));
+  return kind + " · " + Platform::current().formatting.byteCount(item.size, ByteCountStyle::File);
 }
 
 GtkWidget* makeText(const std::string& text, const char* style) {

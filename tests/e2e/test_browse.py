@@ -4,7 +4,7 @@ import os
 import shutil
 import unittest
 
-from harness import App, wait_for
+from harness import App, Desktop, wait_for
 
 
 class FirstStart(unittest.TestCase):
@@ -207,6 +207,34 @@ class Narrow(unittest.TestCase):
         app.wait("Search", "push button")
         app.resize(800, 640)
         app.wait("Select", "label")
+
+
+class MaximizingDesktop(Desktop):
+    """Its windows take the whole screen, and leave it, by F12."""
+
+    def start_window_manager(self):
+        settings = self.scratch / "openbox.xml"
+        settings.write_text('<openbox_config xmlns="http://openbox.org/3.4/rc"><keyboard><keybind key="F12">'
+                            '<action name="ToggleMaximize"/></keybind></keyboard></openbox_config>')
+        self.start(["openbox", "--sm-disable", "--config-file", str(settings)], self.environment)
+
+
+class MaximizingApp(App):
+    desktop_type = MaximizingDesktop
+
+
+class Maximized(unittest.TestCase):
+    def test_a_narrow_window_is_wide_when_it_takes_the_whole_screen(self):
+        app = MaximizingApp(size=(360, 720), demo=True)
+        self.addCleanup(app.close)
+        app.wait("Documents,", "list item")
+        self.assertIsNone(app.find("Select", "label"))
+        app.key("F12")
+        wait_for("the whole screen", lambda: app.find("Vaelo Drive", "frame")[4] > 1200)
+        app.wait("Select", "label")
+        app.key("F12")
+        wait_for("the narrow window", lambda: app.find("Vaelo Drive", "frame")[4] < 400)
+        wait_for("the icon", lambda: not app.find("Select", "label"))
 
 
 class Links(unittest.TestCase):

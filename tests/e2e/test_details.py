@@ -41,6 +41,16 @@ class Upright(Details):
         self.assertGreater(share[3], facts[3])
 
 
+    def test_the_title_of_renaming_stands_whole(self):
+        def width():
+            return next(row for row in self.app.accessibility.showing() if row[:2] == ("label", "Rename File") and row[3] < 46)[4]
+        self.edit()
+        narrow = width()
+        self.app.resize(800, 640)
+        wait_for("the wide window", lambda: self.app.find("Vaelo Drive", "frame")[4] > 700)
+        self.assertEqual(narrow, width(), "cut where it is narrow")
+
+
 class Wide(Details):
     size = (1280, 800)
 

@@ -169,6 +169,6 @@ class Stage:
         picture = self.settle()
         if name not in self.wanted:
             return
-        picture = picture.quantize(256, dither=Image.Dither.NONE)
+        picture = picture.quantize(256, Image.Quantize.MAXCOVERAGE, dither=Image.Dither.NONE)
         self.folder.mkdir(parents=True, exist_ok=True)
         picture.save(self.folder / f"{name}-{self.size[0]}x{self.size[1]}-{self.style}.png", optimize=True)
