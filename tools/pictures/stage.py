@@ -59,6 +59,15 @@ def furnish(app):
                                            "application/pdf=org.example.Reader.desktop;\n")
 
 
+def reduced(picture):
+    """In 256 colours: those of the large areas as they are, the rest so that a small dot keeps its own."""
+    exact = [color for _, color in sorted(picture.getcolors(picture.width * picture.height), reverse=True)[:128]]
+    others = picture.quantize(128, Image.Quantize.MAXCOVERAGE).getpalette()[:3 * 128]
+    palette = Image.new("P", (1, 1))
+    palette.putpalette([value for color in exact for value in color] + others)
+    return picture.quantize(palette=palette, dither=Image.Dither.NONE)
+
+
 class Stage:
     def __init__(self, style, size, wanted, folder):
         self.style, self.size, self.wanted, self.folder = style, size, wanted, folder
@@ -169,6 +178,6 @@ class Stage:
         picture = self.settle()
         if name not in self.wanted:
             return
-        picture = picture.quantize(256, Image.Quantize.MAXCOVERAGE, dither=Image.Dither.NONE)
+        picture = reduced(picture)
         self.folder.mkdir(parents=True, exist_ok=True)
         picture.save(self.folder / f"{name}-{self.size[0]}x{self.size[1]}-{self.style}.png", optimize=True)
