@@ -29,7 +29,7 @@ class PreviewOfficeTest : public preview_test::PreviewViewTest {
     }
     ::setenv("PATH", bin_.c_str(), 1);
     makePortableDocument();
-    folder_.write("Letter.odt", "a letter");
+    folder_.write("Letter.odt", "PK\x03\x04 a letter");
   }
   void TearDown() override {
     PreviewViewTest::TearDown();
@@ -142,6 +142,22 @@ TEST_F(PreviewOfficeTest, ASuiteThatFailsSaysSo) {
   EXPECT_EQ(failure_, "This document is damaged and can’t be shown.");
 }
 
+// Which would show it as a text of odd letters.
+TEST_F(PreviewOfficeTest, WhatIsNoArchiveIsNotGivenToTheSuite) {
+  installOneThatWorks();
+  for (const char* content : {"no letter", "PK"}) {
+    folder_.write("Letter.odt", content);
+    open("Letter.odt", LetterType);
+    EXPECT_EQ(failure_, "This document can’t be shown. It may be damaged or protected by a password.") << content;
+    EXPECT_EQ(this->content("process"), "");
+  }
+  open("Letter.odt", "application/msword");
+  EXPECT_EQ(failure_, "") << "letters of old are of many forms";
+  folder_.write("Letter.odt", "\xd0\xcf\x11\xe0 encrypted");
+  open("Letter.odt", LetterType);
+  EXPECT_EQ(failure_, "") << "the suite says why";
+}
+
 TEST_F(PreviewOfficeTest, LeavingEndsTheSuiteWithAllItsProcesses) {
   install("tail -f /dev/null & echo $! >>" + pathOf("process") + "; echo >" + pathOf("ready") + "; wait");
   begin("Letter.odt", LetterType);
@@ -162,7 +178,7 @@ TEST_F(PreviewOfficeTest, ASuiteThatHangsIsEnded) {
   bool done = false;
   OfficeConversion::Problem problem = OfficeConversion::Problem::None;
   OfficeConversion conversion(
-      pathOf("Letter.odt"),
+      pathOf("Letter.odt"), OfficeConversion::Form::Packed,
       [&](const std::string& document, OfficeConversion::Problem said) {
         EXPECT_EQ(document, "");
         problem = said;

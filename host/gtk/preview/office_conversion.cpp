@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/preview/office_conversion.h"
 
+#include <fcntl.h>
 #include <gio/gio.h>
 #include <sys/prctl.h>
 #include <sys/resource.h>
@@ -9,6 +10,7 @@
 #include <csignal>
 #include <cstdlib>
 #include <filesystem>
+#include <string_view>
 #include <utility>
 
 #include "host/support/glib_ptr.h"
@@ -29,8 +31,25 @@ std::string program() {
   return "";
 }
 
-// In the child, before it becomes the office suite, whose processes all belong to one group then.
-void prepareChild(gpointer) {
+struct Child {
+  const char* path;
+  OfficeConversion::Form form;
+};
+
+bool isPacked(const char* path) {
+  const int file = ::open(path, O_RDONLY | O_NONBLOCK | O_NOCTTY | O_CLOEXEC);
+  const std::string_view forms[] = {"PK\x03\x04", "\xd0\xcf\x11\xe0"};
+  char begin[4] = {};
+  const bool isRead = file >= 0 && ::read(file, begin, sizeof begin) == sizeof begin;
+  if (file >= 0) ::close(file);
+  return isRead && (forms[0] == std::string_view(begin, sizeof begin) || forms[1] == std::string_view(begin, sizeof begin));
+}
+
+// In the child, before it becomes the office suite, whose processes all belong to one group then. Nothing else may be done
+// here than what a signal handler may do.
+void prepareChild(gpointer data) {
+  const auto* child = static_cast<const Child*>(data);
+  if (child->form == OfficeConversion::Form::Packed && !isPacked(child->path)) ::_exit(EXIT_FAILURE);
   ::setpgid(0, 0);
   ::prctl(PR_SET_PDEATHSIG, SIGKILL);
   const rlimit written = {MostWritten, MostWritten};
@@ -69,11 +88,12 @@ struct OfficeConversion::State {
   State(const State&) = delete;
   State& operator=(const State&) = delete;
 
-  bool start(const std::string& path) {
+  bool start(const std::string& path, Form form) {
     if (folder.empty()) return false;
     const GRef<GSubprocessLauncher> launcher(g_subprocess_launcher_new(
         static_cast<GSubprocessFlags>(G_SUBPROCESS_FLAGS_STDOUT_SILENCE | G_SUBPROCESS_FLAGS_STDERR_SILENCE)));
-    g_subprocess_launcher_set_child_setup(launcher.get(), prepareChild, nullptr, nullptr);
+    Child child = {path.c_str(), form};
+    g_subprocess_launcher_set_child_setup(launcher.get(), prepareChild, &child, nullptr);
     g_subprocess_launcher_set_cwd(launcher.get(), folder.c_str());
     g_subprocess_launcher_setenv(launcher.get(), "TMPDIR", folder.c_str(), TRUE);
     const std::string profile = "-env:UserInstallation=file://" + folder + "/profile";
@@ -91,10 +111,10 @@ struct OfficeConversion::State {
   }
 };
 
-OfficeConversion::OfficeConversion(const std::string& path, Done done, std::chrono::milliseconds limit)
+OfficeConversion::OfficeConversion(const std::string& path, Form form, Done done, std::chrono::milliseconds limit)
     : state_(std::make_shared<State>()), done_(std::move(done)) {
   state_->conversion = this;
-  const bool started = state_->start(path);
+  const bool started = state_->start(path, form);
   timer_ = g_timeout_add(
       started ? static_cast<guint>(limit.count()) : 0,
       +[](gpointer data) -> gboolean {

@@ -13,11 +13,14 @@ namespace vaelo {
 class OfficeConversion {
  public:
   enum class Problem { None, Failed, TooSlow };
+  enum class Form { Any, Packed };  ///< Packed: an archive, or encrypted as a whole
   /// `document` is the path of the portable document, which stays as long as the object; empty with a problem.
   using Done = std::function<void(const std::string& document, Problem problem)>;
 
   /// `done` is called once, not by the constructor, and not after the object is gone; it may end the object.
-  OfficeConversion(const std::string& path, Done done, std::chrono::milliseconds limit = std::chrono::seconds(60));
+  /// What hasn't the form fails: the suite would show its bytes as letters.
+  OfficeConversion(const std::string& path, Form form, Done done,
+                   std::chrono::milliseconds limit = std::chrono::seconds(60));
   ~OfficeConversion();
   OfficeConversion(const OfficeConversion&) = delete;
   OfficeConversion& operator=(const OfficeConversion&) = delete;

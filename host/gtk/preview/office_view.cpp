@@ -44,6 +44,13 @@ constexpr std::array<std::string_view, 8> OfficeTypeBeginnings = {
     "application/vnd.ms-powerpoint.",
 };
 
+OfficeConversion::Form formOf(const std::string& contentType) {
+  const bool isPacked = contentType.starts_with("application/vnd.oasis.opendocument.") ||
+                        contentType.starts_with("application/vnd.openxmlformats-officedocument.");
+  const bool isFlat = contentType.ends_with("-flat-xml");
+  return isPacked && !isFlat ? OfficeConversion::Form::Packed : OfficeConversion::Form::Any;
+}
+
 /// The document as a portable one, which has the view for those.
 class OfficeView : public DocumentView {
  public:
@@ -77,7 +84,8 @@ class OfficeView : public DocumentView {
  private:
   void convert() {
     converting_ = std::make_unique<OfficeConversion>(
-        document_.path, [this](const std::string& made, OfficeConversion::Problem problem) { converted(made, problem); });
+        document_.path, formOf(document_.contentType),
+        [this](const std::string& made, OfficeConversion::Problem problem) { converted(made, problem); });
   }
 
   void converted(const std::string& made, OfficeConversion::Problem problem) {
