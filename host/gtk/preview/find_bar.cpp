@@ -43,8 +43,12 @@ FindBar::FindBar(GtkWidget* content, Events events)
   g_signal_connect_swapped(entry_, "previous-match", G_CALLBACK(+[](FindBar* self) { self->step(false); }), this);
   g_signal_connect_swapped(onwards, "clicked", G_CALLBACK(+[](FindBar* self) { self->step(true); }), this);
   g_signal_connect_swapped(back, "clicked", G_CALLBACK(+[](FindBar* self) { self->step(false); }), this);
+  // At Escape the entry closes the bar by itself. It would keep the focus until it is out of sight, and take what is
+  // pressed.
   g_signal_connect_swapped(bar_, "notify::search-mode-enabled", G_CALLBACK(+[](FindBar* self) {
-                             if (!gtk_search_bar_get_search_mode(GTK_SEARCH_BAR(self->bar_))) self->textChanged();
+                             if (gtk_search_bar_get_search_mode(GTK_SEARCH_BAR(self->bar_))) return;
+                             self->textChanged();
+                             gtk_widget_grab_focus(self->content_);
                            }),
                            this);
   GtkEventController* keys = gtk_event_controller_key_new();
@@ -70,13 +74,12 @@ FindBar::~FindBar() {
 void FindBar::toggle() {
   const bool open = !gtk_search_bar_get_search_mode(GTK_SEARCH_BAR(bar_));
   gtk_search_bar_set_search_mode(GTK_SEARCH_BAR(bar_), open);
-  gtk_widget_grab_focus(open ? entry_ : content_);
+  if (open) gtk_widget_grab_focus(entry_);
 }
 
 bool FindBar::close() {
   if (!gtk_search_bar_get_search_mode(GTK_SEARCH_BAR(bar_))) return false;
   gtk_search_bar_set_search_mode(GTK_SEARCH_BAR(bar_), FALSE);
-  gtk_widget_grab_focus(content_);
   return true;
 }
 
