@@ -30,6 +30,32 @@ TEST_F(PortableDocumentViewTest, SaysWhyADocumentIsNotShown) {
   EXPECT_EQ(failure_, "This document is damaged and can’t be shown.");
 }
 
+TEST_F(PortableDocumentViewTest, EachPageThatShowsIsAPartInItsPlace) {
+  writeDocument(folder_.path() + "/a.pdf", 40);
+  open();
+  PagesCanvas& canvas = screen_->canvas();
+  const auto partsAre = [&canvas] {
+    const auto [first, last] = canvas.visiblePages();
+    int page = first;
+    for (GtkWidget* part = gtk_widget_get_first_child(canvas.widget()); part; part = gtk_widget_get_next_sibling(part)) {
+      if (!gtk_widget_get_visible(part)) continue;
+      graphene_rect_t place;
+      const PageArea area = canvas.areaOf(page++);
+      if (!gtk_widget_compute_bounds(part, canvas.widget(), &place)) return false;
+      if (std::abs(static_cast<double>(place.origin.y) - area.y) > 1) return false;
+      if (std::abs(static_cast<double>(place.size.height) - area.height) > 2) return false;
+    }
+    return page == last + 1;
+  };
+  EXPECT_TRUE(waitUntil(partsAre));
+  canvas.showPage(20, 300);
+  EXPECT_TRUE(waitUntil(partsAre));
+  canvas.zoomTo(0.2, 0, 0);
+  EXPECT_TRUE(waitUntil(partsAre)) << "of more pages than before";
+  canvas.fit();
+  EXPECT_TRUE(waitUntil(partsAre)) << "of fewer";
+}
+
 TEST_F(PortableDocumentViewTest, ADocumentReadAnewStaysWhereItWas) {
   writeDocument(folder_.path() + "/a.pdf", 30);
   open();

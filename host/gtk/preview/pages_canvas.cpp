@@ -88,18 +88,19 @@ void drawPaper(GtkSnapshot* snapshot, const PageArea& area) {
 
 }  // namespace
 
-PagesCanvas::PagesCanvas(Events events) : events_(std::move(events)), area_(GTK_WIDGET(g_object_new(areaType(), nullptr))) {
-  g_object_ref_sink(area_);
-  reinterpret_cast<PagesArea*>(area_)->canvas = this;
-  gtk_widget_set_focusable(area_, TRUE);
-  gtk_widget_set_overflow(area_, GTK_OVERFLOW_HIDDEN);
+PagesCanvas::PagesCanvas(Events events)
+    : events_(std::move(events)),
+      area_(GTK_WIDGET(g_object_ref_sink(g_object_new(areaType(), nullptr)))),
+      parts_(area_.get()) {
+  reinterpret_cast<PagesArea*>(area_.get())->canvas = this;
+  gtk_widget_set_focusable(area_.get(), TRUE);
+  gtk_widget_set_overflow(area_.get(), GTK_OVERFLOW_HIDDEN);
 }
 
 PagesCanvas::~PagesCanvas() {
   setAdjustment(true, nullptr);
   setAdjustment(false, nullptr);
-  reinterpret_cast<PagesArea*>(area_)->canvas = nullptr;
-  g_object_unref(area_);
+  reinterpret_cast<PagesArea*>(area_.get())->canvas = nullptr;
 }
 
 void PagesCanvas::setAdjustment(bool horizontal, GtkAdjustment* adjustment) {
@@ -122,7 +123,10 @@ double PagesCanvas::scrolled(bool horizontal) const {
 
 void PagesCanvas::changed() {
   if (configuring_) return;
-  gtk_widget_queue_draw(area_);
+  gtk_widget_queue_draw(area_.get());
+  const auto [first, last] = visiblePages();
+  parts_.show(first, last, layout_.count());
+  if (!allocating_) gtk_widget_queue_allocate(area_.get());
   events_.moved();
 }
 
@@ -247,7 +251,13 @@ int PagesCanvas::currentPage() const {
 }
 
 void PagesCanvas::allocated(double width, double height) {
-  if (width == width_ && height == height_) return;
+  allocating_ = true;
+  if (width != width_ || height != height_) resized(width, height);
+  allocating_ = false;
+  parts_.allocate([this](int page) { return areaOf(page); });
+}
+
+void PagesCanvas::resized(double width, double height) {
   const PagePlace top = placeAt(width_ / 2, 0);
   width_ = width;
   height_ = height;
@@ -263,7 +273,7 @@ void PagesCanvas::snapshot(GtkSnapshot* snapshot) {
   for (int page = first; page <= last; ++page) {
     PageArea area = areaOf(page);
     // On whole pixels of the screen, or letters would be blurred.
-    const double pixels = gtk_widget_get_scale_factor(area_);
+    const double pixels = gtk_widget_get_scale_factor(area_.get());
     area.x = std::round(area.x * pixels) / pixels;
     area.y = std::round(area.y * pixels) / pixels;
     drawPaper(snapshot, area);

@@ -6,7 +6,9 @@
 #include <functional>
 #include <utility>
 
+#include "host/gtk/preview/page_parts.h"
 #include "host/gtk/preview/pages_layout.h"
+#include "host/support/glib_ptr.h"
 
 namespace vaelo {
 
@@ -34,8 +36,8 @@ class PagesCanvas {
   PagesCanvas(const PagesCanvas&) = delete;
   PagesCanvas& operator=(const PagesCanvas&) = delete;
   /// A scrollable widget.
-  GtkWidget* widget() const { return area_; }
-  void redraw() { gtk_widget_queue_draw(area_); }
+  GtkWidget* widget() const { return area_.get(); }
+  void redraw() { gtk_widget_queue_draw(area_.get()); }
 
   const PagesLayout& layout() const { return layout_; }
   void setCount(int count);
@@ -68,6 +70,7 @@ class PagesCanvas {
   int currentPage() const;
   double width() const { return width_; }
   double height() const { return height_; }
+  PageParts& parts() { return parts_; }
 
   // For the widget.
   void allocated(double width, double height);
@@ -79,16 +82,19 @@ class PagesCanvas {
   double scrolled(bool horizontal) const;
   void configure(double x, double y);
   void changed();
+  void resized(double width, double height);
 
   Events events_;
   PagesLayout layout_;
-  GtkWidget* area_;
+  GRef<GtkWidget> area_;
+  PageParts parts_;
   GtkAdjustment* adjustments_[2] = {};
   double width_ = 0;
   double height_ = 0;
   double zoom_ = 1;
   bool fits_ = true;
   bool configuring_ = false;
+  bool allocating_ = false;
 };
 
 }  // namespace vaelo

@@ -16,6 +16,7 @@ PortableDocumentPassword::PortableDocumentPassword(std::function<void(const std:
   gtk_password_entry_set_show_peek_icon(GTK_PASSWORD_ENTRY(entry_), TRUE);
   g_object_set(entry_, "placeholder-text", _("Password"), nullptr);
   gtk_accessible_update_property(GTK_ACCESSIBLE(entry_), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Password"), -1);
+  gtk_label_set_wrap(GTK_LABEL(wrong_), TRUE);
   gtk_widget_add_css_class(wrong_, "error");
   gtk_widget_set_visible(wrong_, FALSE);
   GtkWidget* open = gtk_button_new_with_label(_("Open"));

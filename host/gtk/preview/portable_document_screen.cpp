@@ -60,7 +60,9 @@ PortableDocumentScreen::PortableDocumentScreen(const PreviewedDocument& document
         canvas_.showPage(page);
         gtk_widget_grab_focus(canvas_.widget());
       }),
-      password_([this](const std::string& password) { load(password); }) {
+      password_([this](const std::string& password) { load(password); }),
+      reading_(canvas_, [this](int page) { return texts_ ? texts_->of(page) : nullptr; }) {
+  gtk_stack_set_hhomogeneous(GTK_STACK(stack_.get()), FALSE);  // what doesn't show asks for no room
   gtk_stack_add_child(GTK_STACK(stack_.get()), pages_);
   gtk_accessible_update_property(GTK_ACCESSIBLE(canvas_.widget()), GTK_ACCESSIBLE_PROPERTY_LABEL, document_.name.c_str(),
                                  -1);
@@ -100,11 +102,17 @@ void PortableDocumentScreen::opened(const PortableDocumentSource::Opened& opened
   find_.setSource(nullptr, 0);
   selecting_.clear();
   source_ = std::move(nextSource_);
-  texts_ = std::make_unique<PagesTexts>(*source_, [this] { selecting_.textRead(); });
+  texts_ = std::make_unique<PagesTexts>(*source_, [this] {
+    selecting_.textRead();
+    reading_.update();
+  });
   links_ = std::make_unique<PagesLinks>(*source_);
   pictures_ = std::make_unique<PagesPictures>(*source_, [this] { pictureArrived(); });
   GtkWidget* page = gtk_widget_get_parent(stack_.get());
-  if (page && gtk_widget_get_width(page) > 0) canvas_.expectWidth(gtk_widget_get_width(page));
+  if (page && gtk_widget_get_width(page) > 0) {
+    canvas_.expectWidth(gtk_widget_get_width(page));
+    buttons_.fit(gtk_widget_get_width(page));  // before they are shown, or the window would be made wider for them
+  }
   // A document that is read anew is shown where it was.
   const PagePlace top = canvas_.placeAt(0, 0);
   const bool isAnew = canvas_.layout().count() > 0;
@@ -153,6 +161,7 @@ void PortableDocumentScreen::moved() {
     if (page >= 0 && page < layout.count()) wanted.push_back({page, layout.size(page), std::nullopt});
   }
   pictures_->want(std::move(wanted), canvas_.zoom() * gtk_widget_get_scale_factor(stack_.get()));
+  reading_.update();
 }
 
 void PortableDocumentScreen::pictureArrived() {

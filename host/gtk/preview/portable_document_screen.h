@@ -17,6 +17,7 @@
 #include "host/gtk/preview/pages_links.h"
 #include "host/gtk/preview/pages_pictures.h"
 #include "host/gtk/preview/pages_pointer.h"
+#include "host/gtk/preview/pages_reading.h"
 #include "host/gtk/preview/pages_selecting.h"
 #include "host/gtk/preview/pages_texts.h"
 #include "host/gtk/preview/portable_document_find.h"
@@ -94,6 +95,7 @@ class PortableDocumentScreen {
   std::unique_ptr<PortableDocumentSource> source_;
   std::unique_ptr<PagesPictures> pictures_;
   std::unique_ptr<PagesTexts> texts_;
+  PagesReading reading_;
   std::unique_ptr<PagesLinks> links_;
   std::unique_ptr<PortableDocumentSource> nextSource_;  // while the document is read anew
   bool shown_ = false;
