@@ -32,6 +32,7 @@ class FolderListScreen : public DocumentListController, public HostScreen {
   bool toggleSearch() override;
   bool closeSearch() override;
   void refresh() override { folderView().refresh(); }
+  void takeFocus() override { folderView().grabFocusWhenLoaded(); }
   void showSearch(const std::shared_ptr<SearchController>& search) override;
   void hideSearch() override;
 

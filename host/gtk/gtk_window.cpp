@@ -43,6 +43,7 @@ GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds, Dr
   stack_.onSwipedBack([this](std::size_t left) {
     if (const auto controller = navigation()) controller->userWentBackTo(left);
     followTop();
+    if (ScreenPage* page = topPage()) page->takeFocus();
   });
   const auto changed = [](GtkWindowHost* self) { self->sizeChanged(); };
   for (const char* property :
@@ -184,6 +185,8 @@ void GtkWindowHost::stackChanged(const Stack&, const Stack& newStack, bool anima
                   [&](const auto& entry) { return !holds(newStack, entry.first) && !holds(latestStack_, entry.first); });
     done();
   });
+  // The keyboard went to the first button of the page, where Enter would go back.
+  if (ScreenPage* page = topPage()) page->takeFocus();
 }
 
 void GtkWindowHost::toolbarHiddenChanged(bool hidden, bool) {

@@ -28,6 +28,8 @@ class HostScreen {
   virtual bool toggleSearch() { return false; }
   virtual bool closeSearch() { return false; }
   virtual void refresh() {}
+  /// The page came to be the one that shows: its content takes the keyboard, where there is something to do with it.
+  virtual void takeFocus() {}
   /// Shows the search that was presented over the screen, and takes it away.
   virtual void showSearch(const std::shared_ptr<SearchController>& /*search*/) {}
   virtual void hideSearch() {}

@@ -3,6 +3,7 @@
 
 #include <memory>
 
+#include "host/gtk/focus_return.h"
 #include "host/support/texts.h"
 #include "platform/ui/document_list_controller_delegate.h"
 
@@ -96,6 +97,7 @@ void showItemActionsMenu(GtkWidget* over, const GdkRectangle& at, unsigned avail
                          g_object_ref(closed), nullptr);
                    }),
                    nullptr);
+  returnFocusWhenClosed(popover);
   gtk_popover_popup(GTK_POPOVER(popover));
 }
 

@@ -3,10 +3,12 @@
 
 #include <adwaita.h>
 
+#include <algorithm>
 #include <vector>
 
 #include "host/gtk/mirrored_field.h"
 #include "host/gtk/mirrored_text.h"
+#include "host/gtk/pango_graphics.h"
 #include "platform/platform.h"
 #include "platform/ui/keyboard_notice.h"
 
@@ -59,6 +61,11 @@ class PromptDialog : public ViewObserver {
     for (const std::shared_ptr<TextField>& field : alert_->textFields()) {
       fields_.push_back(std::make_unique<MirroredField>(*field));
       field->setObserver(this);
+      // What a field is for is written above it, where a screen reader doesn't look.
+      if (field->accessibilityLabel().empty()) {
+        gtk_accessible_update_property(GTK_ACCESSIBLE(fields_.back()->widget()), GTK_ACCESSIBLE_PROPERTY_LABEL,
+                                       alert_->message().empty() ? alert_->title().c_str() : alert_->message().c_str(), -1);
+      }
       gtk_box_append(GTK_BOX(box), fields_.back()->widget());
     }
     if (const ViewControllerRef& content = alert_->contentViewController()) addContent(box, content->view());
@@ -82,6 +89,8 @@ class PromptDialog : public ViewObserver {
     GtkWidget* label = gtk_label_new(text.c_str());
     gtk_label_set_wrap(GTK_LABEL(label), TRUE);
     gtk_label_set_justify(GTK_LABEL(label), GTK_JUSTIFY_CENTER);
+    constexpr double phoneWidth = 32;  // characters of the usual size
+    gtk_label_set_max_width_chars(GTK_LABEL(label), static_cast<int>(phoneWidth / std::max(textScale(), 1.0)));
     if (style) gtk_widget_add_css_class(label, style);
     gtk_box_append(GTK_BOX(box), label);
   }

@@ -1,11 +1,15 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/screen_page.h"
 
+#include <utility>
+
 #include "host/gtk/bar_item_widget.h"
 #include "host/gtk/details_tags.h"
 #include "host/gtk/host_screen.h"
 #include "host/gtk/mirror/view_mirror.h"
+#include "host/gtk/pango_graphics.h"
 #include "host/gtk/preview/preview_page.h"
+#include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
 #include "preview/preview_details_view_controller.h"
 
@@ -13,7 +17,22 @@ namespace vaelo {
 
 namespace {
 constexpr const char* NarrowActions = "narrow";
+constexpr double LargeText = 1.3;  // times the usual size
+constexpr const char* TightClass = "vaelo-tight";
+constexpr const char* TightStyle =
+    ".vaelo-tight headerbar button.text-button, .vaelo-tight .toolbar button { padding-left: 6px; padding-right: 6px; }";
+
+void addStyle() {
+  static bool added = false;
+  GdkDisplay* display = gdk_display_get_default();
+  if (std::exchange(added, true) || !display) return;
+  const GRef<GtkCssProvider> provider(gtk_css_provider_new());
+  gtk_css_provider_load_from_data(provider.get(), TightStyle, -1);
+  gtk_style_context_add_provider_for_display(display, GTK_STYLE_PROVIDER(provider.get()),
+                                             GTK_STYLE_PROVIDER_PRIORITY_APPLICATION);
 }
+
+}  // namespace
 
 ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, GMenuModel* menu, DriveSyncedStore& tags)
     : screen_(std::move(screen)),
@@ -25,6 +44,7 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
       toolbarEdge_(gtk_separator_new(GTK_ORIENTATION_HORIZONTAL)),
       toolbar_(gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 6)),
       goBack_(std::move(goBack)) {
+  addStyle();
   // What is in the page looks for its actions here only if this has had a place for them from the beginning.
   gtk_widget_insert_action_group(box_, NarrowActions, nullptr);
   adw_header_bar_set_title_widget(ADW_HEADER_BAR(header_), title_);
@@ -100,7 +120,10 @@ void ScreenPage::setToolbarHidden(bool hidden) {
 void ScreenPage::setNarrow(bool narrow) {
   if (narrow == narrow_) return;
   narrow_ = narrow;
-  adw_header_bar_set_decoration_layout(ADW_HEADER_BAR(header_), narrow ? ":close" : nullptr);
+  // Large letters need the room of the last of the window's own buttons, and of some of the others' edges.
+  const bool tight = narrow && textScale() > LargeText;
+  adw_header_bar_set_decoration_layout(ADW_HEADER_BAR(header_), tight ? ":" : narrow ? ":close" : nullptr);
+  (tight ? gtk_widget_add_css_class : gtk_widget_remove_css_class)(box_, TightClass);
   if (hostScreen_) {
     // The menu hides what it finds no action for.
     gtk_widget_insert_action_group(box_, NarrowActions, narrow ? hostScreen_->narrowActions() : nullptr);
@@ -130,6 +153,13 @@ void ScreenPage::showHostWidgets() {
   for (GtkWidget* widget : hostWidgets_) adw_header_bar_pack_end(ADW_HEADER_BAR(header_), widget);
 }
 
+void ScreenPage::takeFocus() {
+  GtkRoot* root = gtk_widget_get_root(box_);
+  GtkWidget* focus = root ? gtk_root_get_focus(root) : nullptr;
+  if (!hostScreen_ || (focus && gtk_widget_is_ancestor(focus, hostScreen_->contentWidget()))) return;
+  hostScreen_->takeFocus();
+}
+
 void ScreenPage::showBar() {
   NavigationItem& item = screen_->navigationItem();
   adw_window_title_set_title(ADW_WINDOW_TITLE(title_), item.title().c_str());
@@ -152,6 +182,7 @@ void ScreenPage::showBar() {
   const bool mustBeAnswered = leftTakesPlace || item.hidesBackButton();
   if (menuButton_) gtk_widget_set_visible(menuButton_, !narrow_ || hostScreen_ || !mustBeAnswered);
   if (preview_) showPreviewWidgets();
+  keepFocus();
 }
 
 void ScreenPage::showPreviewWidgets() {
@@ -163,6 +194,12 @@ void ScreenPage::showPreviewWidgets() {
     adw_header_bar_pack_end(ADW_HEADER_BAR(header_), widget);
   }
   showToolbar();
+}
+
+void ScreenPage::keepFocus() {
+  GtkRoot* root = gtk_widget_get_root(box_);
+  GtkWidget* focus = root ? gtk_root_get_focus(root) : nullptr;
+  if (gtk_widget_get_mapped(box_) && !(focus && gtk_widget_get_mapped(focus))) takeFocus();
 }
 
 void ScreenPage::showToolbar() {
@@ -177,6 +214,7 @@ void ScreenPage::showToolbar() {
   }
   const bool shows = !buttons.empty() || (!toolbarHidden_ && !screen_->toolbarItems().empty());
   for (GtkWidget* widget : {toolbarEdge_, toolbar_}) gtk_widget_set_visible(widget, shows);
+  keepFocus();
 }
 
 }  // namespace vaelo

@@ -36,6 +36,8 @@ class ScreenPage {
   void showTags();
   /// Reads what is shown anew.
   void refresh();
+  /// Gives the keyboard to the content, unless something in it has it.
+  void takeFocus();
   /// A widget between header and content; the page owns it.
   void setBanner(GtkWidget* banner);
   void setCanGoBack(bool can);
@@ -50,6 +52,8 @@ class ScreenPage {
   /// The buttons of a preview stand in the header bar, or where it is narrow in the toolbar.
   void showPreviewWidgets();
   void showToolbar();
+  /// After buttons have gone, one of which may have had the keyboard.
+  void keepFocus();
 
   ViewControllerRef screen_;
   HostScreen* hostScreen_;

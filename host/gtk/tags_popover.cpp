@@ -15,6 +15,7 @@
 #include "host/drive/item_attributes.h"
 #include "host/drive/promise_file.h"
 #include "host/drive/small_file.h"
+#include "host/gtk/focus_return.h"
 #include "host/gtk/list/worker.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
@@ -165,6 +166,7 @@ class TagsPopover {
       if (checks_.size() >= MostRows) break;
       if (!on.contains(name) && isTagName(name)) addRow(name, false);
     }
+    returnFocusWhenClosed(popover_);
     gtk_popover_popup(GTK_POPOVER(popover_));
   }
 

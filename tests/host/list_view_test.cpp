@@ -3,6 +3,7 @@
 #include <unistd.h>
 
 #include "host/gtk/list/folder_reader.h"
+#include "host/gtk/list/folder_row.h"
 #include "host/gtk/list/folder_view.h"
 #include "tests/host/list_test_folder.h"
 
@@ -52,6 +53,36 @@ class FolderViewTest : public testing::Test {
   GtkWidget* list() const {
     GtkWidget* clamp = gtk_scrolled_window_get_child(GTK_SCROLLED_WINDOW(shownPage()));
     return adw_clamp_scrollable_get_child(ADW_CLAMP_SCROLLABLE(clamp));
+  }
+
+  /// Below the list.
+  GtkWidget* addEntry() {
+    GtkWidget* box = gtk_box_new(GTK_ORIENTATION_VERTICAL, 0);
+    GtkWidget* entry = gtk_entry_new();
+    gtk_window_set_child(GTK_WINDOW(window_), nullptr);
+    gtk_widget_set_vexpand(view_->widget(), TRUE);
+    gtk_box_append(GTK_BOX(box), view_->widget());
+    gtk_box_append(GTK_BOX(box), entry);
+    gtk_window_set_child(GTK_WINDOW(window_), box);
+    return entry;
+  }
+  std::string focusedRow() const {
+    GtkWidget* focus = gtk_window_get_focus(GTK_WINDOW(window_));
+    GtkWidget* row = focus && gtk_widget_is_ancestor(focus, list()) ? folderRowIn(focus) : nullptr;
+    return row ? std::string(folderItemOf(folderRowItem(row)).name) : std::string();
+  }
+  /// As if it were pressed; whether the view took it.
+  bool key(guint value) const {
+    GListModel* controllers = gtk_widget_observe_controllers(view_->widget());
+    gboolean taken = FALSE;
+    for (guint i = 0; i < g_list_model_get_n_items(controllers); ++i) {
+      auto* controller = static_cast<GtkEventController*>(g_list_model_get_item(controllers, i));
+      if (GTK_IS_EVENT_CONTROLLER_KEY(controller))
+        g_signal_emit_by_name(controller, "key-pressed", value, 0U, GdkModifierType(0), &taken);
+      g_object_unref(controller);
+    }
+    g_object_unref(controllers);
+    return taken;
   }
 
   TestFolder folder_;
@@ -210,6 +241,49 @@ TEST_F(FolderViewTest, SuppliedEntriesReplaceTheFolder) {
   EXPECT_EQ(names(), (std::vector<std::string>{"/nowhere/one", "/nowhere/two"}));
   g_signal_emit_by_name(list(), "activate", 1U);
   EXPECT_EQ(activated_, "/nowhere/two");
+}
+
+TEST_F(FolderViewTest, TheKeyboardComesToTheFirstRowWhenItIsThere) {
+  folder_.write("a");
+  folder_.write("b");
+  view_->grabFocusWhenLoaded();
+  open();
+  EXPECT_EQ(focusedRow(), "a");
+}
+
+TEST_F(FolderViewTest, TheKeyboardStaysWhereTheUserTookItMeanwhile) {
+  GtkWidget* elsewhere = addEntry();
+  folder_.write("a");
+  view_->grabFocusWhenLoaded();
+  gtk_widget_grab_focus(elsewhere);
+  open();
+  EXPECT_EQ(focusedRow(), "");
+  // The next one to come is no reason either.
+  folder_.write("b");
+  ASSERT_TRUE(waitUntil([&] { return view_->itemCount() == 2; }));
+  EXPECT_EQ(focusedRow(), "");
+}
+
+TEST_F(FolderViewTest, TheKeyboardStaysInTheListWhenItsRowGoes) {
+  for (const char* name : {"a", "b", "c"}) folder_.write(name);
+  view_->grabFocusWhenLoaded();
+  open();
+  folder_.remove("a");
+  ASSERT_TRUE(waitUntil([&] { return view_->itemCount() == 2; }));
+  EXPECT_EQ(focusedRow(), "b");
+}
+
+TEST_F(FolderViewTest, TabLeavesTheListAtOnce) {
+  GtkWidget* elsewhere = addEntry();
+  for (int i = 0; i < 20; ++i) folder_.write("file " + std::to_string(i));
+  open();
+  view_->grabFocus();
+  ASSERT_EQ(focusedRow(), "file 0");
+  EXPECT_TRUE(key(GDK_KEY_Tab));
+  GtkWidget* focus = gtk_window_get_focus(GTK_WINDOW(window_));
+  ASSERT_NE(focus, nullptr);
+  EXPECT_TRUE(gtk_widget_is_ancestor(focus, elsewhere));
+  EXPECT_FALSE(key(GDK_KEY_Tab)) << "which is no longer the list's";
 }
 
 TEST_F(FolderViewTest, GoesAwayWhileReading) {

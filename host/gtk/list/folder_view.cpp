@@ -235,6 +235,7 @@ void FolderView::setEntries(std::vector<FolderEntry> entries) {
   const std::optional<std::string> focusedName = focused ? std::optional(std::string(focused->name)) : std::nullopt;
   model_.setEntries(std::move(entries));
   showPage();
+  keepFocus(false);
   if (focusedName) {
     focusRevealed_ = scrollTo(*focusedName);
     if (!focusRevealed_) grabFocus();
@@ -290,6 +291,7 @@ void FolderView::folderRead(std::shared_ptr<const FolderSnapshot> next, const st
                             int errorNumber) {
   updating_ = false;
   const bool first = !loaded_;
+  const bool hadFocus = focusedItem() != nullptr;
   if (next) {
     loaded_ = true;
     errorNumber_ = 0;
@@ -305,6 +307,7 @@ void FolderView::folderRead(std::shared_ptr<const FolderSnapshot> next, const st
     if (events_.readFailed) events_.readFailed(errorNumber);
   }
   showPage();
+  keepFocus(hadFocus);
   if (errorNumber_ == 0 && (first || !splices.empty()) && events_.itemsChanged) events_.itemsChanged();
   if (pending_.everything || !pending_.names.empty()) lookUpChanges();
 }
@@ -418,5 +421,24 @@ double FolderView::scrollPosition() const { return gtk_adjustment_get_value(adju
 void FolderView::setScrollPosition(double position) { gtk_adjustment_set_value(adjustment(), position); }
 
 void FolderView::grabFocus() { gtk_widget_grab_focus(list_); }
+
+GtkWidget* FolderView::focus() const {
+  GtkRoot* root = gtk_widget_get_root(widget());
+  return root ? gtk_root_get_focus(root) : nullptr;
+}
+
+void FolderView::grabFocusWhenLoaded() {
+  if (loaded_) return grabFocus();
+  takesFocus_ = true;
+  focusBefore_ = focus();
+}
+
+void FolderView::keepFocus(bool hadFocus) {
+  GtkWidget* now = focus();
+  // A window that comes up gives the focus to its first button by itself.
+  const bool stayed = now == focusBefore_ || (!focusBefore_ && !GTK_IS_EDITABLE(now));
+  const bool takes = std::exchange(takesFocus_, false) && stayed;
+  if (takes || (hadFocus && !focusedItem())) grabFocus();
+}
 
 }  // namespace vaelo

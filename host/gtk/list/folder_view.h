@@ -100,6 +100,8 @@ class FolderView {
   void setScrollPosition(double position);
   /// Moves the keyboard's focus to the list.
   void grabFocus();
+  /// The same as soon as there are rows, unless the user has gone elsewhere by then.
+  void grabFocusWhenLoaded();
   /// The model behind the rows, for the owner's own tests and measurements.
   FolderModel& model() { return model_; }
 
@@ -131,6 +133,9 @@ class FolderView {
   void finishReveal();
   GtkAdjustment* adjustment() const;
   FolderItem* focusedItem() const;
+  GtkWidget* focus() const;
+  /// After the rows have changed; `hadFocus`: before, one of them had it.
+  void keepFocus(bool hadFocus);
 
   FolderViewEvents events_;
   std::string folder_;  // empty: entries
@@ -140,8 +145,10 @@ class FolderView {
   std::string revealed_;  // what scrollTo() is on the way to
   int framesToWait_ = 0;
   bool focusRevealed_ = false;
-  std::string lastPressed_;  // where a range begins
-  bool extends_ = false;     // the press that is under way has Shift
+  bool takesFocus_ = false;
+  const GtkWidget* focusBefore_ = nullptr;  // to compare with; may be gone
+  std::string lastPressed_;                 // where a range begins
+  bool extends_ = false;                    // the press that is under way has Shift
   int errorNumber_ = 0;
   FolderChanges pending_;
   bool updating_ = false;

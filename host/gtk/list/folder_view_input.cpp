@@ -17,10 +17,9 @@ FolderItem* itemOfRow(GtkWidget* row) {
 }  // namespace
 
 FolderItem* FolderView::focusedItem() const {
-  GtkRoot* root = gtk_widget_get_root(list_);
-  GtkWidget* focus = root ? gtk_root_get_focus(root) : nullptr;
-  if (!focus || focus == list_ || !gtk_widget_is_ancestor(focus, list_)) return nullptr;
-  return itemOfRow(folderRowIn(focus));
+  GtkWidget* focused = focus();
+  if (!focused || focused == list_ || !gtk_widget_is_ancestor(focused, list_)) return nullptr;
+  return itemOfRow(folderRowIn(focused));
 }
 
 void FolderView::connectKeys() {
@@ -44,6 +43,12 @@ bool FolderView::keyPressed(guint key, GdkModifierType modifiers) {
   }
   if (key == GDK_KEY_Menu || (key == GDK_KEY_F10 && (modifiers & GDK_SHIFT_MASK))) {
     requestContextAtFocus();
+    return true;
+  }
+  // From row to row the arrows go. The list's own Tab does as well, and what is behind thousands of rows is out of reach.
+  if ((key == GDK_KEY_Tab || key == GDK_KEY_ISO_Left_Tab) && plain && focusedItem()) {
+    const auto onwards = key == GDK_KEY_Tab ? GTK_DIR_TAB_FORWARD : GTK_DIR_TAB_BACKWARD;
+    g_signal_emit_by_name(scroller_, "move-focus-out", onwards);
     return true;
   }
   // The window knows more of it than the list, whose own key it is as well.

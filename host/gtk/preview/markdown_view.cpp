@@ -40,6 +40,7 @@ class MarkdownView : public DocumentView {
             [this](const std::string& address) { open(address); }) {
     GtkTextView* text = GTK_TEXT_VIEW(view_);
     gtk_text_view_set_editable(text, FALSE);
+    gtk_text_view_set_accepts_tab(text, FALSE);  // or the keyboard never leaves it
     gtk_text_view_set_cursor_visible(text, FALSE);
     gtk_text_view_set_wrap_mode(text, GTK_WRAP_WORD_CHAR);
     gtk_text_view_set_pixels_above_lines(text, 5);

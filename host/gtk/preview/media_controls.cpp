@@ -63,7 +63,10 @@ MediaControls::MediaControls(GtkMediaStream* stream, bool isFullScreen, std::fun
   gtk_scale_set_draw_value(GTK_SCALE(place_), FALSE);
   gtk_range_set_increments(GTK_RANGE(place_), 5, 30);
   gtk_accessible_update_property(GTK_ACCESSIBLE(place_), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Position"), -1);
-  gtk_accessible_update_property(GTK_ACCESSIBLE(volume_), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Volume"), -1);
+  // The keyboard comes to the button in it.
+  for (GtkWidget* named : {volume_, gtk_widget_get_first_child(volume_)}) {
+    gtk_accessible_update_property(GTK_ACCESSIBLE(named), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Volume"), -1);
+  }
   gtk_widget_set_valign(volume_, GTK_ALIGN_CENTER);
   for (GtkWidget* child : {play_, time_, place_, length_, volume_}) gtk_box_append(GTK_BOX(bar_), child);
   g_signal_connect_swapped(play_, "clicked", G_CALLBACK(toggleMedia), stream);

@@ -187,7 +187,16 @@ void PreviewPage::showView() {
   if (!view_ || gtk_stack_get_visible_child(GTK_STACK(stack_)) == view_->widget()) return;
   gtk_stack_set_visible_child(GTK_STACK(stack_), view_->widget());
   facts_.showNothing();  // of a document whose download it followed, nothing more is to be told
+  takeFocus();
   headerChanged_();
+}
+
+void PreviewPage::takeFocus() {
+  GtkWidget* page = gtk_widget_get_parent(stack_);
+  if (!page || !gtk_widget_get_mapped(page)) return;
+  GtkWidget* focus = gtk_root_get_focus(gtk_widget_get_root(page));
+  const bool elsewhere = focus && (!gtk_widget_is_ancestor(focus, page) || gtk_widget_is_ancestor(focus, stack_));
+  if (!elsewhere) gtk_widget_child_focus(stack_, GTK_DIR_TAB_FORWARD);
 }
 
 // The failed view is called back from itself here, so it goes away later.
@@ -195,6 +204,7 @@ void PreviewPage::showFacts(const std::string& message) {
   stopLoading();
   if (const std::optional<URL> shown = item()) facts_.show(*shown, message);
   gtk_stack_set_visible_child(GTK_STACK(stack_), facts_.widget());
+  takeFocus();
   headerChanged_();
 }
 

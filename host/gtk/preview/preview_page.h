@@ -49,6 +49,8 @@ class PreviewPage {
   void showFailure(const std::string& message);
   void makeView(const std::string& contentType);
   void showView();
+  /// Gives the keyboard to what shows, when it is at the page's buttons, where it came to when the page did.
+  void takeFocus();
   void showFacts(const std::string& message);
   void showLoadingSoon();
   void stopLoading();

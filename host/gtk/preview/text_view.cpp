@@ -49,6 +49,7 @@ class TextView : public DocumentView {
         zoom_(view_) {
     GtkTextView* text = GTK_TEXT_VIEW(view_);
     gtk_text_view_set_editable(text, FALSE);
+    gtk_text_view_set_accepts_tab(text, FALSE);  // or the keyboard never leaves it
     gtk_text_view_set_cursor_visible(text, FALSE);
     gtk_text_view_set_monospace(text, TRUE);
     gtk_text_view_set_wrap_mode(text, GTK_WRAP_WORD_CHAR);
