@@ -1,17 +1,21 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/action_sheet.h"
 
+#include <algorithm>
 #include <utility>
 
 #include "host/gtk/bar_item_widget.h"
 #include "host/gtk/gtk_window.h"
+#include "host/gtk/pango_graphics.h"
 #include "host/gtk/touch_size.h"
 
 namespace vaelo {
 
 namespace {
 
-constexpr int TextWidth = 36;  // characters
+/// In characters. A sheet is as high as its texts are at this width: it must be one that a phone has, with large letters
+/// too.
+int textWidth() { return static_cast<int>(36 / std::max(textScale(), 1.0)); }
 
 struct Pressed {
   std::weak_ptr<AlertController> alert;
@@ -24,7 +28,7 @@ void addText(GtkWidget* box, const std::string& text, const char* style) {
   gtk_label_set_wrap(GTK_LABEL(label), TRUE);
   gtk_label_set_wrap_mode(GTK_LABEL(label), PANGO_WRAP_WORD_CHAR);
   gtk_label_set_justify(GTK_LABEL(label), GTK_JUSTIFY_CENTER);
-  gtk_label_set_max_width_chars(GTK_LABEL(label), TextWidth);
+  gtk_label_set_max_width_chars(GTK_LABEL(label), textWidth());
   if (style) gtk_widget_add_css_class(label, style);
   gtk_box_append(GTK_BOX(box), label);
 }
@@ -58,14 +62,23 @@ GtkWidget* ActionSheet::makeContent(bool narrow) {
   for (const AlertActionRef& action : alert_->actions()) gtk_box_append(GTK_BOX(box), makeButton(action));
   if (!narrow) return box;
   // The margins belong to the sheet, which is as wide as the window.
-  GtkWidget* sheet = gtk_box_new(GTK_ORIENTATION_VERTICAL, 0);
   gtk_widget_set_hexpand(box, TRUE);
-  gtk_box_append(GTK_BOX(sheet), box);
+  // Large letters may make it higher than the window.
+  GtkWidget* sheet = gtk_scrolled_window_new();
+  gtk_scrolled_window_set_policy(GTK_SCROLLED_WINDOW(sheet), GTK_POLICY_NEVER, GTK_POLICY_AUTOMATIC);
+  gtk_scrolled_window_set_propagate_natural_height(GTK_SCROLLED_WINDOW(sheet), TRUE);
+  gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(sheet), box);
   return sheet;
 }
 
 GtkWidget* ActionSheet::makeButton(const AlertActionRef& action) {
   GtkWidget* button = gtk_button_new_with_label(action->title().c_str());
+  // Large letters, or a long language, would make the sheet wider than a phone.
+  GtkLabel* label = GTK_LABEL(gtk_button_get_child(GTK_BUTTON(button)));
+  gtk_label_set_wrap(label, TRUE);
+  gtk_label_set_wrap_mode(label, PANGO_WRAP_WORD_CHAR);
+  gtk_label_set_justify(label, GTK_JUSTIFY_CENTER);
+  gtk_label_set_max_width_chars(label, textWidth());
   gtk_widget_set_size_request(button, -1, TouchSize);
   gtk_widget_set_sensitive(button, action->enabled());
   if (action->style() == AlertActionStyle::Destructive) gtk_widget_add_css_class(button, "destructive-action");

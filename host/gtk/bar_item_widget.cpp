@@ -73,7 +73,12 @@ GtkWidget* makeBarItemWidget(const BarButtonItemRef& item, const char* icon) {
     gtk_widget_set_sensitive(button, shown->enabled());
     const auto* custom = dynamic_cast<const Button*>(shown->customView().get());
     const std::string& title = custom ? custom->title() : shown->title();
-    if (!look.icon) gtk_button_set_label(GTK_BUTTON(button), look.label ? look.label : title.c_str());
+    if (look.icon) return;
+    gtk_button_set_label(GTK_BUTTON(button), look.label ? look.label : title.c_str());
+    // Where large letters leave no room beside the other buttons.
+    GtkLabel* label = GTK_LABEL(gtk_button_get_child(GTK_BUTTON(button)));
+    gtk_label_set_wrap(label, TRUE);
+    gtk_label_set_justify(label, GTK_JUSTIFY_CENTER);
   };
   show();
   keepWithWidget(button, item->changed().connect([show](BarButtonItem&) { show(); }));

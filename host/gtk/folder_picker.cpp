@@ -11,6 +11,8 @@ namespace vaelo {
 
 namespace {
 
+constexpr int TouchSize = 44;
+
 void describe(GtkWidget* widget, const char* label) {
   gtk_widget_set_tooltip_text(widget, label);
   gtk_accessible_update_property(GTK_ACCESSIBLE(widget), GTK_ACCESSIBLE_PROPERTY_LABEL, label, -1);
@@ -68,28 +70,44 @@ void FolderPicker::build(GtkWindow* over) {
   describe(back_, _("Back"));
   g_signal_connect_swapped(back_, "clicked", G_CALLBACK(+[](FolderPicker* self) { self->goUp(); }), this);
   adw_header_bar_pack_start(ADW_HEADER_BAR(header), back_);
-  title_ = adw_window_title_new(nullptr, invitation().c_str());
+  title_ = adw_window_title_new(nullptr, nullptr);
   adw_header_bar_set_title_widget(ADW_HEADER_BAR(header), title_);
   move_ = gtk_button_new_with_label(_("Move"));
   gtk_widget_add_css_class(move_, "suggested-action");
   g_signal_connect_swapped(move_, "clicked", G_CALLBACK(+[](FolderPicker* self) { self->choose(); }), this);
-  adw_header_bar_pack_end(ADW_HEADER_BAR(header), move_);
   newFolder_ = gtk_button_new_from_icon_name("folder-new-symbolic");
   describe(newFolder_, _("New Folder"));
   g_signal_connect_swapped(newFolder_, "clicked", G_CALLBACK(+[](FolderPicker* self) { self->askForNewFolder(); }), this);
   adw_header_bar_pack_end(ADW_HEADER_BAR(header), newFolder_);
   gtk_box_append(GTK_BOX(box), header);
+  GtkWidget* question = gtk_label_new(invitation().c_str());
+  gtk_label_set_wrap(GTK_LABEL(question), TRUE);
+  gtk_label_set_wrap_mode(GTK_LABEL(question), PANGO_WRAP_WORD_CHAR);
+  gtk_label_set_lines(GTK_LABEL(question), 2);
+  gtk_label_set_ellipsize(GTK_LABEL(question), PANGO_ELLIPSIZE_MIDDLE);
+  gtk_label_set_justify(GTK_LABEL(question), GTK_JUSTIFY_CENTER);
+  gtk_widget_add_css_class(question, "dim-label");
+  for (void (*margin)(GtkWidget*, int) :
+       {gtk_widget_set_margin_top, gtk_widget_set_margin_bottom, gtk_widget_set_margin_start, gtk_widget_set_margin_end}) {
+    margin(question, 6);
+  }
+  gtk_box_append(GTK_BOX(box), question);
   gtk_widget_set_vexpand(view_.widget(), TRUE);
   gtk_box_append(GTK_BOX(box), view_.widget());
   refusal_ = gtk_label_new(nullptr);
   gtk_label_set_wrap(GTK_LABEL(refusal_), TRUE);
   gtk_label_set_justify(GTK_LABEL(refusal_), GTK_JUSTIFY_CENTER);
   gtk_widget_add_css_class(refusal_, "dim-label");
+  // Below the folders, where a thumb is: beside the other buttons a long language or large letters leave no room for it.
+  GtkWidget* bottom = gtk_box_new(GTK_ORIENTATION_VERTICAL, 12);
   for (void (*margin)(GtkWidget*, int) :
        {gtk_widget_set_margin_top, gtk_widget_set_margin_bottom, gtk_widget_set_margin_start, gtk_widget_set_margin_end}) {
-    margin(refusal_, 12);
+    margin(bottom, 12);
   }
-  gtk_box_append(GTK_BOX(box), refusal_);
+  gtk_widget_set_size_request(move_, -1, TouchSize);
+  gtk_box_append(GTK_BOX(bottom), refusal_);
+  gtk_box_append(GTK_BOX(bottom), move_);
+  gtk_box_append(GTK_BOX(box), bottom);
   adw_window_set_content(ADW_WINDOW(window_), box);
   g_signal_connect_swapped(window_, "close-request", G_CALLBACK(+[](FolderPicker* self) -> gboolean {
                              const auto kept = self->picker_;

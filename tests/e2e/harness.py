@@ -97,17 +97,28 @@ class Accessibility:
                                         stdout=subprocess.PIPE, stderr=subprocess.DEVNULL, text=True)
         desktop.processes.append(self.process)
 
-    def showing(self):
-        """(role, name, x, y, width, height, sensitive) of everything that shows in the application's window."""
-        self.process.stdin.write("tree\n")
+    def ask(self, question):
+        """The fields of each row of the answer."""
+        self.process.stdin.write(question + "\n")
         self.process.stdin.flush()
         rows = []
         for line in self.process.stdout:
             if line == "end\n":
                 return rows
-            role, name, *numbers = line.rstrip("\n").split("\t")
-            rows.append((role, name, *map(int, numbers)))
+            rows.append(line.rstrip("\n").split("\t"))
         raise AssertionError("the accessibility helper ended")
+
+    def showing(self):
+        """(role, name, x, y, width, height, sensitive) of everything that shows in the application's window."""
+        return [(role, name, *map(int, numbers)) for role, name, *numbers in self.ask("tree")]
+
+    def controls(self):
+        """(role, name, description, whether the keyboard reaches it) of everything that can be used and shows."""
+        return [(role, name, description, focusable == "1") for role, name, description, focusable in self.ask("controls")]
+
+    def focused(self):
+        """(role, name) of what has the keyboard in each window."""
+        return [(role, name) for role, name in self.ask("focus")]
 
 
 class App:

@@ -4,6 +4,7 @@
 #include <algorithm>
 #include <utility>
 
+#include "host/gtk/pango_graphics.h"
 #include "host/support/texts.h"
 
 namespace vaelo {
@@ -35,6 +36,9 @@ Row* rowOf(gpointer widget) { return static_cast<Row*>(widget); }
 
 GtkWidgetClass* parentClass() { return static_cast<GtkWidgetClass*>(g_type_class_peek(GTK_TYPE_WIDGET)); }
 
+/// Letters of twice the size need wider cells, of which two are still to stand side by side on a phone.
+int cellWidth() { return static_cast<int>(CellWidth * std::clamp(textScale(), 1.0, 1.4)); }
+
 struct TextHeights {
   int name;
   int second;
@@ -62,12 +66,12 @@ PangoLayout* makeLayout(GtkWidget* widget, const std::string& text, bool small, 
   pango_layout_set_height(layout, -lines);
   // A line break in a name would make it two lines.
   pango_layout_set_single_paragraph_mode(layout, TRUE);
-  if (small) {
-    PangoAttrList* attributes = pango_attr_list_new();
-    pango_attr_list_insert(attributes, pango_attr_scale_new(0.88));
-    pango_layout_set_attributes(layout, attributes);
-    pango_attr_list_unref(attributes);
-  }
+  PangoAttrList* attributes = pango_attr_list_new();
+  // A hyphen at the end of a line would be read as the name's.
+  pango_attr_list_insert(attributes, pango_attr_insert_hyphens_new(FALSE));
+  if (small) pango_attr_list_insert(attributes, pango_attr_scale_new(0.88));
+  pango_layout_set_attributes(layout, attributes);
+  pango_attr_list_unref(attributes);
   // Text stands at the row's start, whichever way the name itself is read: "left" is where the row begins, but for a text
   // that is read from the right it is where the row ends. A digit at its beginning doesn't tell which that is.
   const PangoDirection read = pango_layout_line_get_resolved_direction(pango_layout_get_line_readonly(layout, 0));
@@ -240,7 +244,7 @@ void snapshotRow(GtkWidget* widget, GtkSnapshot* snapshot) {
 void measure(GtkWidget* widget, GtkOrientation orientation, int, int* minimum, int* natural, int*, int*) {
   const bool grid = rowOf(widget)->context->grid;
   if (orientation == GTK_ORIENTATION_HORIZONTAL) {
-    *minimum = *natural = grid ? CellWidth : 160;
+    *minimum = *natural = grid ? cellWidth() : 160;
     return;
   }
   const TextHeights text = textHeights(widget);

@@ -1,6 +1,9 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/preview/document_buttons.h"
 
+#include <algorithm>
+
+#include "host/gtk/pango_graphics.h"
 #include "host/gtk/preview/find_bar.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
@@ -8,7 +11,7 @@
 namespace vaelo {
 
 namespace {
-constexpr int NarrowBelow = 480;  // pixels
+constexpr int NarrowBelow = 480;  // pixels, at letters of the usual size
 }
 
 DocumentButtons::~DocumentButtons() {
@@ -50,7 +53,7 @@ GtkWidget* DocumentButtons::makeMenu() {
 
 // What a widget's size decides on can't change another's while sizes are given.
 void DocumentButtons::fit(int width) {
-  const bool narrow = width > 0 && width < NarrowBelow;
+  const bool narrow = width > 0 && width < NarrowBelow * std::max(textScale(), 1.0);
   if (narrow == narrow_) return;
   narrow_ = narrow;
   if (idle_) return;

@@ -42,6 +42,8 @@ FactsPage::FactsPage(std::function<void()> arrived)
   gtk_progress_bar_set_show_text(GTK_PROGRESS_BAR(bar_), TRUE);
   gtk_widget_set_visible(bar_, FALSE);
   gtk_box_append(GTK_BOX(box_), bar_);
+  gtk_label_set_wrap(GTK_LABEL(gtk_button_get_child(GTK_BUTTON(open_))), TRUE);
+  gtk_label_set_justify(GTK_LABEL(gtk_button_get_child(GTK_BUTTON(open_))), GTK_JUSTIFY_CENTER);
   gtk_widget_add_css_class(open_, "pill");
   gtk_widget_set_halign(open_, GTK_ALIGN_CENTER);
   gtk_box_append(GTK_BOX(box_), open_);

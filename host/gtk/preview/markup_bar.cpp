@@ -64,7 +64,11 @@ MarkupBar::MarkupBar(Events events)
   setLabel(done, _("Done"), _("Leave Markup"));
   makeNarrow(done);
   gtk_box_append(GTK_BOX(box), done);
-  gtk_revealer_set_child(GTK_REVEALER(revealer_), box);
+  // With large letters they take more than a phone's width.
+  GtkWidget* scrolled = gtk_scrolled_window_new();
+  gtk_scrolled_window_set_policy(GTK_SCROLLED_WINDOW(scrolled), GTK_POLICY_AUTOMATIC, GTK_POLICY_NEVER);
+  gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scrolled), box);
+  gtk_revealer_set_child(GTK_REVEALER(revealer_), scrolled);
   gtk_widget_set_visible(revealer_, FALSE);
 
   g_signal_connect_swapped(undo_, "clicked", G_CALLBACK(+[](MarkupBar* self) { self->events_.undo(); }), this);
