@@ -47,15 +47,14 @@ class PortableDocumentChangesTest : public portable_document_test::MarkingTest {
     click(x, y);
     return waitUntil([this] { return popover().isOpen(); }) ? popover().text() : "";
   }
-  /// Waits until everything that was asked of the decoder before is answered.
+  /// Waits, once in a test, until the decoder has answered a click on a page whose links are known: it answers in order, and
+  /// the text of the other page has not been asked for yet.
   void settle() {
-    for (int i = 0; i < 2; ++i) {
-      const auto [left, top] = at(0, 60, 50);
-      screen_->selecting().clear();
-      screen_->press(left, top, 2);
-      screen_->release(false);
-      ASSERT_TRUE(waitUntil([this] { return screen_->selecting().selection().text().has_value(); }));
-    }
+    const auto [left, top] = at(1, 60, 50);
+    screen_->selecting().clear();
+    screen_->press(left, top, 2);
+    screen_->release(false);
+    ASSERT_TRUE(waitUntil([this] { return screen_->selecting().selection().text().has_value(); }));
   }
   bool save() { return waitFor(State::Saving) && waitFor(State::Saved); }
   std::vector<PopplerAnnotType> typesIn(const std::string& file) {
@@ -104,10 +103,8 @@ TEST_F(PortableDocumentChangesTest, ADrawingOfAnEarlierSessionIsRemoved) {
 
 TEST_F(PortableDocumentChangesTest, BesideADrawingThereIsNothingToRemove) {
   openMarked();
+  ASSERT_EQ(touched(100, 252), "Drawing");
   click(55, 295);  // in the rectangle around the line, but far from it
-  settle();
-  EXPECT_FALSE(popover().isOpen());
-  click(300, 500);
   settle();
   EXPECT_FALSE(popover().isOpen());
 }
