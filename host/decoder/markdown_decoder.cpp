@@ -17,7 +17,7 @@ namespace vaelo {
 
 namespace {
 
-constexpr off_t MostBytes = 1024 * 1024;
+constexpr off_t MostMarkdownBytes = 1024 * 1024;
 constexpr std::size_t MostForms = 30'000;
 constexpr std::size_t LongestLine = 10'000;  // in bytes; laying a paragraph out takes longer than in proportion
 
@@ -33,7 +33,7 @@ bool hasLongLine(const std::string& text) {
 const char* readAll(int file, std::string& bytes) {
   struct stat status = {};
   if (::fstat(file, &status) != 0) return DecoderError::Unreadable;
-  if (status.st_size > MostBytes) return DecoderError::TooBig;
+  if (status.st_size > MostMarkdownBytes) return DecoderError::TooBig;
   bytes.resize(static_cast<std::size_t>(status.st_size));
   std::size_t filled = 0;
   while (filled < bytes.size()) {

@@ -17,12 +17,12 @@ namespace vaelo {
 
 namespace {
 
-constexpr int LongestSide = 16384;               // of what is drawn at once
-constexpr double MostPixels = 64 * 1024 * 1024;  // of it
+constexpr int LongestSide = 16384;                      // of what is drawn at once
+constexpr double MostPicturePixels = 64 * 1024 * 1024;  // of it
 
 bool isDrawable(PictureSize size) {
   return size.width > 0 && size.height > 0 && size.width <= LongestSide && size.height <= LongestSide &&
-         static_cast<double>(size.width) * size.height <= MostPixels;
+         static_cast<double>(size.width) * size.height <= MostPicturePixels;
 }
 
 bool readSize(std::string_view& words, PictureSize& size) {

@@ -25,7 +25,7 @@ bool isPlainWord(const std::string& text) {
 }
 
 // What could make the line look like another one goes.
-std::string shownName(const std::string& name) {
+std::string shownDeviceName(const std::string& name) {
   std::string shown;
   if (!g_utf8_validate(name.data(), static_cast<gssize>(name.size()), nullptr)) return shown;
   long characters = 0;
@@ -87,7 +87,7 @@ Result<ActivityRecord> readActivityFile(const std::string& path, Date now) {
   if (*since < now - oldest) return refused("the activity is too old");
   if (*since > now + clockDifference) return refused("the activity is from the future");
   record.since = *since;
-  record.deviceName = shownName(keyFileBytes(keys, activityGroup, "Device").value_or(""));
+  record.deviceName = shownDeviceName(keyFileBytes(keys, activityGroup, "Device").value_or(""));
   if (record.deviceName.empty()) record.deviceName = _("another device");
   gchar** names = g_key_file_get_keys(keys, infoGroup, nullptr, nullptr);
   for (gchar** name = names; name && *name; ++name) {

@@ -41,7 +41,7 @@ bool isPlainRelativePath(const std::string& path) {
   return true;
 }
 
-std::optional<Reference> parsed(const std::string& text) {
+std::optional<Reference> parsedReference(const std::string& text) {
   if (text.compare(0, prefix.size(), prefix) != 0 || text.find('\0') != std::string::npos) return std::nullopt;
   Reference reference;
   const char* const end = text.data() + text.size();
@@ -81,7 +81,7 @@ Result<std::string> LocalFileProvider::encoded(const URL& url) {
 }
 
 Result<URL> LocalFileProvider::decoded(const std::string& text) {
-  const std::optional<Reference> reference = parsed(text);
+  const std::optional<Reference> reference = parsedReference(text);
   if (!reference) return fileError(FileErrorCode::Formatting, "", "the text names no document of a drive");
   if (const Result<IndexedDocument> found = index_.resolve(reference->id); found && layout_.isInMirror(found.value->path)) {
     return URL(logicalNameOf(found.value->path).value_or(found.value->path));

@@ -24,7 +24,7 @@ namespace {
 
 std::string folderOf(const std::string& path) { return URL(path).deletingLastPathComponent().path(); }
 
-void flushFolder(const std::string& path) {
+void flushTargetFolder(const std::string& path) {
   const UniqueFd folder(open(path.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC));
   if (folder) fsync(folder.get());
 }
@@ -56,7 +56,7 @@ int copyThenRemove(const std::string& from, const std::string& to, TreeRemovals*
     removeTree(temporary);
     return number;
   }
-  flushFolder(folderOf(to));
+  flushTargetFolder(folderOf(to));
   // The item is at its new place, whole; what is left of the old one is not a failure of the move.
   if (!removals || !copy.isFolder() || removals->remove(from, true) != 0) removeTree(from);
   return 0;

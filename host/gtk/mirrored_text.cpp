@@ -14,7 +14,7 @@ const char* classOf(const Color& color) {
   return nullptr;
 }
 
-float xalignOf(TextAlignment alignment, bool rightToLeft) {
+float textXalignOf(TextAlignment alignment, bool rightToLeft) {
   switch (alignment) {
     case TextAlignment::Center:
       return 0.5F;
@@ -86,7 +86,7 @@ void MirroredText::style(GtkWidget* text) const {
   PangoAttrList* attributes = attributesOf(label_.font());
   gtk_label_set_attributes(widget, attributes);
   pango_attr_list_unref(attributes);
-  gtk_label_set_xalign(widget, xalignOf(label_.textAlignment(), rightToLeft));
+  gtk_label_set_xalign(widget, textXalignOf(label_.textAlignment(), rightToLeft));
   gtk_label_set_justify(widget, justificationOf(label_.textAlignment()));
   gtk_label_set_ellipsize(widget, label_.numberOfLines() == 0 ? PANGO_ELLIPSIZE_NONE : PANGO_ELLIPSIZE_END);
   gtk_label_set_wrap(widget, label_.numberOfLines() != 1);

@@ -62,7 +62,7 @@ GtkWidget* makeHeader(const SharedItem& item, Callback closed) {
   return header;
 }
 
-GtkWidget* makeRow(ShareRow& row) {
+GtkWidget* makeSheetRow(ShareRow& row) {
   GtkWidget* widget = adw_action_row_new();
   adw_preferences_row_set_use_markup(ADW_PREFERENCES_ROW(widget), FALSE);
   adw_preferences_row_set_title(ADW_PREFERENCES_ROW(widget), row.title.c_str());
@@ -103,7 +103,7 @@ GtkWidget* makeShareSheet(const SharedItem& item, const std::string& notice, std
   gtk_widget_add_css_class(list, "boxed-list");
   const std::string label = filled(_("Share %s"), {item.name});
   gtk_accessible_update_property(GTK_ACCESSIBLE(list), GTK_ACCESSIBLE_PROPERTY_LABEL, label.c_str(), -1);
-  for (ShareRow& row : rows) gtk_list_box_append(GTK_LIST_BOX(list), makeRow(row));
+  for (ShareRow& row : rows) gtk_list_box_append(GTK_LIST_BOX(list), makeSheetRow(row));
   gtk_box_append(GTK_BOX(box), list);
 
   GtkWidget* scrolled = gtk_scrolled_window_new();

@@ -17,7 +17,7 @@ std::shared_ptr<const FolderSnapshot> snapshotOf(const Entries& entries) {
   return FolderSnapshot::sorted(std::move(draft));
 }
 
-std::vector<std::string> namesOf(const FolderSnapshot& snapshot) {
+std::vector<std::string> snapshotNames(const FolderSnapshot& snapshot) {
   std::vector<std::string> names;
   for (std::size_t i = 0; i < snapshot.size(); ++i) names.emplace_back(snapshot.name(i));
   return names;
@@ -43,7 +43,7 @@ TEST(FolderSnapshot, FoldersComeFirst) {
                                     {"a.rtfd", EntryKind::Package},
                                     {"y", EntryKind::FolderLink},
                                     {"c", EntryKind::Promise}});
-  EXPECT_EQ(namesOf(*snapshot), (std::vector<std::string>{"y", "z", "a.rtfd", "b", "c"}));
+  EXPECT_EQ(snapshotNames(*snapshot), (std::vector<std::string>{"y", "z", "a.rtfd", "b", "c"}));
   EXPECT_EQ(snapshot->indexOf("b"), 3U);
   EXPECT_EQ(snapshot->indexOf("z"), 1U);
   EXPECT_EQ(snapshot->indexOf("x"), std::nullopt);
@@ -51,7 +51,7 @@ TEST(FolderSnapshot, FoldersComeFirst) {
 
 TEST(FolderSnapshot, DownloadedItemHidesItsPromise) {
   const auto snapshot = snapshotOf({{"a", EntryKind::Promise}, {"a", EntryKind::Document}, {"b", EntryKind::Promise}});
-  EXPECT_EQ(namesOf(*snapshot), (std::vector<std::string>{"a", "b"}));
+  EXPECT_EQ(snapshotNames(*snapshot), (std::vector<std::string>{"a", "b"}));
   EXPECT_EQ(snapshot->kind(0), EntryKind::Document);
 }
 
@@ -66,7 +66,7 @@ TEST(FolderSnapshot, KindsByName) {
 TEST(FolderSnapshot, ChangeOfKindMovesAnEntry) {
   const auto before = snapshotOf({{"a", EntryKind::Document}, {"b", EntryKind::Promise}, {"x", EntryKind::Folder}});
   const auto after = before->with({{"x", EntryKind::Document}, {"b", EntryKind::Document}});
-  EXPECT_EQ(namesOf(*after), (std::vector<std::string>{"a", "b", "x"}));
+  EXPECT_EQ(snapshotNames(*after), (std::vector<std::string>{"a", "b", "x"}));
   EXPECT_EQ(after->kind(1), EntryKind::Document);
   EXPECT_EQ(before->splicesTo(*after), (std::vector<Splice>{{0, 1, 0}, {2, 0, 1}}));
 }
@@ -97,8 +97,8 @@ TEST(FolderSnapshot, RandomChangesAgreeWithReadingAnew) {
     Entries entries;
     for (const std::string& name : present) entries.emplace_back(name, EntryKind::Document);
     const auto next = snapshot->with(changes);
-    ASSERT_EQ(namesOf(*next), namesOf(*snapshotOf(entries)));
-    ASSERT_EQ(spliced(namesOf(*snapshot), snapshot->splicesTo(*next), *next), namesOf(*next));
+    ASSERT_EQ(snapshotNames(*next), snapshotNames(*snapshotOf(entries)));
+    ASSERT_EQ(spliced(snapshotNames(*snapshot), snapshot->splicesTo(*next), *next), snapshotNames(*next));
     snapshot = next;
   }
 }

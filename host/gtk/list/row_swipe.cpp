@@ -22,9 +22,9 @@ struct StripClass {
   GtkWidgetClass parent;
 };
 
-GtkWidgetClass* parentClass() { return static_cast<GtkWidgetClass*>(g_type_class_peek(GTK_TYPE_WIDGET)); }
+GtkWidgetClass* swipeParentClass() { return static_cast<GtkWidgetClass*>(g_type_class_peek(GTK_TYPE_WIDGET)); }
 
-void measure(GtkWidget* widget, GtkOrientation orientation, int, int* minimum, int* natural, int*, int*) {
+void measureSwipe(GtkWidget* widget, GtkOrientation orientation, int, int* minimum, int* natural, int*, int*) {
   *minimum = *natural = 0;
   // As high as the row.
   if (orientation == GTK_ORIENTATION_VERTICAL) return;
@@ -57,26 +57,26 @@ void snapshot(GtkWidget* widget, GtkSnapshot* snapshot) {
   const graphene_rect_t free =
       GRAPHENE_RECT_INIT(rtl ? 0 : width - uncovered, 0, uncovered, static_cast<float>(gtk_widget_get_height(widget)));
   gtk_snapshot_push_clip(snapshot, &free);
-  parentClass()->snapshot(widget, snapshot);
+  swipeParentClass()->snapshot(widget, snapshot);
   gtk_snapshot_pop(snapshot);
 }
 
-void dispose(GObject* object) {
+void disposeSwipe(GObject* object) {
   while (GtkWidget* child = gtk_widget_get_first_child(GTK_WIDGET(object))) gtk_widget_unparent(child);
-  G_OBJECT_CLASS(parentClass())->dispose(object);
+  G_OBJECT_CLASS(swipeParentClass())->dispose(object);
 }
 
-void initClass(gpointer stripClass, gpointer) {
-  G_OBJECT_CLASS(stripClass)->dispose = dispose;
+void initSwipeClass(gpointer stripClass, gpointer) {
+  G_OBJECT_CLASS(stripClass)->dispose = disposeSwipe;
   auto* widgetClass = static_cast<GtkWidgetClass*>(stripClass);
-  widgetClass->measure = measure;
+  widgetClass->measure = measureSwipe;
   widgetClass->size_allocate = allocate;
   widgetClass->snapshot = snapshot;
 }
 
 GType stripGetType() {
-  static const GType type = g_type_register_static_simple(GTK_TYPE_WIDGET, "VaeloRowStrip", sizeof(StripClass), initClass,
-                                                          sizeof(Strip), nullptr, G_TYPE_FLAG_NONE);
+  static const GType type = g_type_register_static_simple(GTK_TYPE_WIDGET, "VaeloRowStrip", sizeof(StripClass),
+                                                          initSwipeClass, sizeof(Strip), nullptr, G_TYPE_FLAG_NONE);
   return type;
 }
 

@@ -7,7 +7,7 @@
 namespace vaelo {
 namespace {
 
-constexpr double DecidesAfter = 16;
+constexpr double SwipeDecidesAfter = 16;
 constexpr double FlickSpeed = 300;  // pixels a second
 constexpr std::uint32_t SpeedWindow = 150;
 
@@ -18,7 +18,7 @@ SwipeTrack::SwipeTrack(double uncovered, bool rightToLeft)
 
 SwipeTrack::Claim SwipeTrack::moved(double x, double y, std::uint32_t milliseconds) {
   const double uncovering = rightToLeft_ ? x : -x;
-  if (claim_ == Claim::Undecided && std::max(std::abs(x), std::abs(y)) >= DecidesAfter) {
+  if (claim_ == Claim::Undecided && std::max(std::abs(x), std::abs(y)) >= SwipeDecidesAfter) {
     // Where nothing is uncovered, the other way is that of the page itself, back.
     const bool goesBack = begin_ <= 0 && uncovering < 0;
     claim_ = std::abs(y) >= std::abs(x) || goesBack ? Claim::Left : Claim::Taken;

@@ -18,7 +18,7 @@ constexpr const char* BorderClass = "vaelo-bordered";
 constexpr const char* BorderStyle =
     "picture.vaelo-bordered { outline: 1px solid alpha(currentColor, .16); outline-offset: -1px; }";
 
-void addStyle() {
+void addPictureStyle() {
   static bool added = false;
   GdkDisplay* display = gdk_display_get_default();
   if (added || !display) return;
@@ -59,7 +59,7 @@ int magnification(const ImageView& view, GdkPaintable* picture) {
 }  // namespace
 
 MirroredPicture::MirroredPicture(ImageView& view) : view_(view), area_(GTK_WIDGET(g_object_ref_sink(gtk_picture_new()))) {
-  addStyle();
+  addPictureStyle();
   gtk_picture_set_content_fit(GTK_PICTURE(area_), GTK_CONTENT_FIT_FILL);
   update();
 }

@@ -11,7 +11,7 @@ namespace vaelo {
 
 namespace {
 
-GtkWidget* makeButton(const char* icon, const char* label) {
+GtkWidget* makeMediaButton(const char* icon, const char* label) {
   GtkWidget* button = gtk_button_new_from_icon_name(icon);
   gtk_widget_set_tooltip_text(button, label);
   gtk_widget_set_size_request(button, 44, 44);
@@ -53,7 +53,7 @@ MediaControls::MediaControls(GtkMediaStream* stream, bool isFullScreen, std::fun
     : stream_(GTK_MEDIA_STREAM(g_object_ref(stream))),
       fullScreen_(std::move(fullScreen)),
       bar_(GTK_WIDGET(g_object_ref_sink(gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 6)))),
-      play_(makeButton("media-playback-start-symbolic", _("Play"))),
+      play_(makeMediaButton("media-playback-start-symbolic", _("Play"))),
       time_(makeTime(_("Position"))),
       place_(gtk_scale_new_with_range(GTK_ORIENTATION_HORIZONTAL, 0, 1, 1)),
       length_(makeTime(_("Duration"))),
@@ -82,8 +82,8 @@ MediaControls::MediaControls(GtkMediaStream* stream, bool isFullScreen, std::fun
                    }),
                    this);
   if (fullScreen_) {
-    GtkWidget* button = makeButton(isFullScreen ? "view-restore-symbolic" : "view-fullscreen-symbolic",
-                                   isFullScreen ? _("Leave Full Screen") : _("Full Screen"));
+    GtkWidget* button = makeMediaButton(isFullScreen ? "view-restore-symbolic" : "view-fullscreen-symbolic",
+                                        isFullScreen ? _("Leave Full Screen") : _("Full Screen"));
     gtk_box_append(GTK_BOX(bar_), button);
     g_signal_connect_swapped(button, "clicked", G_CALLBACK(+[](MediaControls* self) { self->fullScreen_(); }), this);
   }

@@ -17,13 +17,13 @@ namespace vaelo {
 
 namespace {
 
-constexpr int LongestSide = 8192;   // of what is asked for at once, pixels
-constexpr guint SettledAfter = 60;  // milliseconds without a change, before detail is asked for
-constexpr double SharpFrom = 2;     // device pixels a pixel, where the decoder draws them with sharp edges
-constexpr double Margin = 0.25;     // of the window that is asked for around it, for the next move
+constexpr int LongestPictureSide = 8192;   // of what is asked for at once, pixels
+constexpr guint PictureSettledAfter = 60;  // milliseconds without a change, before detail is asked for
+constexpr double SharpFrom = 2;            // device pixels a pixel, where the decoder draws them with sharp edges
+constexpr double Margin = 0.25;            // of the window that is asked for around it, for the next move
 constexpr double LongestPicture = 1e7;
 
-int bounded(double length) { return std::clamp(static_cast<int>(std::lround(length)), 1, LongestSide); }
+int bounded(double length) { return std::clamp(static_cast<int>(std::lround(length)), 1, LongestPictureSide); }
 
 class PictureView : public DocumentView {
  public:
@@ -166,7 +166,7 @@ class PictureView : public DocumentView {
     if (!isShown_ || isAnimated_ || isBroken_) return;
     g_clear_handle_id(&settling_, g_source_remove);
     settling_ = g_timeout_add(
-        SettledAfter,
+        PictureSettledAfter,
         +[](gpointer data) -> gboolean {
           auto* self = static_cast<PictureView*>(data);
           self->settling_ = 0;
