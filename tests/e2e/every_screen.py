@@ -243,6 +243,7 @@ def previews(app, keys):
     yield "not downloaded"
     app.key("Escape")
     app.wait_title("Vaelo Drive")
+    keys.is_at("Thesis.pdf")
 
 
 def window_menu(app, keys):
