@@ -185,5 +185,39 @@ TEST_F(DriveStatusLabelViewTest, TheRoomThatItNeedsHoldsWhatItShows) {
   EXPECT_LE(button->frame().maxY(), needed.height);
 }
 
+TEST_F(DriveStatusLabelViewTest, HidingTheButtonAsksForLayout) {
+  view->showLowQuota(true);
+  layOut(360, 46);
+  view->showLowQuota(false);
+  EXPECT_TRUE(view->needsLayout());
+}
+
+// Half a point is no height: the title counts 11, as in a button without a title. The button is 12.5 high and 15.5 wide, its
+// inset (12.5 - 11) / 2 = 0.75; block 24.75; label y 9.625, so 9.5; button y 2.75 + 20.5 - 0.75 = 22.5.
+TEST_F(DriveStatusLabelViewTest, ATitleUnderAPointCountsAsHighAsTheLine) {
+  button->titleLabel()->setFont(Font::preferred(TextStyle::Caption2).withSize(0.5));
+  view->setPrimaryLabelText("1234567890");
+  view->showLowQuota(true);
+  layOut(360, 46);
+  ASSERT_EQ(button->titleLabel()->frame().height, 0.5);
+  EXPECT_EQ(label->frame().y, 9.5);
+  EXPECT_EQ(button->frame().y, 22.5);
+}
+
+// As with no height at all: the label's 50 x 11 in place of 47 x 0.5.
+TEST_F(DriveStatusLabelViewTest, AButtonUnderAPointIsTakenToBeAsLargeAsTheLine) {
+  struct FlatButton : MemoryUpgradeButton {
+    using MemoryUpgradeButton::MemoryUpgradeButton;
+    Size intrinsicContentSize() const override { return {47, 0.5}; }
+  };
+  const auto flat = std::make_shared<FlatButton>(nullptr, false);
+  flat->setTitle("Upgrade");
+  view->setQuotaButton(flat);
+  view->setPrimaryLabelText("1234567890");
+  view->showLowQuota(true);
+  layOut(360, 46);
+  EXPECT_EQ(flat->frame(), (Rect{155, 23.5, 50, 11}));
+}
+
 }  // namespace
 }  // namespace vaelo

@@ -64,6 +64,10 @@ TEST_F(FileTagsTest, AMissingOrWrongDictionaryIsEmpty) {
   FileTags::_tagColorsDidChange();
   EXPECT_EQ(memory.log.count("WARNING", "Rover tag dictionary is empty"), 2u);
   EXPECT_THAT(FileTags::allTags(), IsEmpty());
+  memory.syncedStore.values["RoverTagDict"] = Value(Dictionary{});
+  FileTags::_tagColorsDidChange();
+  EXPECT_TRUE(memory.log.has("DEBUG", "Rover tag dictionary has incorrect version (0, should be 2)"));
+  EXPECT_EQ(memory.log.count("WARNING", "Rover tag dictionary is empty"), 3u);
 }
 
 TEST_F(FileTagsTest, LabelsBeyondTheTableAreGreyAndNamesMayRepeat) {
@@ -284,6 +288,30 @@ TEST_F(ColorBlendTest, PlusDarkerClampsAtEachStep) {
   expectNear(blend({0.8, 0.8, 0.8, 1e-8}, {1, 1, 1, 0.5}, CompositingFilter::PlusDarker), 0, 0, 0, 1e-8);
   // t = 0, which ends it: 0 - 0.5 / -0.5 would be 1.
   expectNear(blend({-1, -1, -1, -0.5}, {1, 1, 1, 0.5}, CompositingFilter::PlusDarker), 0, 0, 0, -0.5);
+}
+
+// With s of -0.5 and -1e-8: 0.3 / 1.5; within epsilon of none, 1. Burn: 1 - (1 - 0.3) / -0.5; 0.
+TEST_F(ColorBlendTest, DodgeAndBurnTakeTheSizeOfTheSource) {
+  const Color dodged = blend({0.3, 0.3, 0.3, 1}, {-0.5, -1e-8, 0.5, 1}, CompositingFilter::ColorDodge);
+  expectNear(dodged, 0.2, 1, 0.6, 1);
+  const Color burnt = blend({0.3, 0.3, 0.3, 1}, {-0.5, -1e-8, 0.5, 1}, CompositingFilter::ColorBurn);
+  expectNear(burnt, 2.4, 0, -0.4, 1);
+}
+
+// Each formula by hand for d and s of (2, 3), (-1, 0.5) and (-1, -1), both opaque.
+TEST_F(ColorBlendTest, NothingIsClamped) {
+  const Color beyond{2, -1, -1, 1};
+  const Color over{3, 0.5, -1, 1};
+  expectNear(blend(beyond, over, CompositingFilter::SourceOver), 3, 0.5, -1, 1);
+  expectNear(blend(beyond, over, CompositingFilter::Multiply), 6, -0.5, 1, 1);
+  // 1 - -2 * -1; 1 - 0.5 * 2; 1 - 2 * 2
+  expectNear(blend(beyond, over, CompositingFilter::Screen), -1, 0, -3, 1);
+  // 1 - 2 * -2 * -1; 2 * 0.5 * -1; 2 * -1 * -1
+  expectNear(blend(beyond, over, CompositingFilter::Overlay), -3, -1, 2, 1);
+  expectNear(blend(beyond, over, CompositingFilter::Darken), 2, -1, -1, 1);
+  expectNear(blend(beyond, over, CompositingFilter::Lighten), 3, 0.5, -1, 1);
+  // min(5, 1); -0.5; -2
+  expectNear(blend(beyond, over, CompositingFilter::PlusLighter), 1, -0.5, -2, 1);
 }
 
 }  // namespace

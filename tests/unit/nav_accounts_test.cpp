@@ -142,5 +142,26 @@ TEST_F(NavAccountsTest, AVanishedOfferStillMakesTheFlowManager) {
   EXPECT_TRUE(logged("INFO", "UpgradeStorage: No upgrade offer"));
 }
 
+// What is made for the account finds its token saved.
+TEST_F(NavAccountsTest, TheTokenIsSavedBeforeTheStackIsBuiltAgain) {
+  loadNav();
+  std::optional<UbiquityIdentityToken> savedWhenBuilding;
+  memory.queues.makesOperationQueue = [&](const std::string& name, QualityOfService quality) {
+    savedWhenBuilding = savedToken();
+    return std::make_shared<MemoryOperationQueue>(memory.clock, name, quality);
+  };
+  becomeActive();
+  EXPECT_EQ(savedWhenBuilding, token());
+}
+
+TEST_F(NavAccountsTest, AnUnreadableSavedTokenAndNoAccountAreTheSame) {
+  preferences().setDataForKey(TokenKey, Data{1, 2, 3});
+  signOut();
+  loadNav();
+  becomeActive();
+  EXPECT_TRUE(logged("DEBUG", "Vaelo Token Matches"));
+  EXPECT_FALSE(logged("INFO", changed("NO")));
+}
+
 }  // namespace
 }  // namespace vaelo

@@ -151,5 +151,26 @@ TEST_F(NavStatusTest, UpdatingTheLineUpdatesItsOfferAndNoTitle) {
   EXPECT_EQ(topList()->navigationItem().title(), "Drive");
 }
 
+TEST_F(NavStatusTest, EachValueHasItsTime) {
+  loadNav();
+  nav->quotaFetcherDidUpdateValue(*nav->quotaFetcher(), 1);
+  const Date first = *nav->lastQuotaFetch();
+  advance(std::chrono::seconds(300));
+  nav->quotaFetcherDidUpdateValue(*nav->quotaFetcher(), 1);
+  EXPECT_EQ(*nav->lastQuotaFetch() - first, std::chrono::seconds(300));
+}
+
+TEST_F(NavStatusTest, TheLineAndItsOfferFollowInEditModeToo) {
+  loadNav();
+  topList()->itemsLoaded({addFile("a.txt")});
+  nav->setEditModeAndUpdateUIForViewController(true, topList());
+  const auto bar = statusBarOf(*topList());
+  bar->setStatusText("");
+  bar->showUpgradeOffer(std::make_shared<MemoryOffer>(1));
+  nav->updateStatusUI(topList());
+  EXPECT_EQ(statusText(), "items: 1");
+  EXPECT_EQ(bar->labelsView()->quotaButton()->offer(), nullptr);
+}
+
 }  // namespace
 }  // namespace vaelo

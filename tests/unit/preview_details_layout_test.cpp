@@ -1,5 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 // What the details' screen asks of the layout.
+#include "platform/ui/keyboard_notice.h"
 #include "preview/hairline_view.h"
 #include "tests/unit/preview_fixture.h"
 
@@ -142,6 +143,45 @@ TEST_F(PreviewDetailsLayoutTest, TheButtonBelowTheFactsLooksLikeTheName) {
   EXPECT_EQ(button.titleLabel()->font(), Font::preferred(TextStyle::Title2).withSize(24));
   EXPECT_EQ(button.contentCompressionResistancePriority(LayoutAxis::Horizontal), 1000);
   EXPECT_EQ(button.contentCompressionResistancePriority(LayoutAxis::Vertical), 1000);
+}
+
+TEST_F(PreviewDetailsLayoutTest, LinesGoFromSideToSide) {
+  const URL text = addFile("Plans/Notes.txt");
+  giveOwningApplication(text);
+  makeTablet();
+  manager = makeManager(1);
+  manager->previewItem(DRItem::initWithURL(text));
+  details = manager->detailsViewController();
+  const auto& name = details->filenameStackView()->arrangedSubviews();
+  const auto& facts = details->fileDetailsView()->arrangedSubviews();
+  ASSERT_THAT(name, SizeIs(3));
+  ASSERT_THAT(facts, SizeIs(4));
+  for (const auto& [line, stack] :
+       {std::pair(name[0], details->filenameStackView()), std::pair(name[2], details->filenameStackView()),
+        std::pair(facts[2], details->fileDetailsView())}) {
+    for (const Asked& side : sides(line, stack)) EXPECT_THAT(valuesOf(stack->constraints()), Contains(side));
+  }
+}
+
+TEST_F(PreviewDetailsLayoutTest, SideBySideNeitherIsHigherThanItNeedsToBe) {
+  open();
+  for (const auto orientation : {InterfaceOrientation::LandscapeRight, InterfaceOrientation::Portrait}) {
+    details->adjustViewsForOrientation(orientation);
+    EXPECT_EQ(details->mainStackView()->alignment(), StackAlignment::Center);
+  }
+}
+
+// Content from 40 to 640; the stack within it, 25 + 35 further down and 500 high, ends at 40 + 25 + 35 + 500 = 600: 40
+// points below it are empty. 250 - 40 + 30.
+TEST_F(PreviewDetailsLayoutTest, TheEmptySpaceBelowTheStackIsMeasuredInTheScrollView) {
+  open();
+  details->contentView()->setFrame({0, 40, 360, 600});
+  details->wrapperView()->setFrame({0, 25, 360, 560});
+  details->mainStackView()->setFrame({0, 35, 360, 500});
+  KeyboardNotice notice;
+  notice.beginFrame = {0, 720, 360, 250};
+  memory.notifications.post({KeyboardWillShowNotification, notice.userInfo()});
+  EXPECT_EQ(details->scrollView()->contentInset().bottom, 240);
 }
 
 }  // namespace

@@ -157,6 +157,7 @@ TEST_F(PreviewDetailsTest, RefreshShowsTheItem) {
 TEST_F(PreviewDetailsTest, TheDefaultApplicationHasAButton) {
   const URL text = addFile("Plans/Notes.txt");
   giveOwningApplication(text);
+  memory.launch.rankedByPath.at(text.path()).value->at(0).second.at(0).localizedName = "Writer";
   const auto shown = [&] {
     manager = makeManager(1);
     manager->previewItem(DRItem::initWithURL(text));
@@ -164,7 +165,7 @@ TEST_F(PreviewDetailsTest, TheDefaultApplicationHasAButton) {
   };
   shown();
   ASSERT_NE(details->openInAppButton(), nullptr);
-  EXPECT_TRUE(details->openInAppButton()->title().starts_with("Open in “"));
+  EXPECT_EQ(details->openInAppButton()->title(), "Open in “Writer”");
   EXPECT_FALSE(details->shouldDisplayOpenInAppButtonInView());
   EXPECT_EQ(details->openInAppNavControllerButton(), details->openInAppButton());
   EXPECT_EQ(details->navigationItem().rightBarButtonItem()->customView(), details->openInAppButton());
@@ -208,6 +209,29 @@ TEST_F(PreviewDetailsTest, EditingBeginsBeforeTheExtensionAndTurnsTheBar) {
   EXPECT_EQ(bar.leftBarButtonItem()->systemItem(), SystemItem::Cancel);
   ASSERT_THAT(bar.rightBarButtonItems(), SizeIs(1));
   EXPECT_EQ(bar.rightBarButtonItem()->systemItem(), SystemItem::Done);
+}
+
+TEST_F(PreviewDetailsTest, TheCaretIsSetBeforeTheBarTurns) {
+  open();
+  struct : Animations {
+    void viewChanged(View&, ViewChange change) override {
+      if (change == ViewChange::Selection) titles.push_back(bar->title());
+    }
+    const NavigationItem* bar = nullptr;
+    std::vector<std::string> titles;
+  } seen;
+  seen.bar = &details->navigationItem();
+  field().setObserver(&seen);
+  begin();
+  field().setObserver(nullptr);
+  EXPECT_THAT(seen.titles, ElementsAre(""));
+}
+
+TEST_F(PreviewDetailsTest, TheLogTellsTheNameThatIsKeptAndTheItems) {
+  open();
+  manager->item()->setLocalizedName("Other.pdf");
+  begin();
+  EXPECT_TRUE(logged("DEBUG", "DidBeginEditing 'Report.pdf' = 'Other.pdf'"));
 }
 
 TEST_F(PreviewDetailsTest, AHiddenExtensionLeavesTheCaret) {
@@ -301,6 +325,30 @@ TEST_F(PreviewDetailsTest, ARefusedNameStaysInTheField) {
   EXPECT_FALSE(loggedStarting("DEBUG", "Name is valid")) << "and not tried again";
 }
 
+TEST_F(PreviewDetailsTest, BehindAnAlertTheEditingEndsAsItIs) {
+  open();
+  begin();
+  field().userSetText("");
+  presentSomething();
+  EXPECT_TRUE(field().resignFirstResponder());
+  EXPECT_EQ(field().text(), "") << "not even an empty name is taken back";
+}
+
+TEST_F(PreviewDetailsTest, EachRenameKeepsTheButtonsOfItsTime) {
+  open();
+  const auto now = [](const char* title) {
+    return std::vector{BarButtonItem::withTitle(title, BarButtonStyle::Plain, nullptr)};
+  };
+  for (const char* title : {"first", "second"}) {
+    const auto right = now(title);
+    details->navigationItem().setRightBarButtonItems(right);
+    details->updateNavBarForRename(true);
+    EXPECT_EQ(details->originalRightBarButtonItems(), right);
+    details->updateNavBarForRename(false);
+    EXPECT_EQ(details->navigationItem().rightBarButtonItems(), right);
+  }
+}
+
 TEST_F(PreviewDetailsTest, DoneEndsTheEditingEvenOfARefusedName) {
   addFile("Plans/Taken.pdf");
   open();
@@ -334,7 +382,7 @@ TEST_F(PreviewDetailsTest, ANameThatWasRestoredRenamesNothingLater) {
   open();
   begin();
   field().userSetText("");
-  field().resignFirstResponder();
+  EXPECT_TRUE(field().resignFirstResponder());
   EXPECT_EQ(field().text(), "Report.pdf");
   EXPECT_EQ(details->originalFilename(), "Report.pdf");
   log().clear();

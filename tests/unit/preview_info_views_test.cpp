@@ -5,6 +5,7 @@
 #include <tuple>
 
 #include "items/file_tags.h"
+#include "items/file_utils.h"
 #include "platform/ui/window.h"
 #include "preview/constraint_utils.h"
 #include "preview/hairline_view.h"
@@ -99,9 +100,12 @@ TEST_F(InfoViewsTest, RowsComeInTheirOrderAndShareTheirColumn) {
   EXPECT_EQ(stack->creationDateCell(), row(*stack, 3));
   EXPECT_EQ(stack->modifiedDateCell(), row(*stack, 4));
   ASSERT_THAT(stack->constraints(), SizeIs(5)) << "each name as wide as the one above";
-  EXPECT_EQ(stack->constraints()[0]->firstItem(), row(*stack, 1)->nameLabel().get());
-  EXPECT_EQ(stack->constraints()[0]->secondItem(), row(*stack, 0)->nameLabel().get());
+  for (std::size_t i = 0; i < 5; ++i) {
+    EXPECT_EQ(stack->constraints()[i]->firstItem(), row(*stack, i + 1)->nameLabel().get());
+    EXPECT_EQ(stack->constraints()[i]->secondItem(), row(*stack, i)->nameLabel().get());
+  }
   stack->setItem(nullptr);
+  EXPECT_EQ(stack->item(), nullptr);
   EXPECT_THAT(stack->arrangedSubviews(), SizeIs(6)) << "nothing keeps the rows";
   stack->setItem(item());
   EXPECT_THAT(stack->subviews(), SizeIs(6)) << "the old rows are gone";
@@ -117,6 +121,21 @@ TEST_F(InfoViewsTest, RowsWithoutAValueAreAbsent) {
   stack->setItem(shown);
   EXPECT_THAT(names(*stack), ElementsAre("Kind", "Where", "Modified"));
   EXPECT_EQ(stack->creationDateCell(), nullptr);
+  shown->setLocalizedTypeDescription(std::nullopt);
+  stack->setItem(shown);
+  EXPECT_THAT(names(*stack), ElementsAre("Where", "Modified"));
+}
+
+TEST_F(InfoViewsTest, APlaceThatCannotBeToldHasNoRow) {
+  const auto shown = DRItem::initWithURL(addOutsideFile("/elsewhere/Report.pdf"));
+  shown->setLocalizedTypeDescription("Portable document");
+  shown->setContentModificationDate(Date(seconds(1)));
+  ASSERT_EQ(FileUtils::displayableLocationForURL(*shown->url()), std::nullopt);
+  const auto stack = FileInfoStackView::initWithFrame({});
+  stack->setItem(shown);
+  EXPECT_THAT(names(*stack), ::testing::Not(::testing::Contains("Where")));
+  EXPECT_EQ(names(*stack).front(), "Kind");
+  EXPECT_EQ(names(*stack).back(), "Modified");
 }
 
 TEST_F(InfoViewsTest, TagsReadAsDotsAndNames) {
@@ -167,7 +186,9 @@ TEST_F(InfoViewsTest, DatesTakeTheLongestStyleThatFits) {
   const auto layOut = [&](double createdWidth, double modifiedWidth) {
     created.setFrame({0, 0, createdWidth, 20});
     modified.setFrame({0, 0, modifiedWidth, 20});
+    stack->creationDateCell()->setNeedsLayout();
     stack->layoutSubviews();
+    EXPECT_FALSE(stack->creationDateCell()->needsLayout()) << "the rows are laid out before they are measured";
   };
   const std::string longText = *shown->friendlyCreationDate(DateStyle::Long);
   const std::string mediumText = *shown->friendlyCreationDate(DateStyle::Medium);

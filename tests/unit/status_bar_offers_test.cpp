@@ -1,4 +1,6 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
+#include <gmock/gmock.h>
+
 #include "tests/support/memory_upgrade_button.h"
 #include "tests/unit/app_fixture.h"
 
@@ -87,10 +89,12 @@ TEST_F(StatusBarOffersTest, ALinkThatActsByItselfNeedsNobodyElse) {
 
 TEST_F(StatusBarOffersTest, ActionThreeIsTheApplications) {
   makeBar(offer);
+  log().clear();
   button().sendActions(ControlEvent::TouchUpInside);
   EXPECT_EQ(button().target->performed, 1);
   EXPECT_EQ(heard->presses, 1);
-  EXPECT_FALSE(logged("INFO", "UpgradeStorage button pressed, launched default action (Manage Storage?)"));
+  EXPECT_THAT(log().messages(), ::testing::ElementsAre("INFO ================= Pressed Upgrade Storage",
+                                                       "INFO UpgradeStorage button pressed, link.action=3"));
 }
 
 TEST_F(StatusBarOffersTest, OtherActionsThatTheLinkCannotDoDoNothing) {
