@@ -52,6 +52,18 @@ TEST_F(MenuEnableChecksTest, NothingSelectedAllowsNothing) {
   EXPECT_FALSE(mayDelete(Drive, {}));
 }
 
+// The library is asked last, and its answer logged: a log without the line tells that something else decided.
+TEST_F(MenuEnableChecksTest, TheLibraryIsAskedOnlyWhenNothingElseDecides) {
+  const URL file = addFile("a.txt");
+  const std::string line = "Container com~marrow~Kestrel has no depth. Enabling new folder button";
+  EXPECT_FALSE(mayMove(Drive, {}));
+  EXPECT_FALSE(mayMove(Drive, {file, addFolder("Desktop")}));
+  EXPECT_FALSE(mayMove(Drive, {addLibrary(std::nullopt)}));
+  EXPECT_FALSE(logged("DEBUG", line));
+  EXPECT_TRUE(mayMove(Drive, {file})) << "a document would do without";
+  EXPECT_TRUE(logged("DEBUG", line));
+}
+
 // Selecting all of 100,000 items asked the disk about each of them, four times.
 TEST_F(MenuEnableChecksTest, ItemsThatTheListKnowsAreNotLookedAt) {
   const URL desktop = addFolder("Desktop");
@@ -198,8 +210,11 @@ TEST_F(MenuEnableChecksTest, OnlyRealFoldersAtTheTopCountAsSubfolders) {
 TEST_F(MenuEnableChecksTest, TheFirstSubfolderEndsTheSearch) {
   const URL top = addLibrary(std::nullopt);
   folderIn(top, "Plans");
-  in(top, "Zebra.txt");
+  const URL zebra = in(top, "Zebra.txt");
+  memory.record.calls.clear();
   EXPECT_TRUE(MenuEnableChecks::containerHasSubfolders(top));
+  EXPECT_TRUE(memory.record.has("promised " + top.appendingPathComponent("Plans").path()));
+  EXPECT_FALSE(memory.record.has("promised " + zebra.path()));
 }
 
 TEST_F(MenuEnableChecksTest, AContainerWithoutATopFolderHasNoSubfolders) {

@@ -42,6 +42,8 @@ TEST_F(NavActionsTest, DeleteAsksAtTheRowAndCompletesWithTheAnswer) {
   ASSERT_TRUE(nav->performActionCompletionBlock());
   presentedAlert()->performAction(presentedAlert()->actions().at(0));
   EXPECT_EQ(completions, 1);
+  nav->performActionCompletionBlock()();
+  EXPECT_EQ(completions, 2) << "it is the row's that is kept";
   EXPECT_EQ(memory.disk.logicalItem(file.path()), nullptr);
 }
 
@@ -123,6 +125,7 @@ TEST_F(NavActionsTest, ShareCompletesFirstAndPointsAtTheRow) {
   act(ItemAction::Share, file);
   EXPECT_TRUE(banner("DLC Action Share (share sheet)"));
   EXPECT_TRUE(banner("Show Share Sheet (nav)"));
+  EXPECT_EQ(log().messages().back(), "INFO showDIC: " + file.absoluteString()) << "after its banner";
   EXPECT_TRUE(logged("INFO", "Activity (share) action: " + file.absoluteString()));
   EXPECT_TRUE(logged("INFO", "showDIC: " + file.absoluteString()));
   EXPECT_EQ(completions, 1);
@@ -202,6 +205,7 @@ TEST_F(NavActionsTest, TheShortFormComesFromTheWindow) {
   const Rect bounds = nav->view()->bounds();
   EXPECT_GT(bounds.width, 0);
   EXPECT_EQ(sheet()->fromRect, (Rect{0, bounds.height / 2, bounds.width, 0}));
+  EXPECT_TRUE(nav->performActionCompletionBlock()) << "one that does nothing";
 }
 
 }  // namespace

@@ -2,6 +2,8 @@
 // The deletion of items and libraries, from the question to what went wrong.
 #include <gmock/gmock.h>
 
+#include <algorithm>
+
 #include "fileops/ui_utils.h"
 #include "platform/ui/alert_controller.h"
 #include "tests/unit/app_fixture.h"
@@ -145,6 +147,16 @@ TEST_F(NavDeleteTest, MixedSelectionsAreRefusedSilently) {
   EXPECT_TRUE(loggedStarting("ERROR", "Not Deleting: mix of containers and items: ("));
 }
 
+// Both refusals would do; the one that comes first tells nobody.
+TEST_F(NavDeleteTest, ALibraryBesideASpecialFolderIsRefusedSilently) {
+  const auto library = memory.cloud.addContainer("org~example~Notes", "Notes");
+  ask({addFolder("Desktop"), *library->documentsFolderURL()});
+  EXPECT_EQ(presentedAlert(), nullptr);
+  EXPECT_EQ(finished, 1);
+  EXPECT_TRUE(loggedStarting("ERROR", "Not Deleting: mix of containers and items: ("));
+  EXPECT_FALSE(loggedStarting("WARNING", "Not deleting special folder: "));
+}
+
 TEST_F(NavDeleteTest, SpecialFoldersAreRefusedAloud) {
   const URL desktop = addFolder("Desktop");
   whenFinished = [this] { EXPECT_EQ(presentedAlert(), nullptr) << "the alert comes after"; };
@@ -183,10 +195,35 @@ TEST_F(NavDeleteTest, ConfirmedItemsGoAndEditModeEnds) {
   EXPECT_FALSE(isThere(file));
   EXPECT_FALSE(nav->editMode());
   EXPECT_EQ(finished, 1);
-  EXPECT_TRUE(logged("DEBUG", "Delete action"));
-  EXPECT_TRUE(logged("INFO", "================= Delete was Confirmed (nav)"));
+  const std::vector<std::string> lines = log().messages();
+  const auto answered = std::find(lines.begin(), lines.end(), "DEBUG Delete action");
+  ASSERT_NE(answered, lines.end());
+  EXPECT_NE(std::find(answered, lines.end(), "INFO ================= Delete was Confirmed (nav)"), lines.end());
   EXPECT_TRUE(logged("INFO", "Deleting item " + file.absoluteString()));
   EXPECT_EQ(presentedAlert(), nullptr);
+}
+
+TEST_F(NavDeleteTest, EditModeEndsBeforeAnythingGoes) {
+  const URL file = addFile("a.txt");
+  nav->setEditModeAndUpdateUIForViewController(true, topList());
+  ask({file}, nullptr, topList());
+  int accesses = 0;
+  memory.coordination.beforeAccessor = [&] {
+    ++accesses;
+    EXPECT_TRUE(isThere(file));
+    EXPECT_FALSE(nav->editMode());
+  };
+  answer(true);
+  memory.coordination.beforeAccessor = nullptr;
+  EXPECT_GT(accesses, 0);
+}
+
+// "the document's own name", not that of its file.
+TEST_F(NavDeleteTest, TheQuestionNamesADocumentAsPeopleSeeIt) {
+  const URL file = addFile("Report.pdf");
+  memory.disk.items.at(file.path()).values[ResourceKey::LocalizedName] = Value("Report");
+  EXPECT_EQ(UIUtils::messageForDeletePrompt({file}),
+            "\"Report\" will be permanently deleted from Vaelo Drive on all your devices. This action cannot be undone.");
 }
 
 TEST_F(NavDeleteTest, WithoutAListEditModeIsNotTouched) {

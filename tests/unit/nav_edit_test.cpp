@@ -133,6 +133,12 @@ TEST_F(NavEditTest, SelectAllTakesEveryItem) {
   EXPECT_TRUE(loggedStarting("DEBUG", "Selected all 2: ("));
 }
 
+TEST_F(NavEditTest, SelectAllDoesNotAskForEditMode) {
+  nav->selectAllItems(nullptr);
+  EXPECT_THAT(folder->selectedItems(), ElementsAre(a, b));
+  EXPECT_EQ(bar().title(), "Plans");
+}
+
 TEST_F(NavEditTest, TheTitleDoesNotWaitForTheItems) {
   nav = std::make_shared<NavController>();
   nav->view();

@@ -183,6 +183,14 @@ TEST_F(NavMoveTest, WithNowhereToGoANewFolderIsAskedFor) {
   EXPECT_FALSE(picker()->allowsCrossContainer());
 }
 
+TEST_F(NavMoveTest, ItemsOfAnUnknownFolderMayHaveSomewhereToGo) {
+  memory.cloud.movesAreFree = false;
+  nav->showMoveTargetForItemsInFolder({addFile("a.txt")}, std::nullopt);
+  EXPECT_EQ(prompt(), nullptr);
+  ASSERT_NE(picker(), nullptr);
+  EXPECT_FALSE(picker()->allowsCrossContainer());
+}
+
 TEST_F(NavMoveTest, AMoveIntoANewFolderThatFailsKeepsThePromptAndTheFolder) {
   const URL file = addFile("a.txt");
   nav->showNewFolderPromptDuringMoveItemsToMove(Drive, {file});
@@ -270,6 +278,13 @@ TEST_F(NavMoveTest, RenameAsksWithTheNameAndRenames) {
   EXPECT_TRUE(logged("INFO", "================= Rename entry confirmed (nav)"));
 }
 
+TEST_F(NavMoveTest, RenameBeginsWithTheNameThatPeopleSee) {
+  const URL file = addFile("Notes.pdf");
+  memory.disk.items.at(file.path()).values[ResourceKey::LocalizedName] = Value("Notes");
+  nav->showRenamePrompt(file);
+  EXPECT_EQ(prompt()->textField()->text(), "Notes");
+}
+
 TEST_F(NavMoveTest, ARenameThatFailsKeepsThePromptOpen) {
   const URL file = addFile("Notes.pdf");
   addFile("Taken.pdf");
@@ -298,8 +313,14 @@ TEST_F(NavMoveTest, SpecialAndMissingItemsAreNotRenamed) {
   EXPECT_TRUE(logged("WARNING", "Not renaming special folder: " + documents.absoluteString()));
   ASSERT_NE(presentedAlert(), nullptr);
   nav->dismissViewControllerAnimated(false);
-  nav->showRenamePrompt(URL("/drive/mirror/com~marrow~Kestrel/gone"));
-  EXPECT_EQ(presentedAlert(), nullptr);
+  for (const char* gone : {"gone", "Desktop"}) {
+    nav->showRenamePrompt(Drive.appendingPathComponent(gone));
+    EXPECT_EQ(presentedAlert(), nullptr) << gone;
+    EXPECT_EQ(prompt(), nullptr) << gone;
+  }
+  EXPECT_FALSE(
+      loggedStarting("WARNING", "Not renaming special folder: " + Drive.appendingPathComponent("Desktop").absoluteString()))
+      << "what is not there is nothing special";
 }
 
 TEST_F(NavMoveTest, AnEmptyNameIsNeitherTakenNorExplained) {
@@ -307,6 +328,7 @@ TEST_F(NavMoveTest, AnEmptyNameIsNeitherTakenNorExplained) {
   bool accepted = false;
   EXPECT_EQ(prompt()->validateNewFilenameCallback()("", accepted), "");
   EXPECT_FALSE(accepted);
+  EXPECT_FALSE(logged("INFO", "================= Rename entry confirmed (nav)"));
   nav->promtForNewFolderAndCreate();
   EXPECT_EQ(prompt()->validateNewFilenameCallback()("", accepted), "");
   EXPECT_FALSE(accepted);

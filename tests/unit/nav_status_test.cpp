@@ -110,6 +110,16 @@ TEST_F(NavStatusTest, TheCountIsLoggedWhenItChanges) {
   EXPECT_TRUE(logged("DEBUG", "DLC items changed, count is 0"));
 }
 
+TEST_F(NavStatusTest, ACountThatAnotherListHadIsNotLoggedAgain) {
+  loadNav();
+  const std::vector<URL> items(8, addFile("a.txt"));
+  topList()->itemsLoaded(items);
+  nav->pushViewController(makeList(addFolder("Plans")), false);
+  topList()->itemsLoaded(items);
+  EXPECT_EQ(log().count("DEBUG", "DLC items changed, count is 8"), 1u);
+  EXPECT_EQ(statusText(), "items: 8");
+}
+
 TEST_F(NavStatusTest, EditModeShowsWhatIsSelectedAndHidesTheWayBack) {
   loadNav();
   const std::vector<URL> items = {addFile("a.txt"), addFile("b.txt")};
