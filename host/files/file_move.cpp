@@ -7,6 +7,7 @@
 #include <unistd.h>
 
 #include <cerrno>
+#include <climits>
 #include <cstdio>
 
 #include "host/drive/promise_file.h"
@@ -15,6 +16,8 @@
 #include "host/files/tree_copy.h"
 #include "host/files/tree_removals.h"
 #include "host/files/tree_walk.h"
+#include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 #include "host/support/unique_fd.h"
 #include "platform/url.h"
 
@@ -42,6 +45,19 @@ int renameItem(const std::string& from, const std::string& to) {
   return rename(from.c_str(), to.c_str()) == 0 ? 0 : errno;
 }
 
+/// Whether it is the folder where the item was to go, and not the item, of which a person is to be told.
+bool targetRefuses(int number, const std::string& from, const std::string& folder) {
+  struct stat info {};
+  if (number == ENOENT || number == ENOTDIR) {
+    return lstat(from.c_str(), &info) == 0 && (stat(folder.c_str(), &info) != 0 || !S_ISDIR(info.st_mode));
+  }
+  if (number != EACCES && number != EPERM && number != EROFS) return false;
+  const auto canChange = [](const std::string& path) {
+    return faccessat(AT_FDCWD, path.c_str(), W_OK | X_OK, AT_EACCESS) == 0;
+  };
+  return !canChange(folder) && canChange(folderOf(from));
+}
+
 int copyThenRemove(const std::string& from, const std::string& to, TreeRemovals* removals, const TreeCopy::GoOn& goOn) {
   if (const int number = whyNotMovable(from, folderOf(to))) return number;
   char name[48];
@@ -65,8 +81,16 @@ int copyThenRemove(const std::string& from, const std::string& to, TreeRemovals*
 }  // namespace
 
 Error moveError(int number, const std::string& from, const std::string& to) {
-  Error error =
-      describedError(number, number == EEXIST || number == ENAMETOOLONG || number == EILSEQ ? to : from, FileAccess::Write);
+  const bool isOfName = number == EEXIST || number == ENAMETOOLONG || number == EILSEQ;
+  const bool isOfTarget = !isOfName && targetRefuses(number, from, folderOf(to));
+  Error error = describedError(number, isOfName ? to : isOfTarget ? folderOf(to) : from, FileAccess::Write);
+  if (isOfTarget && (number == ENOENT || number == ENOTDIR)) {
+    error.localizedDescription = filled(_("The folder “%s” doesn’t exist any more."),
+                                        {takeString(g_filename_display_basename(folderOf(to).c_str()))});
+  }
+  if (number == EINVAL && URL(to).isInside(URL(from))) {
+    error.localizedDescription = _("A folder can’t be moved into itself.");
+  }
   error.userInfo[DestinationFilePathErrorKey] = Value(to);
   return error;
 }
@@ -86,6 +110,8 @@ std::optional<Error> moveFile(const std::string& from, const std::string& to, Tr
 std::optional<Error> movePromise(const std::string& promise, const std::string& to) {
   const std::string target = promisePathFor(to);
   const auto nameOf = [](const std::string& path) { return path.substr(path.rfind('/') + 1); };
+  // The promise could be written, but never the item.
+  if (nameOf(to).size() > NAME_MAX) return moveError(ENAMETOOLONG, promise, to);
   if (logicalNameOfShortPromise(nameOf(promise)) && logicalNameOfShortPromise(nameOf(target))) {
     std::optional<Error> error = moveFile(promise, target);
     if (error) error->userInfo[DestinationFilePathErrorKey] = Value(to);

@@ -4,6 +4,7 @@
 #include <cerrno>
 #include <climits>
 
+#include "host/drive/promise_file.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
 
@@ -70,7 +71,9 @@ Error describedError(int number, const std::string& path, FileAccess access) {
       return error;
     }
   }
-  error.localizedDescription = filled(wordsFor(number), {takeString(g_filename_display_basename(path.c_str()))});
+  // Nobody knows the file that stands for what is not downloaded.
+  const std::string known = logicalNameOf(path).value_or(path);
+  error.localizedDescription = filled(wordsFor(number), {takeString(g_filename_display_basename(known.c_str()))});
   return error;
 }
 

@@ -100,14 +100,22 @@ TEST_F(BadInputChangesTest, NamesThatNobodyCouldReadAreRefused) {
 
 TEST_F(BadInputChangesTest, AFolderThatCanOnlyBeReadKeepsAll) {
   write(drive + "/Locked/a.txt", "a");
+  write(drive + "/Locked/.far.txt.vlopromise", "[Promise]\nName=far.txt\nSize=9\n");
   const Content before = drives();
   if (!makeReadOnly(drive + "/Locked")) GTEST_SKIP() << std::strerror(errno);
   const std::string words = "“a.txt” is on a disk that can only be read.";
   EXPECT_EQ(rename("Locked/a.txt", "b.txt"), words);
+  EXPECT_EQ(rename("Locked/far.txt", "b.txt"), "“far.txt” is on a disk that can only be read.");
   EXPECT_EQ(UIUtils::bestMessage(FileUtils::remove(URL(drive + "/Locked/a.txt"))), words);
   EXPECT_EQ(UIUtils::bestMessage(FileUtils::mkdir(URL(drive + "/Locked/New"))), "“New” is on a disk that can only be read.");
-  EXPECT_EQ(moveInto("Plans", {"Locked/a.txt"}).size(), 1u);
-  EXPECT_EQ(moveInto("Locked", {"Report.txt", "Plans"}).size(), 2u);
+  std::vector<Error> errors = moveInto("Plans", {"Locked/a.txt"});
+  ASSERT_EQ(errors.size(), 1u);
+  EXPECT_EQ(UIUtils::bestMessage(errors[0]), words);
+  errors = moveInto("Locked", {"Report.txt", "Plans"});
+  ASSERT_EQ(errors.size(), 2u);
+  for (const Error& error : errors) {
+    EXPECT_EQ(UIUtils::bestMessage(error), "“Locked” is on a disk that can only be read.") << "the folder, not the item";
+  }
   EXPECT_EQ(drives(), before);
 }
 

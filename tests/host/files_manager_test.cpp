@@ -231,6 +231,42 @@ TEST_F(FilesManagerTest, APromiseDoesNotReplaceEither) {
   EXPECT_EQ(readPromise(promisePathFor(drive + "/b")).value->tags, std::vector<std::string>{"B"});
 }
 
+// The promise of such a name can be written, and was: an item that could never be downloaded.
+TEST_F(FilesManagerTest, WhatIsNotDownloadedTakesNoNameThatIsTooLong) {
+  promise(drive, "a");
+  EXPECT_EQ(move(drive + "/a", drive + "/" + std::string(256, 'x'))->localizedDescription,
+            "The name is too long by 1 character.");
+  EXPECT_EQ(namesIn(drive), std::vector<std::string>{".a.vlopromise"});
+  EXPECT_FALSE(move(drive + "/a", drive + "/" + std::string(255, 'x')));
+}
+
+// A person reads of the item that was to move, or of the folder that doesn't take it, whichever it is; and never of the file
+// that stands for an item that is not downloaded.
+TEST_F(FilesManagerTest, AFailedMoveNamesWhatIsInItsWay) {
+  write(drive + "/a", "a");
+  write(drive + "/file", "x");
+  promise(drive, "far");
+  promise(drive, std::string(250, 'y'));
+  makeFolder(drive + "/Plans");
+  const auto words = [&](const std::string& from, const std::string& to) {
+    const auto error = move(drive + "/" + from, drive + "/" + to);
+    EXPECT_EQ(destinationOf(error), drive + "/" + to);
+    return error->localizedDescription.value_or("");
+  };
+  const std::string folderIsGone = "The folder “Gone” doesn’t exist any more.";
+  EXPECT_EQ(words("a", "Gone/a"), folderIsGone);
+  EXPECT_EQ(words("Plans", "Gone/Plans"), folderIsGone);
+  EXPECT_EQ(words("far", "Gone/far"), folderIsGone);
+  EXPECT_EQ(words("a", "file/a"), "The folder “file” doesn’t exist any more.");
+  EXPECT_EQ(words("gone", "Plans/gone"), "The file “gone” doesn’t exist any more.");
+  EXPECT_EQ(words("gone", "Gone/gone"), "The file “gone” doesn’t exist any more.");
+  EXPECT_EQ(words("Plans", "Plans/Plans"), "A folder can’t be moved into itself.");
+  promise(drive + "/Plans", "far");
+  EXPECT_EQ(words("far", "Plans/far"), "An item named “far” already exists.");
+  EXPECT_EQ(read(drive + "/a"), "a");
+  EXPECT_TRUE(physicalPathOf(drive + "/far"));
+}
+
 TEST_F(FilesManagerTest, BetweenFileSystemsEverythingComesAlong) {
   if (!hasOtherFileSystem()) GTEST_SKIP() << "one file system only";
   write(other + "/tree/a/file", std::string(300000, 'x') + "end");
