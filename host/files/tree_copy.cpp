@@ -10,6 +10,7 @@
 #include <algorithm>
 #include <cerrno>
 #include <climits>
+#include <csignal>
 #include <cstdint>
 #include <cstring>
 #include <filesystem>
@@ -37,6 +38,15 @@ void copyAttributes(const std::string& from, const std::string& to) {
 bool isSame(const struct stat& a, const struct stat& b) {
   return a.st_dev == b.st_dev && a.st_ino == b.st_ino && a.st_mode == b.st_mode && a.st_size == b.st_size &&
          a.st_mtim.tv_sec == b.st_mtim.tv_sec && a.st_mtim.tv_nsec == b.st_mtim.tv_nsec;
+}
+
+/// Whether a program has the open file open for writing: what it still writes would go with the file when that is removed.
+bool isBeingWritten(int file) {
+  // Should a writer come this very moment, the kernel's signal must be one that ends nobody.
+  fcntl(file, F_SETSIG, SIGURG);
+  if (fcntl(file, F_SETLEASE, F_RDLCK) != 0) return errno == EAGAIN;
+  fcntl(file, F_SETLEASE, F_UNLCK);
+  return false;
 }
 
 int copyLink(const std::string& from, const std::string& to) {
@@ -126,6 +136,7 @@ int TreeCopy::compareContent(int one, int other) const {
 int TreeCopy::copyFile(const std::string& from, const std::string& to, const struct stat& info) {
   const UniqueFd in(open(from.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC));
   if (!in) return errno;
+  if (isBeingWritten(in.get())) return EBUSY;
   const UniqueFd out(open(to.c_str(), O_RDWR | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600));
   if (!out) return errno;
   for (;;) {
@@ -167,7 +178,10 @@ int TreeCopy::copyFolder(const std::string& from, const std::string& to, const s
 bool TreeCopy::sourceIsUnchanged() const {
   return std::all_of(copied_.begin(), copied_.end(), [](const Copied& item) {
     struct stat now {};
-    return lstat(item.path.c_str(), &now) == 0 && isSame(item.info, now);
+    if (lstat(item.path.c_str(), &now) != 0 || !isSame(item.info, now)) return false;
+    if (!S_ISREG(now.st_mode)) return true;
+    const UniqueFd file(open(item.path.c_str(), O_RDONLY | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC));
+    return file && !isBeingWritten(file.get());
   });
 }
 

@@ -23,11 +23,12 @@ class TreeCopy {
   TreeCopy(
       std::string from, std::string to, GoOn goOn = [] { return true; })
       : from_(std::move(from)), to_(std::move(to)), goOn_(std::move(goOn)) {}
-  /// 0 or the error number, after which a part of the copy may be there. EBUSY: the source changed meanwhile; EIO: the
-  /// disk gave back something else than it was given; ECANCELED: it was told to end.
+  /// 0 or the error number, after which a part of the copy may be there. EBUSY: the source changed meanwhile, or a program
+  /// holds a file of it open for writing; EIO: the disk gave back something else than it was given; ECANCELED: it was told
+  /// to end.
   int run() { return copy(from_, to_); }
   bool isFolder() const { return !copied_.empty() && S_ISDIR(copied_.front().info.st_mode); }
-  /// True while everything that run() copied is still as it was.
+  /// True while everything that run() copied is still as it was, and no program can write to it unseen.
   bool sourceIsUnchanged() const;
 
  private:

@@ -219,6 +219,31 @@ TEST_F(BadInputChangesTest, AFolderInTheWayIsNoTarget) {
   EXPECT_EQ(drives(), before);
 }
 
+// What the program wrote after the copy went to a file that was removed.
+TEST_F(BadInputChangesTest, WhatAnotherProgramHoldsForWritingLosesNothing) {
+  const std::string disk = drive + "/Disk";
+  if (!mount(disk, "tmpfs", "size=1m")) GTEST_SKIP() << std::strerror(errno);
+  write(drive + "/Folder/Deep.txt", "deep");
+  for (const std::string item : {"Report.txt", "Folder/Deep.txt"}) {
+    const std::string name = item.substr(0, item.find('/'));
+    const std::string before = read(drive + "/" + item);
+    const int held = ::open((drive + "/" + item).c_str(), O_WRONLY | O_APPEND);
+    ASSERT_GE(held, 0);
+    const std::vector<Error> errors = moveInto("Disk", {name});
+    ASSERT_EQ(errors.size(), 1u);
+    EXPECT_EQ(UIUtils::bestMessage(errors[0]), "“" + name + "” is being changed by another program. Try again later.");
+    EXPECT_TRUE(std::filesystem::is_empty(disk));
+    EXPECT_EQ(::write(held, ", more", 6), 6);
+    // On its own disk it takes the program along.
+    EXPECT_TRUE(moveInto("Plans", {name}).empty());
+    EXPECT_EQ(::write(held, ", end", 5), 5);
+    ::close(held);
+    EXPECT_TRUE(moveInto("Disk", {"Plans/" + name}).empty());
+    EXPECT_EQ(read(disk + "/" + item), before + ", more, end");
+    std::filesystem::remove_all(disk + "/" + name);
+  }
+}
+
 TEST_F(BadInputChangesTest, ItemsThatAnotherProgramRenamesMeanwhileAreAllSomewhere) {
   constexpr int count = 300;
   std::vector<std::string> names;

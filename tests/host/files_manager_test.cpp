@@ -6,6 +6,7 @@
 #include "host/drive/promise_file.h"
 #include "host/files/local_file_manager.h"
 #include "host/files/tree_copy.h"
+#include "host/support/unique_fd.h"
 #include "tests/host/drive_test_support.h"
 
 namespace vaelo {
@@ -326,6 +327,20 @@ TEST_F(FilesManagerTest, ACopyKnowsWhenItsSourceChanged) {
   ASSERT_EQ(second.run(), 0);
   write(drive + "/tree/a", "changed");
   EXPECT_FALSE(second.sourceIsUnchanged());
+}
+
+TEST_F(FilesManagerTest, ACopyKnowsWhoMayStillWriteToItsSource) {
+  write(drive + "/tree/a", "1");
+  TreeCopy copy(drive + "/tree", drive + "/copy");
+  EXPECT_EQ(copy.run(), 0);
+  {
+    const UniqueFd reader(::open((drive + "/tree/a").c_str(), O_RDONLY));
+    EXPECT_TRUE(copy.sourceIsUnchanged()) << "whoever reads takes nothing away";
+    const UniqueFd writer(::open((drive + "/tree/a").c_str(), O_WRONLY));
+    EXPECT_FALSE(copy.sourceIsUnchanged());
+    EXPECT_EQ(TreeCopy(drive + "/tree", drive + "/second").run(), EBUSY);
+  }
+  EXPECT_TRUE(copy.sourceIsUnchanged());
 }
 
 TEST_F(FilesManagerTest, ACopyEndsWhereverItIsToldTo) {
