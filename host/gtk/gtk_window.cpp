@@ -35,7 +35,7 @@ GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds, Dr
   const GRef<GMenuItem> grid(g_menu_item_new(_("View as _Grid"), "narrow.grid"));
   g_menu_item_set_attribute(grid.get(), "hidden-when", "s", "action-missing");
   g_menu_append_item(menu_, grid.get());
-  g_menu_append(menu_, _("Select _All"), "win.select-all");
+  g_menu_append(menu_, _("Select A_ll"), "win.select-all");
   g_menu_append(menu_, _("_Refresh"), "win.refresh");
   g_menu_append(menu_, _("A_ccounts…"), "app.accounts");
   g_menu_append(menu_, _("_About Vaelo Drive"), "app.about");

@@ -117,6 +117,20 @@ class Translations(unittest.TestCase):
                 self.check_says(f"{language}.po:")
                 (self.root / "po" / f"{language}.po").write_text(kept)
 
+    def test_a_letter_to_press_that_is_lost_is_told(self):
+        self.replace("po/fr.po", 'msgstr "_Copier"', 'msgstr "Copier"')
+        self.check_says("po/fr.po:")
+
+    def test_entries_of_a_menu_have_letters_of_their_own(self):
+        for file, old, new, letter in (("po/ru.po", 'msgstr "_Копировать"', 'msgstr "_Скопировать"', "с"),
+                                       ("po/ja.po", 'msgstr "コピー(_C)"', 'msgstr "コピー(_H)"', "h"),
+                                       ("po/vaelo-drive.pot", 'msgid "_Copy"', 'msgid "_Hopy"', "h")):
+            with self.subTest(file):
+                kept = (self.root / file).read_text()
+                self.replace(file, old, new)
+                self.check_says(f"{file}: “{letter}” is the letter of several texts of host/gtk/preview/pages_selecting.cpp")
+                (self.root / file).write_text(kept)
+
     def test_a_language_with_other_texts_than_the_template_is_told(self):
         self.replace("po/fr.po", 'msgid "Main Menu"', 'msgid "Chief Menu"')
         self.check_says("po/fr.po: has other texts than the template")
