@@ -109,7 +109,7 @@ class Translations(unittest.TestCase):
         self.check_says("po/ru.po:")
 
     def test_what_is_filled_in_must_be_the_same(self):
-        for language, old, new in (("fr", "Partager %s", "Partager"), ("ar", "افتح في «%@»", "افتح في «%s»"),
+        for language, old, new in (("fr", "Partager %s", "Partager"), ("ar", "«\u2068%@\u2069» بالفعل", "«%s» بالفعل"),
                                    ("ru", "%s файлов", "файлов"), ("de", "%@\u00a0MB", "%@ %@\u00a0MB")):
             with self.subTest(language):
                 kept = (self.root / "po" / f"{language}.po").read_text()
