@@ -6,6 +6,7 @@
 
 #include "bench/preview_samples.h"
 #include "bench/preview_window.h"
+#include "bench/turns.h"
 
 namespace {
 

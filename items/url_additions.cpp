@@ -28,11 +28,11 @@ URL vlo_URLByResolvingAlias(const URL& url) {
 
 bool vlo_isDesktopOrDocumentsFolder(const URL& url) {
   CloudDocuments& cloud = Platform::current().cloudDocuments;
-  const Result<CloudContainerRef> container = cloud.containerForURL(url);
-  if (!container.value || !*container.value) return false;
-  if ((*container.value)->identifier() != cloud.defaultContainerIdentifier()) return false;
+  // The path comes first, since thousands of items may be asked for and few of them need the container.
   const std::optional<std::string> path = cloud.pathRelativeToMirror(url);
-  return path == "com~marrow~Kestrel/Documents" || path == "com~marrow~Kestrel/Desktop";
+  if (path != "com~marrow~Kestrel/Documents" && path != "com~marrow~Kestrel/Desktop") return false;
+  const Result<CloudContainerRef> container = cloud.containerForURL(url);
+  return container.value && *container.value && (*container.value)->identifier() == cloud.defaultContainerIdentifier();
 }
 
 bool vlo_canCrossZoneMoveURLs(const std::vector<URL>& urls) {

@@ -15,6 +15,7 @@
 #include "host/drive/promise_file.h"
 #include "host/files/file_move.h"
 #include "host/files/file_times.h"
+#include "host/files/long_work.h"
 #include "host/files/system_error.h"
 #include "host/files/tree_walk.h"
 
@@ -84,6 +85,9 @@ std::optional<Error> LocalFileManager::createDirectoryAtURL(const URL& url) {
 }
 
 std::optional<Error> LocalFileManager::removeItemAtURL(const URL& url) {
+  if (longWork_ && !longWork_->step(url.path(), LongWork::Kind::Removal)) {
+    return describedError(ECANCELED, url.path(), FileAccess::Write);
+  }
   const std::optional<std::string> physical = physicalPathOf(url.path());
   if (!physical) return describedError(ENOENT, url.path(), FileAccess::Write);
   struct stat info {};
@@ -94,6 +98,7 @@ std::optional<Error> LocalFileManager::removeItemAtURL(const URL& url) {
 
 std::optional<Error> LocalFileManager::moveItemAtURL(const URL& source, const URL& destination) {
   const std::string& to = destination.path();
+  if (longWork_ && !longWork_->step(source.path(), LongWork::Kind::Move)) return moveError(ECANCELED, source.path(), to);
   if (renamePlainly(source, to, rules_)) return std::nullopt;
   const std::optional<std::string> from = physicalPathOf(source.path());
   if (!from) return moveError(ENOENT, source.path(), to);

@@ -12,7 +12,7 @@ namespace vaelo {
 class LocalFileManager : public FileManager {
  public:
   /// Folders that are removed go through `removals`, which outlives it; without, they are removed on the spot. What `rules`
-  /// take for one name is taken. Moves between disks are `longWork`, where given, which outlives it too.
+  /// take for one name is taken. Moves and removals are `longWork`, where given, which outlives it too.
   explicit LocalFileManager(TreeRemovals* removals = nullptr, NameRules rules = {}, LongWork* longWork = nullptr)
       : removals_(removals), rules_(rules), longWork_(longWork) {}
   bool fileExistsAtPath(const std::string& path, bool* isDirectory = nullptr) override;

@@ -4,6 +4,7 @@
 #include <condition_variable>
 #include <mutex>
 #include <thread>
+#include <utility>
 
 namespace vaelo {
 
@@ -49,29 +50,51 @@ int LongWork::run(const std::string& path, const Job& job) {
     outcome.changed.wait_until(lock, since_ + moment_, [&] { return outcome.done; });
   }
   if (Clock::now() >= since_ + moment_) {
-    begin(path);
+    begin(path, Kind::Move);
     while (!outcome.isDone()) g_main_context_iteration(nullptr, TRUE);
     g_main_context_iteration(nullptr, FALSE);
     since_ = Clock::now();
   }
   thread.join();
-  // The caller may have more to do; what it does next comes before the timer.
-  if (--depth_ == 0) {
-    endTimer_ = g_timeout_add(
-        static_cast<guint>(moment_.count()),
-        [](gpointer self) -> gboolean {
-          static_cast<LongWork*>(self)->end();
-          return G_SOURCE_REMOVE;
-        },
-        this);
-  }
+  if (--depth_ == 0) waitForMore();
   return outcome.answer;
 }
 
-void LongWork::begin(const std::string& path) {
+bool LongWork::step(const std::string& path, Kind kind) {
+  if (!g_main_context_is_owner(nullptr) || depth_ != 0) return !cancelled_;
+  if (endTimer_ == 0) {
+    since_ = Clock::now();
+    waitForMore();
+  }
+  // Half of it, since what comes next takes its time too.
+  if (Clock::now() < since_ + moment_ / 2) return !cancelled_;
+  g_source_remove(std::exchange(endTimer_, 0));
+  ++depth_;
+  begin(path, kind);
+  constexpr int manyTurns = 50;
+  for (int turn = 0; turn < manyTurns && g_main_context_iteration(nullptr, FALSE); ++turn) {
+  }
+  since_ = Clock::now();
+  --depth_;
+  waitForMore();
+  return !cancelled_;
+}
+
+void LongWork::begin(const std::string& path, Kind kind) {
   if (!shown_) isUnderWay_(true);
   shown_ = true;
-  if (watcher_) watcher_(&path);
+  if (watcher_) watcher_(kind, &path);
+}
+
+/// The caller may have more to do; what it does next comes before the timer.
+void LongWork::waitForMore() {
+  endTimer_ = g_timeout_add(
+      static_cast<guint>(moment_.count()),
+      [](gpointer self) -> gboolean {
+        static_cast<LongWork*>(self)->end();
+        return G_SOURCE_REMOVE;
+      },
+      this);
 }
 
 void LongWork::end() {
@@ -79,7 +102,7 @@ void LongWork::end() {
   cancelled_ = false;
   if (!shown_) return;
   shown_ = false;
-  if (watcher_) watcher_(nullptr);
+  if (watcher_) watcher_(Kind::Move, nullptr);
   isUnderWay_(false);
 }
 

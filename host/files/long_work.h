@@ -10,15 +10,16 @@
 
 namespace vaelo {
 
-/// Keeps the window alive while the main thread waits for something long, such as a copy from disk to disk: its caller needs
-/// the answer before it goes on, so the main loop runs inside of the call. A row of such calls is one piece of work to
-/// whoever watches. The main loop's own calls only; from other threads work runs where it is asked for.
+/// Keeps the window alive while the main thread waits for something long, such as a copy from disk to disk or thousands of
+/// renames: its caller needs the answer before it goes on, so the main loop runs inside of the call. A row of such calls is
+/// one piece of work to whoever watches. The main loop's own calls only; from other threads work runs where it is asked for.
 class LongWork {
  public:
   /// Ends early when `goOn`, which may be asked from its thread at any time, answers false.
   using Job = std::function<int(const std::function<bool()>& goOn)>;
+  enum class Kind { Move, Removal };
   /// Hears what is worked on, a path, as soon as it takes longer than a moment, and at the end nothing.
-  using Watcher = std::function<void(const std::string* path)>;
+  using Watcher = std::function<void(Kind, const std::string* path)>;
 
   /// `isUnderWay` hears of the beginning and the end of each piece of work that the main loop ran inside of.
   LongWork(std::function<void(bool)> isUnderWay, std::chrono::milliseconds moment = std::chrono::milliseconds(50))
@@ -27,8 +28,11 @@ class LongWork {
   LongWork(const LongWork&) = delete;
   LongWork& operator=(const LongWork&) = delete;
 
-  /// Answers what the job answers.
+  /// A move from disk to disk. Answers what the job answers.
   int run(const std::string& path, const Job& job);
+  /// Comes before each of what may be thousands of quick calls: the main loop runs in between as soon as they take longer
+  /// together than a moment. False where the rest of the row is not to be done.
+  bool step(const std::string& path, Kind kind);
   /// Ends what is under way, and all that comes before the main loop is itself again. Main thread.
   void cancel() { cancelled_ = true; }
   bool isCancelled() const { return cancelled_; }
@@ -37,7 +41,8 @@ class LongWork {
 
  private:
   using Clock = std::chrono::steady_clock;
-  void begin(const std::string& path);
+  void begin(const std::string& path, Kind kind);
+  void waitForMore();
   void end();
 
   std::function<void(bool)> isUnderWay_;

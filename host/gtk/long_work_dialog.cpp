@@ -10,17 +10,17 @@ namespace vaelo {
 
 namespace {
 
-std::string headingFor(const std::string& path) {
+std::string headingFor(LongWork::Kind kind, const std::string& path) {
   const std::string name = takeString(g_filename_display_basename(path.c_str()));
-  return filled(_("Moving “%s”…"), {name});
+  return filled(kind == LongWork::Kind::Removal ? _("Deleting “%s”…") : _("Moving “%s”…"), {name});
 }
 
 }  // namespace
 
 LongWorkDialog::LongWorkDialog(GtkScreens& screens, LongWork& work) : screens_(screens), work_(work) {
-  work_.setWatcher([this](const std::string* path) {
+  work_.setWatcher([this](LongWork::Kind kind, const std::string* path) {
     if (path) {
-      show(*path);
+      show(headingFor(kind, *path));
     } else {
       close();
     }
@@ -32,14 +32,14 @@ LongWorkDialog::~LongWorkDialog() {
   close();
 }
 
-void LongWorkDialog::show(const std::string& path) {
+void LongWorkDialog::show(const std::string& heading) {
   if (dialog_) {
-    adw_message_dialog_set_heading(ADW_MESSAGE_DIALOG(dialog_), headingFor(path).c_str());
+    adw_message_dialog_set_heading(ADW_MESSAGE_DIALOG(dialog_), heading.c_str());
     return;
   }
   const auto window = screens_.window();
   if (!window || work_.isCancelled()) return;
-  GtkWidget* dialog = adw_message_dialog_new(window->widget(), headingFor(path).c_str(), nullptr);
+  GtkWidget* dialog = adw_message_dialog_new(window->widget(), heading.c_str(), nullptr);
   GtkWidget* spinner = gtk_spinner_new();
   constexpr int size = 32;
   gtk_widget_set_size_request(spinner, size, size);

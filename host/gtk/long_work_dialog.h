@@ -9,7 +9,7 @@ namespace vaelo {
 
 class GtkScreens;
 
-/// What shows, over everything else, while items are moved from disk to disk, with a way to end it. Main thread.
+/// What shows, over everything else, while the moves or removals of items take long, with a way to end it. Main thread.
 class LongWorkDialog {
  public:
   /// Both outlive it.
@@ -19,7 +19,7 @@ class LongWorkDialog {
   LongWorkDialog& operator=(const LongWorkDialog&) = delete;
 
  private:
-  void show(const std::string& path);
+  void show(const std::string& heading);
   void close();
 
   GtkScreens& screens_;

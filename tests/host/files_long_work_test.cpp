@@ -31,7 +31,9 @@ void onMainLoop(const std::function<void()>& deed) {
 class LongWorkTest : public testing::Test {
  protected:
   LongWorkTest() {
-    work.setWatcher([this](const std::string* path) { told.push_back(path ? "watch " + *path : "watch nothing"); });
+    work.setWatcher([this](LongWork::Kind kind, const std::string* path) {
+      told.push_back(!path ? "watch nothing" : (kind == LongWork::Kind::Removal ? "watch removal " : "watch ") + *path);
+    });
   }
   void waitForTheEnd() {
     while (told.empty() || told.back() != "ended") g_main_context_iteration(nullptr, TRUE);
@@ -105,6 +107,76 @@ TEST_F(LongWorkTest, WhatIsOverInAMomentIsNotToldOf) {
   EXPECT_THAT(told, IsEmpty());
 }
 
+void spin(std::chrono::microseconds time) {
+  const auto start = std::chrono::steady_clock::now();
+  while (std::chrono::steady_clock::now() - start < time) std::this_thread::yield();
+}
+
+TEST_F(LongWorkTest, TheMainLoopGoesOnBetweenTheStepsOfALongRow) {
+  unsigned heard = 0;
+  const guint timer = g_timeout_add(
+      1,
+      [](gpointer counter) -> gboolean {
+        ++*static_cast<unsigned*>(counter);
+        return G_SOURCE_CONTINUE;
+      },
+      &heard);
+  onMainLoop([&] {
+    const unsigned before = heard;
+    for (int i = 0; i < 100; ++i) {
+      EXPECT_TRUE(work.step("/" + std::to_string(i), LongWork::Kind::Move));
+      spin(std::chrono::microseconds(100));
+    }
+    EXPECT_GE(heard, before + 3);
+  });
+  g_source_remove(timer);
+  ASSERT_GE(told.size(), 4u);
+  EXPECT_EQ(told.at(0), "began");
+  EXPECT_THAT(told.at(1), testing::StartsWith("watch /"));
+  EXPECT_THAT(told, testing::Not(testing::Contains("ended"))) << "the row is one piece of work";
+  waitForTheEnd();
+  EXPECT_EQ(std::count(told.begin(), told.end(), "began"), 1);
+}
+
+TEST_F(LongWorkTest, AShortRowIsNotToldOf) {
+  LongWork patient([this](bool) { told.push_back("told"); }, std::chrono::hours(1));
+  onMainLoop([&] {
+    for (int i = 0; i < 100; ++i) EXPECT_TRUE(patient.step("/a", LongWork::Kind::Move));
+  });
+  EXPECT_THAT(told, IsEmpty());
+}
+
+TEST_F(LongWorkTest, StepsThatAreFarApartAreNoRow) {
+  LongWork patient([this](bool) { told.push_back("told"); }, std::chrono::milliseconds(20));
+  const auto singly = [&] { EXPECT_TRUE(patient.step("/a", LongWork::Kind::Move)); };
+  onMainLoop(singly);
+  bool later = false;
+  g_timeout_add_once(
+      60, [](gpointer flag) { *static_cast<bool*>(flag) = true; }, &later);
+  while (!later) g_main_context_iteration(nullptr, TRUE);
+  onMainLoop(singly);
+  EXPECT_THAT(told, IsEmpty());
+}
+
+TEST_F(LongWorkTest, OutsideOfTheMainLoopAStepIsNothing) {
+  for (int i = 0; i < 3; ++i) {
+    EXPECT_TRUE(work.step("/a", LongWork::Kind::Move));
+    spin(std::chrono::milliseconds(1));
+  }
+  EXPECT_THAT(told, IsEmpty());
+}
+
+TEST_F(LongWorkTest, ACancelledRowTakesNoMoreSteps) {
+  onMainLoop([this] {
+    g_timeout_add_once(
+        2, [](gpointer held) { static_cast<LongWork*>(held)->cancel(); }, &work);
+    while (work.step("/a", LongWork::Kind::Move)) spin(std::chrono::microseconds(100));
+    EXPECT_FALSE(work.step("/b", LongWork::Kind::Move));
+  });
+  waitForTheEnd();
+  onMainLoop([this] { EXPECT_TRUE(work.step("/c", LongWork::Kind::Move)); });
+}
+
 /// Between the drive and another file system.
 class LongMovesTest : public drive_test::PlatformTest {
  protected:
@@ -149,18 +221,49 @@ TEST_F(LongMovesTest, WhatMovesAroundItIsOfferedTogether) {
 
 TEST_F(LongMovesTest, AMoveBetweenDisksIsLongWork) {
   if (!hasOtherFileSystem()) GTEST_SKIP() << "one file system only";
-  write(other + "/tree/a", "a");
+  write(other + "/tree/a", std::string(16 << 20, 'a'));
+  std::vector<std::string> watched;
+  LongWork work([](bool) {}, std::chrono::milliseconds(1));
+  work.setWatcher([&](LongWork::Kind, const std::string* path) { watched.push_back(path ? *path : ""); });
+  LocalFileManager files(nullptr, {}, &work);
+  onMainLoop([&] { EXPECT_FALSE(files.moveItemAtURL(URL(other + "/tree"), URL(drive + "/tree"))); });
+  EXPECT_THAT(watched, testing::Contains(other + "/tree"));
+  EXPECT_EQ(read(drive + "/tree/a").size(), 16u << 20);
+  EXPECT_FALSE(exists(other + "/tree"));
+}
+
+TEST_F(LongMovesTest, WhatIsCancelledInARowOfRenamesStaysWhereItIs) {
+  write(drive + "/a", "a");
+  LongWork work([](bool) {});
+  LocalFileManager files(nullptr, {}, &work);
+  const auto before = content(drive);
+  onMainLoop([&] {
+    work.cancel();
+    const auto error = files.moveItemAtURL(URL(drive + "/a"), URL(drive + "/b"));
+    ASSERT_TRUE(error);
+    EXPECT_EQ(error->code, FileErrorCode::UserCancelled);
+  });
+  EXPECT_EQ(content(drive), before);
+}
+
+TEST_F(LongMovesTest, RemovalsAreARowToo) {
+  for (const char* name : {"/a", "/b"}) write(drive + name);
   std::vector<std::string> watched;
   LongWork work([](bool) {}, std::chrono::milliseconds(0));
-  work.setWatcher([&](const std::string* path) { watched.push_back(path ? *path : ""); });
+  work.setWatcher([&](LongWork::Kind kind, const std::string* path) {
+    if (path && kind == LongWork::Kind::Removal) watched.push_back(*path);
+  });
   LocalFileManager files(nullptr, {}, &work);
   onMainLoop([&] {
-    EXPECT_FALSE(files.moveItemAtURL(URL(other + "/tree"), URL(drive + "/tree")));
-    EXPECT_FALSE(files.moveItemAtURL(URL(drive + "/tree"), URL(drive + "/renamed")));
+    EXPECT_FALSE(files.removeItemAtURL(URL(drive + "/a")));
+    work.cancel();
+    const auto error = files.removeItemAtURL(URL(drive + "/b"));
+    ASSERT_TRUE(error);
+    EXPECT_EQ(error->code, FileErrorCode::UserCancelled);
   });
-  EXPECT_THAT(watched, ElementsAre(other + "/tree")) << "a rename takes no time";
-  EXPECT_EQ(read(drive + "/renamed/a"), "a");
-  EXPECT_FALSE(exists(other + "/tree"));
+  EXPECT_THAT(watched, testing::Contains(drive + "/a"));
+  EXPECT_FALSE(exists(drive + "/a"));
+  EXPECT_TRUE(exists(drive + "/b"));
 }
 
 TEST_F(LongMovesTest, ACancelledMoveLeavesTheSourceWholeAndNothingElse) {
