@@ -5,6 +5,7 @@
 
 #include "host/gtk/tags_popover.h"
 #include "items/dr_item.h"
+#include "platform/platform.h"
 #include "preview/preview_details_view_controller.h"
 #include "preview/preview_item_manager.h"
 
@@ -16,6 +17,15 @@ const FileInfoCell* rowOfTags(const PreviewDetailsViewController& details) {
   const auto& rows = details.fileInfoView()->arrangedSubviews();
   const auto* last = rows.empty() ? nullptr : dynamic_cast<const FileInfoCell*>(rows.back().get());
   return last && last->valueLabel()->attributedText() ? last : nullptr;
+}
+
+/// A change of tags leaves the document's time as it is, by which screens are refreshed.
+void showTagsAnew(PreviewDetailsViewController& details) {
+  const std::shared_ptr<PreviewItemManager> manager = details.itemManager();
+  const std::shared_ptr<DRItem> item = manager ? manager->item() : nullptr;
+  if (!item || !item->resolvedURL()) return;
+  item->setTags(Platform::current().cloudDocuments.tagNames(*item->resolvedURL()).value);
+  details.refreshItem();
 }
 
 bool holds(const GdkRectangle& place, double x, double y) {
@@ -65,7 +75,9 @@ void DetailsTags::pressed(GtkGesture* gesture, double x, double y) {
 void DetailsTags::showTags() {
   const std::shared_ptr<PreviewItemManager> manager = details_->itemManager();
   if (!manager || !manager->item() || !manager->item()->url()) return;
-  showTagsPopover(page_, place(), *manager->item()->url(), tags_);
+  showTagsPopover(page_, place(), *manager->item()->url(), tags_, [weak = std::weak_ptr(details_)] {
+    if (const auto details = weak.lock()) showTagsAnew(*details);
+  });
 }
 
 }  // namespace vaelo

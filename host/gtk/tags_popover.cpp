@@ -72,8 +72,8 @@ std::string messageFor(const Error& error) {
 /// Lives as long as its popover.
 class TagsPopover {
  public:
-  TagsPopover(GtkWidget* over, const GdkRectangle& at, const URL& item, DriveSyncedStore& tags)
-      : path_(item.path()), tags_(tags), popover_(gtk_popover_new()) {
+  TagsPopover(GtkWidget* over, const GdkRectangle& at, const URL& item, DriveSyncedStore& tags, std::function<void()> changed)
+      : path_(item.path()), tags_(tags), changed_(std::move(changed)), popover_(gtk_popover_new()) {
     gtk_widget_set_parent(popover_, over);
     gtk_popover_set_pointing_to(GTK_POPOVER(popover_), &at);
     setAccessibleName(popover_, _("Tags"));
@@ -200,7 +200,8 @@ class TagsPopover {
     gtk_widget_set_visible(problem_, FALSE);
     worker_.run([this, path = path_, name, on]() -> std::function<void()> {
       return [this, name, on, failed = setTag(path, name, on)] {
-        if (failed) refuse(name, !on, *failed);
+        if (failed) return refuse(name, !on, *failed);
+        if (changed_) changed_();
       };
     });
   }
@@ -242,10 +243,12 @@ class TagsPopover {
     settling_ = true;
     gtk_check_button_set_active(GTK_CHECK_BUTTON(checks_.at(name)), TRUE);
     settling_ = false;
+    if (changed_) changed_();
   }
 
   const std::string path_;
   DriveSyncedStore& tags_;
+  const std::function<void()> changed_;
   GtkWidget* popover_;
   GtkWidget* rows_ = nullptr;
   GtkWidget* field_ = nullptr;
@@ -259,8 +262,9 @@ class TagsPopover {
 
 }  // namespace
 
-void showTagsPopover(GtkWidget* over, const GdkRectangle& at, const URL& item, DriveSyncedStore& tags) {
-  new TagsPopover(over, at, item, tags);
+void showTagsPopover(GtkWidget* over, const GdkRectangle& at, const URL& item, DriveSyncedStore& tags,
+                     std::function<void()> changed) {
+  new TagsPopover(over, at, item, tags, std::move(changed));
 }
 
 }  // namespace vaelo

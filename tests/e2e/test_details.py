@@ -118,6 +118,9 @@ class TagsOfTheDetails(Details):
         self.app.wait("Work", "check box")
         self.app.key("space")
         wait_for("the tag to be off", lambda: "user.xdg.tags" not in os.listxattr(self.drive / "Report.txt"))
+        wait_for("no row of tags", lambda: not self.app.find("Tags", "label"))
+        self.app.key("space")
+        self.app.wait("Work", "label")
 
     def test_so_does_a_key(self):
         self.app.key("ctrl+t")
