@@ -6,6 +6,22 @@
 
 namespace vaelo {
 
+namespace {
+
+void closeMenus(GtkWidget* widget) {
+  GtkWidget* next = nullptr;
+  for (GtkWidget* child = gtk_widget_get_first_child(widget); child; child = next) {
+    next = gtk_widget_get_next_sibling(child);
+    if (GTK_IS_POPOVER(child)) {
+      gtk_popover_popdown(GTK_POPOVER(child));
+    } else {
+      closeMenus(child);
+    }
+  }
+}
+
+}  // namespace
+
 PageStack::PageStack() : leaflet_(ADW_LEAFLET(g_object_ref_sink(adw_leaflet_new()))) {
   // Never side by side: a stack is one screen at a time on every window size.
   adw_leaflet_set_can_unfold(leaflet_, FALSE);
@@ -50,6 +66,9 @@ void PageStack::setPages(const std::vector<GtkWidget*>& pages, bool animated, st
   GtkWidget* top = pages_.empty() ? nullptr : pages_.back();
   const bool slides = animated && top && adw_leaflet_get_visible_child(leaflet_) &&
                       adw_leaflet_get_visible_child(leaflet_) != top && gtk_widget_get_mapped(widget());
+  // A menu that is open would go with its page, but keep all presses and keys of the application to itself.
+  GtkWidget* shown = adw_leaflet_get_visible_child(leaflet_);
+  if (shown && shown != top) closeMenus(shown);
   if (top) {
     GtkSettings* settings = gtk_widget_get_settings(widget());
     gboolean wished = TRUE;

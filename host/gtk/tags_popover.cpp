@@ -72,7 +72,8 @@ std::string messageFor(const Error& error) {
 /// Lives as long as its popover.
 class TagsPopover {
  public:
-  TagsPopover(GtkWidget* over, const GdkRectangle& at, const URL& item, DriveSyncedStore& tags, std::function<void()> changed)
+  TagsPopover(GtkWidget* over, const GdkRectangle& at, const URL& item, DriveSyncedStore& tags,
+              std::function<void()> changed)
       : path_(item.path()), tags_(tags), changed_(std::move(changed)), popover_(gtk_popover_new()) {
     gtk_widget_set_parent(popover_, over);
     gtk_popover_set_pointing_to(GTK_POPOVER(popover_), &at);

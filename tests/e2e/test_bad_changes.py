@@ -2,6 +2,7 @@
 """Changes in a real window that meet what other programs do in between, disks that refuse, and a second instance: each ends with
 every byte accounted for."""
 import os
+import shutil
 import subprocess
 import unittest
 
@@ -71,6 +72,23 @@ class Between(ItemsWindow):
         wait_for("an alert", lambda: app.find("OK", "push button"))
         self.assertEqual((self.drive / "Second.txt").read_text(), "Second.txt")
         self.assertEqual((self.drive / "Third.txt").read_text(), "Third.txt")
+
+    def test_a_menu_goes_with_its_folder_and_the_window_goes_on(self):
+        app = self.app
+        (self.drive / "Plans" / "Inside.txt").write_text("inside")
+        app.click("Plans", "list item")
+        app.wait("Inside.txt", "list item")
+        app.click("Inside.txt", "list item", button=3)
+        app.wait("Rename…", "menu item")
+        shutil.rmtree(self.drive / "Plans")
+        app.wait("Report.txt", "list item")
+        app.wait_gone("Inside.txt")
+        app.click("Main Menu")
+        app.wait("Accounts…", "menu item")
+        app.link("vaelodriveapp:" + str(self.drive / "Documents"))
+        app.wait_title("Documents")
+        app.click("Main Menu")
+        app.wait("Accounts…", "menu item")
 
 
 class Disks(ItemsWindow):

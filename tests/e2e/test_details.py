@@ -126,6 +126,15 @@ class TagsOfTheDetails(Details):
         self.app.key("ctrl+t")
         self.app.wait("New tag")
 
+    def test_the_menu_goes_with_the_document(self):
+        self.app.click("Work", "label")
+        self.app.wait("New tag")
+        (self.drive / "Report.txt").unlink()
+        self.app.wait("Second.txt", "list item")
+        self.app.wait_gone("Kind")
+        self.app.click("Main Menu")
+        self.app.wait("Accounts…", "menu item")
+
 
 if __name__ == "__main__":
     unittest.main()
