@@ -41,9 +41,12 @@ GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds, Dr
   g_menu_append(menu_, _("_About Vaelo Drive"), "app.about");
   addActions();
   stack_.onSwipedBack([this](std::size_t left) {
-    if (const auto controller = navigation()) controller->userWentBackTo(left);
-    followTop();
-    if (ScreenPage* page = topPage()) page->takeFocus();
+    const auto controller = navigation();
+    if (!controller) return;
+    controller->userWentBackTo(left);
+    // The controller takes for granted that this window shows it already. The page that was left would stay until the next
+    // change, with all that it holds.
+    stackChanged({}, controller->viewControllers(), false, [] {});
   });
   const auto changed = [](GtkWindowHost* self) { self->sizeChanged(); };
   for (const char* property :

@@ -4,7 +4,40 @@
 #include <algorithm>
 #include <utility>
 
+#include "host/support/glib_ptr.h"
+
 namespace vaelo {
+namespace {
+
+/// What takes a tap may keep its end from what lies around it. A gesture that waits for that end ever after follows no other
+/// finger: the first tap on a row would be the last time that a swipe went back.
+void forgetFingers(GtkWidget* widget) {
+  const GRef<GListModel> controllers(gtk_widget_observe_controllers(widget));
+  for (guint i = 0; i < g_list_model_get_n_items(controllers.get()); ++i) {
+    const GRef<GObject> controller(G_OBJECT(g_list_model_get_item(controllers.get(), i)));
+    if (!GTK_IS_GESTURE(controller.get())) continue;
+    auto* gesture = GTK_EVENT_CONTROLLER(controller.get());
+    // Those of the capture phase see the end, being asked first.
+    if (gtk_event_controller_get_propagation_phase(gesture) == GTK_PHASE_BUBBLE) gtk_event_controller_reset(gesture);
+  }
+}
+
+void forgetFingersBeforeTheFirst(GtkWidget* widget) {
+  GtkEventController* touches = gtk_event_controller_legacy_new();
+  gtk_event_controller_set_propagation_phase(touches, GTK_PHASE_CAPTURE);
+  g_signal_connect(
+      touches, "event", G_CALLBACK(+[](GtkEventController* self, GdkEvent* event) -> gboolean {
+        // Only the first finger moves the pointer.
+        if (gdk_event_get_event_type(event) == GDK_TOUCH_BEGIN && gdk_touch_event_get_emulating_pointer(event)) {
+          forgetFingers(gtk_event_controller_get_widget(self));
+        }
+        return GDK_EVENT_PROPAGATE;
+      }),
+      nullptr);
+  gtk_widget_add_controller(widget, touches);
+}
+
+}  // namespace
 
 namespace {
 
@@ -27,6 +60,7 @@ PageStack::PageStack() : leaflet_(ADW_LEAFLET(g_object_ref_sink(adw_leaflet_new(
   adw_leaflet_set_can_unfold(leaflet_, FALSE);
   adw_leaflet_set_can_navigate_back(leaflet_, TRUE);
   adw_leaflet_set_transition_type(leaflet_, ADW_LEAFLET_TRANSITION_TYPE_OVER);
+  forgetFingersBeforeTheFirst(widget());
   g_signal_connect_swapped(leaflet_, "notify::child-transition-running", G_CALLBACK(+[](PageStack* self) {
                              if (!self->settingPages_ && !adw_leaflet_get_child_transition_running(self->leaflet_)) {
                                self->slideEnded();

@@ -149,6 +149,8 @@ class FolderView {
   const GtkWidget* focusBefore_ = nullptr;  // to compare with; may be gone
   std::string lastPressed_;                 // where a range begins
   bool extends_ = false;                    // the press that is under way has Shift
+  double pressX_ = 0;                       // where it began
+  double pressY_ = 0;
   int errorNumber_ = 0;
   FolderChanges pending_;
   bool updating_ = false;

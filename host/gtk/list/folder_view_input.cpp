@@ -2,12 +2,15 @@
 // Keys and gestures of FolderView.
 
 #include <array>
+#include <cmath>
 
 #include "host/gtk/list/folder_view.h"
 #include "host/support/texts.h"
 
 namespace vaelo {
 namespace {
+
+constexpr double WandersAfter = 24;  // pixels; half a row
 
 FolderItem* itemOfRow(GtkWidget* row) {
   GObject* item = row ? folderRowItem(row) : nullptr;
@@ -84,9 +87,18 @@ void FolderView::connectContextGestures() {
   const auto note = [](GtkGesture* gesture, int, double x, double y, FolderView* self) {
     const GdkModifierType held = gtk_event_controller_get_current_event_state(GTK_EVENT_CONTROLLER(gesture));
     self->extends_ = held & GDK_SHIFT_MASK;
+    self->pressX_ = x;
+    self->pressY_ = y;
     self->swipe_->pressedAt(x, y);
   };
   g_signal_connect(any, "pressed", G_CALLBACK(+note), this);
+  // Who presses a row and lets go elsewhere, or swipes along it, means no tap. The row itself would take it for one.
+  const auto letGo = [](GtkGesture* gesture, int, double x, double y, FolderView* self) {
+    if (std::hypot(x - self->pressX_, y - self->pressY_) > WandersAfter) {
+      gtk_gesture_set_state(gesture, GTK_EVENT_SEQUENCE_CLAIMED);
+    }
+  };
+  g_signal_connect(any, "released", G_CALLBACK(+letGo), this);
   gtk_widget_add_controller(scroller_, GTK_EVENT_CONTROLLER(any));
 
   GtkGesture* click = gtk_gesture_click_new();
