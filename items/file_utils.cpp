@@ -156,7 +156,8 @@ void FileUtils::logFileAttributes(const std::string& path) {
   }
   const Date now = Platform::current().queues.now();
   const auto age = [&](const std::optional<Date>& date) {
-    return date ? std::chrono::duration<double>(now - *date).count() : 0.0;
+    using Seconds = std::chrono::duration<double>;  // what lies between two dates may be longer than the clock counts
+    return date ? (Seconds(now.time_since_epoch()) - Seconds(date->time_since_epoch())).count() : 0.0;
   };
   VLO_DEBUG("Date Created: %@ (%lf seconds ago)", attributes.value->creationDate, age(attributes.value->creationDate));
   VLO_DEBUG("Date Modified: %@ (%lf seconds ago)", attributes.value->modificationDate,

@@ -105,14 +105,12 @@ class LocalResourceValues::Reader {
     if (S_ISDIR(info_.stx_mode)) return {};
     return Value(static_cast<std::uint64_t>(info_.stx_size));
   }
+  static Value valueOf(const std::optional<Date>& date) { return date ? Value(*date) : Value(); }
   Value creationDate() const {
-    if (promise_) return promise_->created ? Value(*promise_->created) : Value();
-    return info_.stx_mask & STATX_BTIME ? Value(dateOf(info_.stx_btime)) : Value();
+    if (promise_) return valueOf(promise_->created);
+    return info_.stx_mask & STATX_BTIME ? valueOf(dateOf(info_.stx_btime)) : Value();
   }
-  Value modificationDate() const {
-    if (promise_) return promise_->modified ? Value(*promise_->modified) : Value();
-    return dateOf(info_.stx_mtime);
-  }
+  Value modificationDate() const { return valueOf(promise_ ? promise_->modified : dateOf(info_.stx_mtime)); }
   const std::optional<std::string>& role() {
     if (!roleRead_) {
       roleRead_ = true;

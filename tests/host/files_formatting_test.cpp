@@ -49,8 +49,12 @@ TEST_F(FilesFormattingTest, DatesAreInTheUsersLanguage) {
   EXPECT_NE(formatting.localizedDate(date, DateStyle::Long, DateStyle::Short).find("February 13, 2009 at"),
             std::string::npos);
   EXPECT_EQ(formatting.localizedDate(date, DateStyle::None, DateStyle::None), "");
-  EXPECT_FALSE(
-      formatting.localizedDate(Date(std::chrono::hours(-24 * 365 * 100)), DateStyle::Long, DateStyle::Short).empty());
+  const Date landing(std::chrono::seconds(-14'212'800));
+  const Date distant(std::chrono::seconds(5'685'422'400));
+  EXPECT_EQ(formatting.localizedDate(landing, DateStyle::Long, DateStyle::None), "July 20, 1969");
+  EXPECT_EQ(formatting.localizedDate(distant, DateStyle::Long, DateStyle::None), "March 1, 2150");
+  EXPECT_EQ(formatting.localizedDate(Date::max(), DateStyle::Medium, DateStyle::None), "Apr 11, 2262");
+  EXPECT_EQ(formatting.localizedDate(Date::min(), DateStyle::Medium, DateStyle::None), "Sep 21, 1677");
 }
 
 TEST_F(FilesFormattingTest, CountsAreWordsWithThePluralForm) {

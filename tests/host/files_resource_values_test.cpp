@@ -1,6 +1,10 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
+#include <fcntl.h>
+#include <sys/stat.h>
+
 #include "host/drive/promise_file.h"
 #include "host/files/g_types.h"
+#include "host/files/local_file_manager.h"
 #include "host/files/local_resource_values.h"
 #include "tests/host/drive_test_support.h"
 
@@ -127,6 +131,26 @@ TEST_F(FilesResourceValuesTest, APromisedPackageIsOne) {
   EXPECT_TRUE(values.at(ResourceKey::IsPackage).boolValue());
   EXPECT_TRUE(values.at(ResourceKey::IsDirectory).boolValue());
   EXPECT_FALSE(values.at(ResourceKey::IsRegularFile).boolValue());
+}
+
+TEST_F(FilesResourceValuesTest, DatesAreThoseThatTheClockCanTell) {
+  const std::string path = drive + "/Old.txt";
+  write(path);
+  LocalFileManager files;
+  const auto modifiedIn = [&](std::time_t seconds) {
+    const timespec times[] = {{seconds, 500'000'000}, {seconds, 500'000'000}};
+    EXPECT_EQ(::utimensat(AT_FDCWD, path.c_str(), times, 0), 0);
+    const ResourceMap values = valuesOf(path);
+    const auto found = values.find(ResourceKey::ContentModificationDate);
+    const Date* date = found == values.end() ? nullptr : found->second.get<Date>();
+    const std::optional<Date> told = date ? std::optional(*date) : std::nullopt;
+    EXPECT_EQ(files.attributesOfItemAtPath(path).value->modificationDate, told);
+    return told;
+  };
+  constexpr auto half = std::chrono::milliseconds(500);
+  EXPECT_EQ(modifiedIn(-14'212'800), Date(std::chrono::seconds(-14'212'800) + half)) << "in 1969";
+  EXPECT_EQ(modifiedIn(5'685'422'400), Date(std::chrono::seconds(5'685'422'400) + half)) << "in 2150";
+  EXPECT_EQ(modifiedIn(10'413'792'000), std::nullopt) << "in 2300";
 }
 
 TEST_F(FilesResourceValuesTest, Failures) {

@@ -156,6 +156,11 @@ TEST_F(FileOperationsTest, AttributesAreLoggedWithTheirAge) {
   EXPECT_TRUE(platform.log.has("DEBUG", "Date Created: 1000.000000 (4000.000000 seconds ago)"));
   EXPECT_TRUE(platform.log.has("DEBUG", "Date Modified: 1000.000000 (4000.000000 seconds ago)"));
   EXPECT_TRUE(platform.log.has("DEBUG", "Size: 7 bytes"));
+  // 5,000 s and the 2^63 ns from the clock's beginning to 1970, which is more than it counts.
+  platform.disk.items.at(DrivePath + "/a").attributes.modificationDate = Date::min();
+  FileUtils::logFileAttributes(DrivePath + "/a");
+  EXPECT_TRUE(
+      platform.log.has("DEBUG", "Date Modified: " + Value(Date::min()).description() + " (9223377036.854776 seconds ago)"));
   FileUtils::logFileAttributes("/gone");
   EXPECT_EQ(platform.log.lines().back().find("(VLO)[ERROR]"), 0u);
   EXPECT_NE(platform.log.lines().back().find("Cannot get attributes of /gone: "), std::string::npos);
