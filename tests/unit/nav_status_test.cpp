@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include <gmock/gmock.h>
 
+#include <set>
+
 #include "tests/unit/app_fixture.h"
 
 namespace vaelo {
@@ -180,6 +182,48 @@ TEST_F(NavStatusTest, TheLineAndItsOfferFollowInEditModeToo) {
   nav->updateStatusUI(topList());
   EXPECT_EQ(statusText(), "items: 1");
   EXPECT_EQ(bar->labelsView()->quotaButton()->offer(), nullptr);
+}
+
+/// Notes each view that changed.
+struct ChangedViews : ViewObserver {
+  void viewChanged(View& view, ViewChange) override { changed.insert(&view); }
+  void animationWillBegin(View&, const Animation&) override {}
+  void animationDidEnd(View&) override {}
+  void viewWillBeDestroyed(View&) override {}
+  void watch(const ViewRef& view) {
+    watched.push_back(view);
+    view->setObserver(this);
+    for (const ViewRef& subview : view->subviews()) watch(subview);
+  }
+  ~ChangedViews() override {
+    for (const ViewRef& view : watched) view->setObserver(nullptr);
+  }
+  std::vector<ViewRef> watched;
+  std::set<const View*> changed;
+};
+
+TEST_F(NavStatusTest, AValueTouchesOnlyTheStatusBar) {
+  loadNav();
+  nav->pushViewController(makeList(addFolder("Plans")), false);
+  topList()->itemsLoaded({addFile("a.txt")});
+  runAllQueues();
+  const DriveStatusLabelView& line = *statusBarOf(*topList())->labelsView();
+  ChangedViews views;
+  views.watch(nav->view());
+  for (const ViewControllerRef& screen : nav->viewControllers()) {
+    views.watch(screen->view());
+    views.watch(statusBarOf(*std::dynamic_pointer_cast<DocumentListController>(screen))->labelsView());
+  }
+  int others = 0;
+  const auto count = [&others](auto&&...) { ++others; };
+  const auto listToken = topList()->listChanged().connect(count);
+  const auto barToken = topList()->navigationItem().changed().connect(count);
+  const auto screenToken = topList()->changed().connect(count);
+  nav->quotaFetcherDidUpdateValue(*nav->quotaFetcher(), 7 * 1024);
+  ASSERT_TRUE(views.changed.erase(line.primaryLabel().get()));
+  views.changed.erase(&line);
+  EXPECT_TRUE(views.changed.empty()) << views.changed.size() << " more, of " << views.watched.size();
+  EXPECT_EQ(others, 0);
 }
 
 }  // namespace
