@@ -12,6 +12,7 @@ def content(folder):
 
 class ItemsWindow(unittest.TestCase):
     size = (800, 640)
+    screen = (1280, 800)
 
     def prepare(self, app):
         """For what a test puts into the drive beforehand."""
@@ -25,7 +26,7 @@ class ItemsWindow(unittest.TestCase):
             for name in ("Report.txt", "Second.txt", "Third.txt"):
                 (app.drive / name).write_text(name)
             self.prepare(app)
-        self.app = App(size=self.size, prepare=prepare)
+        self.app = App(size=self.size, prepare=prepare, screen=self.screen)
         self.addCleanup(self.app.close)
         self.app.wait("Report.txt", "list item")
         self.drive = self.app.drive

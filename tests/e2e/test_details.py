@@ -1,10 +1,15 @@
 # SPDX-License-Identifier: GPL-3.0-or-later
 """The details of a document: its facts side by side or below its picture, its name changed in place, its tags."""
 import os
+import subprocess
 import unittest
+
+from gi.repository import GdkPixbuf
 
 from harness import wait_for
 from items_window import ItemsWindow
+from test_bad_changes import mounted
+from test_share_sheet import install_application
 
 
 class Details(ItemsWindow):
@@ -13,6 +18,9 @@ class Details(ItemsWindow):
 
     def setUp(self):
         super().setUp()
+        self.open()
+
+    def open(self):
         self.menu("Report.txt", "i")
         self.app.wait_log("Using PreviewDetailsViewController")
         self.app.wait("Kind", "label")
@@ -58,6 +66,40 @@ class Wide(Details):
         picture = self.row("Thumbnail", "image")
         facts = self.row("Kind", "label")
         self.assertGreater(facts[2], picture[2] + picture[4])
+
+
+class Sizes(ItemsWindow):
+    """Phones and tablets, both upright and across."""
+    screen = (1280, 1280)
+
+    def prepare(self, app):
+        install_application(app, "org.example.Writer", "Writer", "text/plain;")
+        (app.base / "data" / "applications" / "mimeapps.list").write_text(
+            "[Default Applications]\ntext/plain=org.example.Writer.desktop\n")
+
+    def test_each_has_its_layout_and_its_place_for_the_button(self):
+        app = self.app
+        for width, height, across, below in ((360, 720, False, False), (720, 400, True, False), (800, 1280, False, True),
+                                             (1280, 800, True, True)):
+            with self.subTest(f"{width} x {height}"):
+                app.resize(width, height)
+                edges = 20  # and the shadow
+                wait_for("the window", lambda: all(0 <= asked - is_now <= edges for asked, is_now in
+                                                   zip((width, height), app.find("Vaelo Drive", "frame")[4:6])))
+                self.menu("Report.txt", "i")
+                facts = app.wait("Modified", "label")
+                picture = app.wait("Thumbnail", "image")
+                button = app.wait("Open in “Writer”")
+                if across:
+                    self.assertGreater(facts[2], picture[2] + picture[4], "beside the picture")
+                else:
+                    self.assertGreater(facts[3], picture[3] + picture[5], "below the picture")
+                if below:
+                    self.assertGreater(button[3], facts[3] + facts[5], "below the facts")
+                else:
+                    self.assertLess(button[3] + button[5], 60, "in the bar")
+                app.key("Escape")
+                app.wait_gone("Modified")
 
 
 class Renaming(Details):
@@ -111,7 +153,50 @@ class Renaming(Details):
         self.assertEqual((self.drive / "Second.txt").read_text(), "Second.txt")
 
 
+    def test_a_disk_that_refuses_is_told(self):
+        mounted(self, self.drive, "--bind", str(self.drive))
+        subprocess.run(["mount", "-o", "remount,bind,ro", str(self.drive)], check=True)
+        self.edit()
+        self.app.type("ed")
+        self.app.key("Return")
+        self.app.wait("“Report.txt” is on a disk that can only be read.")
+        self.app.key("Return")
+        self.app.wait_gone("OK")
+        self.app.click("Cancel", "push button")
+        self.ended()
+        self.on_disk("Report.txt")
+
+    def test_a_document_that_goes_meanwhile_is_told_or_takes_the_screen_with_it(self):
+        self.edit()
+        self.app.type("ed")
+        (self.drive / "Report.txt").unlink()
+        self.app.wait("Second.txt", "list item")
+        self.app.wait_gone("Kind")
+        self.on_disk("Reported.txt", False)
+        self.assertIsNone(self.app.find("OK", "push button"))
+
+
 class TagsOfTheDetails(Details):
+    def prepare(self, app):
+        super().prepare(app)
+        values = app.data / "mirror" / ".vaelo" / "values"
+        values.parent.mkdir()
+        values.write_text("{'RoverTagDict': <{'RoverTagDictVersion': <uint64 2>, 'RoverTags': "
+                          "<[{'n': <'Work'>, 'l': <uint64 6>}]>}>}")
+
+    def test_the_dot_before_a_tag_has_its_colour(self):
+        row = self.app.wait("Work", "label")
+        picture = GdkPixbuf.Pixbuf.new_from_file(str(self.app.screenshot()))
+        frame = self.app.find("Vaelo Drive", "frame")
+        left, top = (picture.get_width() - frame[4]) // 2, (picture.get_height() - frame[5]) // 2
+        pixels, stride, channels = picture.get_pixels(), picture.get_rowstride(), picture.get_n_channels()
+
+        def colour(x, y):
+            at = (top + y) * stride + (left + x) * channels
+            return tuple(pixels[at:at + 3])
+        before = [colour(x, row[3] + row[5] // 2) for x in range(row[2] - 15, row[2])]
+        self.assertTrue([c for c in before if c[0] > 180 and c[1] < 80 and c[2] < 80], f"red in {before}")
+
     def test_a_press_on_the_row_of_tags_shows_their_menu(self):
         self.app.click("Work", "label")
         self.app.wait("New tag")
