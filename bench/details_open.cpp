@@ -77,6 +77,11 @@ struct World {
   void showNothing() {
     gtk_window_set_child(GTK_WINDOW(window), gtk_label_new("Nothing"));
     paint();
+    // A tap comes when the window is at rest: soon after a frame the next one would have to wait for its time.
+    const double rested = now() + 50;
+    while (now() < rested) {
+      if (!g_main_context_iteration(nullptr, FALSE)) g_usleep(1000);
+    }
   }
 
   double details() {

@@ -8,6 +8,8 @@
 #include <condition_variable>
 #include <filesystem>
 #include <fstream>
+#include <future>
+#include <vector>
 
 #include "host/files/glib_queues.h"
 #include "host/gtk/pango_graphics.h"
@@ -96,6 +98,45 @@ TEST_F(DocumentThumbnailsTest, ALargeOneHasItsSizeAtOnceAndIsDrawnOnceDecoded) {
   EXPECT_TRUE(isDrawn(image));
   EXPECT_TRUE(isDrawn(image)) << "again";
   EXPECT_TRUE(told.empty());
+}
+
+/// What is drawn in a place so wide, in points.
+GRef<GdkTexture> textureDrawn(GdkPaintable* picture, double width) {
+  GtkSnapshot* snapshot = gtk_snapshot_new();
+  gdk_paintable_snapshot(picture, snapshot, width, width / 2);
+  GskRenderNode* node = gtk_snapshot_free_to_node(snapshot);
+  EXPECT_EQ(gsk_render_node_get_node_type(node), GSK_TEXTURE_NODE);
+  GRef<GdkTexture> texture(GDK_TEXTURE(g_object_ref(gsk_texture_node_get_texture(node))));
+  gsk_render_node_unref(node);
+  return texture;
+}
+
+TEST_F(DocumentThumbnailsTest, ALargePictureComesInTheSizeInWhichItIsDrawn) {
+  constexpr int width = 64;
+  constexpr int height = 32;
+  // Columns of white and opaque black, by turns.
+  std::vector<guint32> columns(std::size_t{width} * height);
+  for (std::size_t i = 0; i < columns.size(); ++i) columns[i] = i % 2 ? 0xFF000000U : 0xFFFFFFFFU;
+  GBytes* bytes = g_bytes_new(columns.data(), columns.size() * sizeof(guint32));
+  std::promise<GRef<GdkTexture>> decoded;
+  decoded.set_value(
+      GRef<GdkTexture>(gdk_memory_texture_new(width, height, GDK_MEMORY_DEFAULT, bytes, width * sizeof(guint32))));
+  g_bytes_unref(bytes);
+  const GRef<GdkPaintable> picture = makeLatePicture(width, height, decoded.get_future());
+  for (const int drawn : {100, 40, 32, 20, 16, 64, 7, 2}) {
+    const GRef<GdkTexture> texture = textureDrawn(picture.get(), drawn);
+    const int expected = std::min(drawn, width);
+    ASSERT_EQ(gdk_texture_get_width(texture.get()), expected);
+    ASSERT_EQ(gdk_texture_get_height(texture.get()), (expected + 1) / 2) << expected;
+    if (expected > width / 2) continue;
+    std::vector<guint32> pixels(static_cast<std::size_t>(expected) * static_cast<std::size_t>((expected + 1) / 2));
+    gdk_texture_download(texture.get(), reinterpret_cast<guchar*>(pixels.data()),
+                         static_cast<gsize>(expected) * sizeof(guint32));
+    for (const guint32 pixel : pixels) {
+      EXPECT_EQ(pixel >> 24, 0xFFU) << "at " << expected;
+      EXPECT_NEAR(static_cast<int>(pixel & 0xFF), 0x80, 1) << "the mean of black and white, at " << expected;
+    }
+  }
 }
 
 TEST_F(DocumentThumbnailsTest, ASmallOneIsDecodedAtOnce) {
