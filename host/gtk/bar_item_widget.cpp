@@ -2,8 +2,10 @@
 #include "host/gtk/bar_item_widget.h"
 
 #include <memory>
+#include <string_view>
 
 #include "host/gtk/framed_view.h"
+#include "host/gtk/pango_graphics.h"
 #include "host/support/texts.h"
 #include "platform/ui/button.h"
 
@@ -75,9 +77,11 @@ GtkWidget* makeBarItemWidget(const BarButtonItemRef& item, const char* icon) {
     const std::string& title = custom ? custom->title() : shown->title();
     if (look.icon) return;
     gtk_button_set_label(GTK_BUTTON(button), look.label ? look.label : title.c_str());
-    // Where large letters leave no room beside the other buttons.
+    // Where large letters leave no room beside the other buttons. A word of a script without spaces can be split anywhere,
+    // and a header bar takes the narrowest shape of what fits its height.
     GtkLabel* label = GTK_LABEL(gtk_button_get_child(GTK_BUTTON(button)));
-    gtk_label_set_wrap(label, TRUE);
+    gtk_label_set_wrap(label,
+                       textScale() > 1 || std::string_view(gtk_label_get_text(label)).find(' ') != std::string_view::npos);
     gtk_label_set_justify(label, GTK_JUSTIFY_CENTER);
   };
   show();

@@ -8,6 +8,7 @@
 #include "host/gtk/folder_picker.h"
 #include "host/gtk/host_dialog.h"
 #include "host/gtk/host_screen.h"
+#include "host/gtk/toast.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
 #include "platform/platform.h"
@@ -281,23 +282,6 @@ void GtkWindowHost::escape() {
   }
 }
 
-namespace {
-
-AdwToast* makeToast(const std::string& text) {
-  // A toast's own title is one line of markup: too short for a phone, and a name with "&" shows nothing.
-  GtkWidget* label = gtk_label_new(text.c_str());
-  gtk_label_set_wrap(GTK_LABEL(label), TRUE);
-  constexpr int phoneWidth = 32;  // characters beside the button that closes it
-  gtk_label_set_max_width_chars(GTK_LABEL(label), phoneWidth);
-  gtk_label_set_xalign(GTK_LABEL(label), 0);
-  gtk_widget_add_css_class(label, "heading");
-  AdwToast* toast = adw_toast_new("");
-  adw_toast_set_custom_title(toast, label);
-  return toast;
-}
-
-}  // namespace
-
 void GtkWindowHost::showToast(const std::string& text, bool stays) {
   AdwToast* toast = makeToast(text);
   if (stays) adw_toast_set_timeout(toast, 0);
@@ -307,10 +291,9 @@ void GtkWindowHost::showToast(const std::string& text, bool stays) {
 AdwToast* GtkWindowHost::showToast(const std::string& text, const char* button, std::function<void()> pressed,
                                    unsigned seconds) {
   using Pressed = std::function<void()>;
-  AdwToast* toast = makeToast(text);
+  AdwToast* toast = makeToast(text, button);
   adw_toast_set_timeout(toast, seconds);
   adw_toast_set_priority(toast, ADW_TOAST_PRIORITY_HIGH);
-  adw_toast_set_button_label(toast, button);
   g_signal_connect_data(
       toast, "button-clicked", G_CALLBACK(+[](AdwToast*, gpointer held) { (*static_cast<Pressed*>(held))(); }),
       new Pressed(std::move(pressed)), [](gpointer held, GClosure*) { delete static_cast<Pressed*>(held); },

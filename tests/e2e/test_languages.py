@@ -12,8 +12,10 @@ from harness import PROGRAM, App, wait_for
 
 
 class Languages(unittest.TestCase):
-    def open(self, size=(800, 640), **environment):
+    def open(self, size=(800, 640), letters=1, **environment):
         def prepare(app):
+            if letters != 1:
+                app.desktop.tool("xprop", "-root", "-f", "RESOURCE_MANAGER", "8s", "-set", "RESOURCE_MANAGER", f"Xft.dpi:\t{letters * 96:.0f}\n")
             app.drive.mkdir(parents=True)
             (app.data / "account.ini").write_text("[Account]\nName=x\nToken=ab\nSignedIn=true\n")
             (app.drive / "Plans").mkdir()
@@ -114,6 +116,32 @@ class Languages(unittest.TestCase):
                 app.resize(800, 640)
                 wait_for("the wide window", lambda: app.find("Vaelo Drive", "frame")[4] > 700)
                 self.assertEqual(narrow, width(app), "cut where it is narrow")
+
+    def test_a_message_on_a_phone_keeps_its_buttons_in_every_language(self):
+        for language, letter, rename, undo, letters in (("en", "r", "Rename Item", "Undo", 1), ("en", "r", "Rename Item", "Undo", 1.5),
+                                                        ("de", "u", "Objekt umbenennen", "Rückgängig", 1),
+                                                        ("ja", "r", "アイテムの名前を変更", "元に戻す", 1)):
+            with self.subTest(language, letters=letters):
+                app = self.open(size=(360, 720), letters=letters, LANGUAGE=language)
+                self.menu_of("Report.txt")
+                wait_for("the menu", lambda: any(row[0] == "menu item" for row in app.accessibility.showing()))
+                app.key(letter)
+                app.wait(rename)
+                app.type(" of our Donaudampfschifffahrtsgesellschaftskapitaenswitwen")
+                app.key("Return")
+
+                def close():
+                    rows = [row for row in app.accessibility.showing() if row[0] == "push button" and row[3] > 360]
+                    return rows[1] if len(rows) == 2 and rows[0][1].startswith(undo) else None
+                row = wait_for("what closes the message", close)
+                width = app.find("Vaelo Drive", "frame")[4]
+                self.assertLessEqual(width, 360)
+                self.assertLessEqual(row[2] + row[4], width - 12)
+
+    def test_a_word_of_a_script_without_spaces_is_not_split_where_it_has_room(self):
+        app = self.open(size=(360, 720), LANGUAGE="ja")
+        app.click("選択", "push button")
+        self.assertLess(app.wait("キャンセル", "push button")[5], 30)
 
     def test_the_first_language_of_several_that_is_there(self):
         app = self.open(LANGUAGE="he:en_GB:de")

@@ -3,6 +3,7 @@
 
 #include <adwaita.h>
 
+#include "host/gtk/toast.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
 
@@ -26,16 +27,8 @@ struct WindowNotice::Window {
     g_application_send_notification(application, nullptr, notification.get());
   }
 
-  // A toast's own title is one line of markup: too short for a phone, and a name with "&" shows nothing.
   static void toast(GObject* overlay, const std::string& sentence) {
-    GtkWidget* label = gtk_label_new(sentence.c_str());
-    gtk_label_set_wrap(GTK_LABEL(label), TRUE);
-    constexpr int phoneWidth = 32;  // characters beside the button that closes it
-    gtk_label_set_max_width_chars(GTK_LABEL(label), phoneWidth);
-    gtk_label_set_xalign(GTK_LABEL(label), 0);
-    gtk_widget_add_css_class(label, "heading");
-    AdwToast* shown = adw_toast_new("");
-    adw_toast_set_custom_title(shown, label);
+    AdwToast* shown = makeToast(sentence);
     adw_toast_set_timeout(shown, 0);
     adw_toast_overlay_add_toast(ADW_TOAST_OVERLAY(overlay), shown);
   }
