@@ -92,9 +92,10 @@ void FolderView::connectContextGestures() {
     self->swipe_->pressedAt(x, y);
   };
   g_signal_connect(any, "pressed", G_CALLBACK(+note), this);
-  // Who presses a row and lets go elsewhere, or swipes along it, means no tap. The row itself would take it for one.
+  // Who presses a row and lets go elsewhere, or swipes along it, means no tap. The row itself would take it for one. While
+  // items are selected, who drags over rows selects them, which the list sees to.
   const auto letGo = [](GtkGesture* gesture, int, double x, double y, FolderView* self) {
-    if (std::hypot(x - self->pressX_, y - self->pressY_) > WandersAfter) {
+    if (!self->context_.editing && std::hypot(x - self->pressX_, y - self->pressY_) > WandersAfter) {
       gtk_gesture_set_state(gesture, GTK_EVENT_SEQUENCE_CLAIMED);
     }
   };
