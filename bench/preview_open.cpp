@@ -97,6 +97,7 @@ int main(int argc, char** argv) {
       PreviewWindow::run(300);  // a process that ends takes its time
       window->showOther(gtk_label_new("Nothing"));
       window->paint();
+      PreviewWindow::rest();
       const double begun = vaelo::bench::now();
       GtkWidget* widget = sample.bare(sample.path);
       const double decoded = vaelo::bench::now() - begun;

@@ -8,6 +8,7 @@
 
 #include <algorithm>
 #include <fstream>
+#include <functional>
 #include <memory>
 #include <string>
 #include <vector>
@@ -55,11 +56,11 @@ class PreviewWindow : public PreviewControllerDataSource, public std::enable_sha
 
   /// From the tap on: until the first screen of the document is painted, in milliseconds.
   double show(const std::string& path) {
+    rest();
     const double begun = now();
     items_ = {URL(path)};
     controller_->reloadData();
-    while (!isShown()) g_main_context_iteration(nullptr, TRUE);
-    paint();
+    untilPainted([this] { return isShown(); });
     return now() - begun;
   }
   void showNothing() {
@@ -69,14 +70,11 @@ class PreviewWindow : public PreviewControllerDataSource, public std::enable_sha
   }
   /// Until what was asked for by now is painted.
   void paint() {
-    bool painted = false;
-    GdkFrameClock* clock = gtk_widget_get_frame_clock(window_);
-    const gulong handler =
-        g_signal_connect(clock, "after-paint", G_CALLBACK(+[](GdkFrameClock*, bool* flag) { *flag = true; }), &painted);
     gtk_widget_queue_draw(window_);
-    while (!painted) g_main_context_iteration(nullptr, TRUE);
-    g_signal_handler_disconnect(clock, handler);
+    untilPainted([] { return true; });
   }
+  /// A tap comes when the window is at rest: soon after a frame the next one would have to wait for its time.
+  static void rest() { run(50); }
   static void run(double milliseconds) {
     const double end = now() + milliseconds;
     const guint waking = g_timeout_add(
@@ -108,6 +106,19 @@ class PreviewWindow : public PreviewControllerDataSource, public std::enable_sha
     platform_.install(application_, screens_);
     gtk_window_set_default_size(GTK_WINDOW(window_), Width, Height);
     gtk_window_present(GTK_WINDOW(window_));
+  }
+
+  /// Until a frame is painted of which that is true.
+  void untilPainted(const std::function<bool()>& isMeant) {
+    struct Wait {
+      const std::function<bool()>& isMeant;
+      bool isOver;
+    } wait{isMeant, false};
+    GdkFrameClock* clock = gtk_widget_get_frame_clock(window_);
+    const gulong handler = g_signal_connect(
+        clock, "after-paint", G_CALLBACK(+[](GdkFrameClock*, Wait* self) { self->isOver = self->isMeant(); }), &wait);
+    while (!wait.isOver) g_main_context_iteration(nullptr, TRUE);
+    g_signal_handler_disconnect(clock, handler);
   }
 
   // Of the page's own places each has a name.
