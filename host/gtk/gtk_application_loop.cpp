@@ -127,6 +127,7 @@ int GtkApplicationLoop::run(int argc, char** argv, std::function<std::shared_ptr
   const char* quitKeys[] = {"<Control>q", nullptr};
   gtk_application_set_accels_for_action(GTK_APPLICATION(application_), "app.quit", quitKeys);
   const int status = g_application_run(G_APPLICATION(application_), argc, argv);
+  focus_.reset();
   PortableDocumentMarks::finishAll();
   if (delegate_) {
     saveState();
@@ -197,9 +198,8 @@ void GtkApplicationLoop::launch(const LaunchOptions& options) {
   delegate_->applicationDidFinishLaunchingWithOptions(options);
   const auto window = screens_.window();
   if (!window) return;
-  g_signal_connect_swapped(window->widget(), "notify::is-active",
-                           G_CALLBACK(+[](GtkApplicationLoop* self) { self->windowFocusChanged(); }), this);
   offerToContinue();
+  focus_.emplace([this](bool focused) { focusChanged(focused); });
   tellOfDamage();
   rebuiltToken_ = notifications_.addObserver(DocumentIndexRebuiltNotification, [this](const Notification&) {
     if (const auto shown = screens_.window()) {
@@ -273,12 +273,8 @@ bool GtkApplicationLoop::openLink(const std::string& link) {
   return false;
 }
 
-void GtkApplicationLoop::windowFocusChanged() {
-  const auto window = screens_.window();
-  const bool active = window && gtk_window_is_active(window->widget());
-  if (active == active_) return;
-  active_ = active;
-  if (active) {
+void GtkApplicationLoop::focusChanged(bool focused) {
+  if (focused) {
     notifications_.post({DidBecomeActiveNotification, {}});
     continueOffer_->lookAgain();
   } else {

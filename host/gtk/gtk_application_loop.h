@@ -5,10 +5,12 @@
 
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 
 #include "host/desktop/restoration_store.h"
 #include "host/desktop/search_provider.h"
+#include "host/gtk/window_focus.h"
 #include "platform/application.h"
 #include "platform/notifications.h"
 
@@ -19,7 +21,7 @@ class DriveUserActivities;
 class GtkScreens;
 
 /// The application loop on GApplication: one instance a session, which links, shortcuts, searches of the shell and other
-/// devices' activities reach over D-Bus, also before it runs; and the window's focus told as active and inactive. Main
+/// devices' activities reach over D-Bus, also before it runs; and the windows' focus told as active and inactive. Main
 /// thread.
 class GtkApplicationLoop : public Application {
  public:
@@ -45,7 +47,7 @@ class GtkApplicationLoop : public Application {
   bool openLink(const std::string& link);
   void offerToContinue();
   void continueActivity(const std::shared_ptr<UserActivity>& activity);
-  void windowFocusChanged();
+  void focusChanged(bool focused);
   void restore();
   void saveState();
   void showAbout();
@@ -63,7 +65,7 @@ class GtkApplicationLoop : public Application {
   std::shared_ptr<ApplicationDelegate> delegate_;
   std::shared_ptr<void> rebuiltToken_;
   std::shared_ptr<ContinueOffer> continueOffer_;
-  bool active_ = false;
+  std::optional<WindowFocus> focus_;
 };
 
 }  // namespace vaelo

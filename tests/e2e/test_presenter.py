@@ -108,6 +108,18 @@ class Shown(unittest.TestCase):
         self.assertTrue(self.app.running())
         self.show("Letter.txt")
 
+    def test_its_own_menus_and_dialogs_leave_the_application_in_front(self):
+        self.app.click("Main Menu")
+        self.app.wait("Accounts…", "menu item")
+        self.app.key("c")
+        self.app.wait("On This Device")
+        self.letter.write_text("Changed behind a dialog.\n")
+        self.app.wait_log("presentedItemDidChange: ")
+        self.app.key("Escape")
+        self.app.wait_gone("On This Device")
+        self.wait_words("Changed behind a dialog.")
+        self.assertNotIn("Resigning active for ", self.app.log())
+
     def test_what_happened_behind_another_window_is_shown_on_return(self):
         self.app.desktop.start(["xmessage", "another window"], self.app.desktop.environment)
         self.app.wait_log("Resigning active for ")
