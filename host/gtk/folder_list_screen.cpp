@@ -121,13 +121,14 @@ void FolderListScreen::offerActions(const URL& url, const std::optional<std::str
                                     const GdkRectangle& at) {
   if (editing()) return;
   const bool selects = row && navigationItem().rightBarButtonItem();
-  showItemActionsMenu(over, at, availableActions(), selects, [self = sharedSelf(this), url, row, over, at](int action) {
+  const auto chosen = [self = sharedSelf(this), url, row, over, at](int action) {
     if (action == TagsEntry) return showTagsPopover(over, at, url, self->tags_);
     if (action == SelectEntry) return self->beginSelecting(*row);
     // What is opened is what a peek has prepared; what can't be peeked at, as a link, is opened as by a tap.
     if (action == ItemAction::FirmpressPop && !self->viewControllerForPreviewing(url)) return self->userSelectedItem(url);
     self->perform(action, url, over, at);
-  });
+  };
+  showItemActionsMenu(over, at, url.path(), availableActions(), selects, chosen);
 }
 
 void FolderListScreen::perform(int action, const URL& url, GtkWidget* over, const GdkRectangle& at) {

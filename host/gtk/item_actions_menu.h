@@ -4,6 +4,7 @@
 #include <gtk/gtk.h>
 
 #include <functional>
+#include <string>
 
 namespace vaelo {
 
@@ -12,10 +13,11 @@ namespace vaelo {
 inline constexpr int TagsEntry = 1000;
 inline constexpr int SelectEntry = 1001;
 
-/// Offers the actions of one item in a menu that points at `at`, in the coordinates of `over`. `available` has bit n for the
-/// code n of ItemAction; the tags are always offered, to select when `selects` says so. `chosen` gets the code, once, after
-/// the menu closed; nothing when the user changes their mind. Main thread.
-void showItemActionsMenu(GtkWidget* over, const GdkRectangle& at, unsigned available, bool selects,
+/// Offers the actions of the item at `path` in a menu that points at `at`, in the coordinates of `over`. `available` has bit
+/// n for the code n of ItemAction; the tags are always offered, to select when `selects` says so. What can be popped is
+/// peeked at on top of the menu where the window is high enough, and pops when that is pressed. `chosen` gets the code,
+/// once, after the menu closed; nothing when the user changes their mind. Main thread.
+void showItemActionsMenu(GtkWidget* over, const GdkRectangle& at, const std::string& path, unsigned available, bool selects,
                          std::function<void(int)> chosen);
 
 }  // namespace vaelo

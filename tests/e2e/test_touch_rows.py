@@ -119,6 +119,51 @@ class SwipesFromTheRight(Rows):
         self.assertEqual(len(rows), 3)
 
 
+class Peeks(Rows):
+    """The menu of a long press, with a look at the item on top."""
+
+    def hold_and_see(self, item, text):
+        x, y = self.app.place(self.app.wait(item, "list item"))
+        self.hold(item)
+        self.app.wait(text, "label")
+        return x + 60, y + 60
+
+    def test_a_document_shows_how_it_begins_and_a_tap_on_that_opens_it(self):
+        app = self.app
+        (self.drive / "Note 2.txt").write_text("The first line\nThe second\n" + "and on\n" * 50)
+        place = self.hold_and_see("Note 2.txt", "The first line The second and on")
+        self.assertNotIn("Firmpress", app.log(), "the finger that was lifted opened nothing")
+        self.screen.tap(*place)
+        app.wait_log("================= DLC Action Firmpress Pop")
+        app.wait_gone("The first line The second")
+        self.assertIn("================= DLC Action Firmpress Peek", app.log())
+
+    def test_a_folder_shows_its_first_names_and_a_tap_on_them_opens_it(self):
+        for name in ("b", "a", ".hidden"):
+            (self.drive / "Plans" / name).write_text(name)
+        place = self.hold_and_see("Plans", "a b")
+        self.screen.tap(*place)
+        self.app.wait_title("Plans")
+        self.app.wait("a,", "list item")
+
+    def test_its_rows_are_large_enough_for_a_finger(self):
+        app = self.app
+        self.hold("Note 1.txt")
+        self.assertTrue(app.wait("Note 1.txt", "push button"))
+        app.wait("Delete…", "menu item")
+        rows = [row for row in app.accessibility.showing() if row[0] == "menu item"]
+        self.assertEqual(len(rows), 8)
+        for row in rows:
+            self.assertGreaterEqual(row[5], 44, row[1])
+
+    def test_a_low_window_has_room_for_the_menu_alone(self):
+        app = self.app
+        app.resize(640, 400)
+        self.hold("Note 1.txt")
+        app.wait("Delete…", "menu item")
+        self.assertIsNone(app.find("Note 1.txt", "push button"))
+
+
 class Selecting(Rows):
     def test_a_long_press_offers_to_begin_and_its_menu_stays(self):
         app = self.app
