@@ -55,10 +55,13 @@ class Desktop:
         self.environment["DBUS_SESSION_BUS_ADDRESS"] = bus[0]
         self.bus_pid = int(bus[1])
         self.start_window_manager()
+        # A window that comes while it is starting may stay unseen.
+        wait_for("the window manager", lambda: "window id" in self.tool("xprop", "-root", "_NET_SUPPORTING_WM_CHECK"))
 
     def start_display(self, width, height, framebuffer):
         reader, writer = os.pipe()
-        self.start(["Xvfb", "-displayfd", str(writer), "-screen", "0", f"{width}x{height}x24", "-nolisten", "tcp",
+        # It would begin anew when its last client leaves, and refuse who comes just then.
+        self.start(["Xvfb", "-displayfd", str(writer), "-screen", "0", f"{width}x{height}x24", "-nolisten", "tcp", "-noreset",
                     *(["-fbdir", str(self.scratch)] if framebuffer else [])], {}, (writer,))
         os.close(writer)
         with os.fdopen(reader) as display:
