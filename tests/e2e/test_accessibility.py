@@ -54,6 +54,21 @@ class LargeText(unittest.TestCase):
                                                              "menu item", "text") and len(row[1]) > 2]
                 self.assertEqual([row for row in told if row[4] < least.get(row[0], 20) or row[4] > width or row[2] < 0], [])
 
+    def test_the_way_out_of_marking_stays_in_sight_on_a_phone(self):
+        self.start((360, 720))
+        self.app.click("Pages.pdf", "list item")
+        last = [None]
+
+        def rests():
+            row, last[0] = last[0], self.app.find("Find and Markup")
+            return row and row == last[0]
+        wait_for("the button to rest", rests)
+        self.app.click("Find and Markup")
+        self.app.wait("Markup", "menu item")
+        self.app.key("m")
+        row = self.app.wait("Done", "push button")
+        self.assertLessEqual(row[2] + row[4], 360)
+
 
 class Reading(unittest.TestCase):
     """What a screen reader has to tell of a document."""

@@ -63,12 +63,16 @@ MarkupBar::MarkupBar(Events events)
   GtkWidget* done = gtk_button_new_with_label(_("Done"));
   setLabel(done, _("Done"), _("Leave Markup"));
   makeNarrow(done);
-  gtk_box_append(GTK_BOX(box), done);
-  // With large letters they take more than a phone's width.
+  gtk_widget_set_valign(done, GTK_ALIGN_CENTER);
+  gtk_widget_set_margin_end(done, 6);
+  // In a long language or large letters they take more than a phone's width. The way out stays in sight.
   GtkWidget* scrolled = gtk_scrolled_window_new();
   gtk_scrolled_window_set_policy(GTK_SCROLLED_WINDOW(scrolled), GTK_POLICY_AUTOMATIC, GTK_POLICY_NEVER);
   gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scrolled), box);
-  gtk_revealer_set_child(GTK_REVEALER(revealer_), scrolled);
+  gtk_widget_set_hexpand(scrolled, TRUE);
+  GtkWidget* bar = gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 0);
+  for (GtkWidget* part : {scrolled, done}) gtk_box_append(GTK_BOX(bar), part);
+  gtk_revealer_set_child(GTK_REVEALER(revealer_), bar);
   gtk_widget_set_visible(revealer_, FALSE);
 
   g_signal_connect_swapped(undo_, "clicked", G_CALLBACK(+[](MarkupBar* self) { self->events_.undo(); }), this);
