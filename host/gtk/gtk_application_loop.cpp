@@ -13,6 +13,7 @@
 #include "host/gtk/preview/portable_document_marks.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/message_catalogue.h"
+#include "host/support/own_folder.h"
 #include "host/support/texts.h"
 #include "items/url_additions.h"
 #include "platform/archive.h"
@@ -67,6 +68,9 @@ int GtkApplicationLoop::run(int argc, char** argv, std::function<std::shared_ptr
   // The toolkit goes by its own translations, which need not be installed.
   g_signal_connect(application_, "startup", G_CALLBACK(+[](GApplication*, gpointer) {
                      gtk_widget_set_default_direction(messagesAreRightToLeft() ? GTK_TEXT_DIR_RTL : GTK_TEXT_DIR_LTR);
+                     gtk_icon_theme_add_search_path(
+                         gtk_icon_theme_get_for_display(gdk_display_get_default()),
+                         ownFolder("icons", "share/icons", "hicolor/scalable/apps/com.marrow.VaeloDrive.svg").c_str());
                    }),
                    nullptr);
   g_signal_connect_swapped(application_, "startup", G_CALLBACK(+[](GtkApplicationLoop* self) { self->beginService(); }),

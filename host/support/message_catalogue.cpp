@@ -6,10 +6,9 @@
 #include <unicode/uloc.h>
 
 #include <clocale>
-#include <filesystem>
 #include <string_view>
 
-#include "host/support/glib_ptr.h"
+#include "host/support/own_folder.h"
 
 namespace vaelo {
 
@@ -17,17 +16,9 @@ namespace {
 
 constexpr const char* Domain = "vaelo-drive";
 
-// Below the folder of the application where it is built, one up for its tests; where it is installed, wherever that was
-// moved to.
 std::string catalogueFolder() {
-  const std::filesystem::path program =
-      std::filesystem::path(takeString(g_file_read_link("/proc/self/exe", nullptr))).parent_path();
-  const std::filesystem::path above = program.parent_path();
-  for (const std::filesystem::path& folder : {program / "locale", above / "locale", above / "share" / "locale"}) {
-    const std::filesystem::path english = folder / "en" / "LC_MESSAGES" / (std::string(Domain) + ".mo");
-    if (g_file_test(english.c_str(), G_FILE_TEST_IS_REGULAR)) return folder;
-  }
-  return VAELO_LOCALE_DIR;
+  const std::string own = ownFolder("locale", "share/locale", std::string("en/LC_MESSAGES/") + Domain + ".mo");
+  return own.empty() ? VAELO_LOCALE_DIR : own;
 }
 
 bool isSet(const char* variable) {

@@ -123,6 +123,23 @@ TEST_F(PreviewMediaTest, TheSliderSeeks) {
   EXPECT_TRUE(waitUntil([this] { return labelShows("1:02"); })) << labelsIn(view_->widget());
 }
 
+TEST_F(PreviewMediaTest, TimeRunsFromTheLeftInEveryLanguage) {
+  gtk_widget_set_default_direction(GTK_TEXT_DIR_RTL);
+  openMedia("sound.wav", "audio/x-wav", sound(2));
+  gtk_widget_set_default_direction(GTK_TEXT_DIR_LTR);
+  GtkWidget* play = button("Play");
+  ASSERT_TRUE(play);
+  GtkWidget* bar = gtk_widget_get_parent(play);
+  EXPECT_EQ(gtk_widget_get_direction(bar), GTK_TEXT_DIR_LTR);
+  int sliders = 0;
+  for (GtkWidget* child = gtk_widget_get_first_child(bar); child; child = gtk_widget_get_next_sibling(child)) {
+    if (!GTK_IS_SCALE(child)) continue;
+    ++sliders;
+    EXPECT_EQ(gtk_widget_get_direction(child), GTK_TEXT_DIR_LTR);
+  }
+  EXPECT_EQ(sliders, 1);
+}
+
 TEST_F(PreviewMediaTest, AFilmFillsTheScreenAndLeavesIt) {
   openMedia("a.avi", "video/x-msvideo", film(3));
   ASSERT_EQ(failure_, "");

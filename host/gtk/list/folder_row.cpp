@@ -194,8 +194,8 @@ void drawContent(GtkWidget* widget, GtkSnapshot* snapshot) {
     if (hasSecond) drawLayout(snapshot, row->second, 4, Margin + iconSize + 4 + nameHeight, width - 8, dim);
     if (context.editing) drawMark(snapshot, widget, checked, left(Margin, MarkSize), Margin, color);
     if (isPromised(item.kind)) {
-      drawSymbol(snapshot, widget, "weather-overcast-symbolic", left(width - Margin - CloudSize, CloudSize), Margin,
-                 CloudSize, dim);
+      drawSymbol(snapshot, widget, "vaelo-drive-not-downloaded-symbolic", left(width - Margin - CloudSize, CloudSize),
+                 Margin, CloudSize, dim);
     }
   } else {
     int start = Margin;
@@ -207,7 +207,7 @@ void drawContent(GtkWidget* widget, GtkSnapshot* snapshot) {
     start += iconSize + Gap;
     int end = Margin;
     if (isPromised(item.kind)) {
-      drawSymbol(snapshot, widget, "weather-overcast-symbolic", left(width - end - CloudSize, CloudSize),
+      drawSymbol(snapshot, widget, "vaelo-drive-not-downloaded-symbolic", left(width - end - CloudSize, CloudSize),
                  (height - CloudSize) / 2, CloudSize, dim);
       end += CloudSize + Gap;
     }

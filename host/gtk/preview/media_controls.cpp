@@ -59,6 +59,8 @@ MediaControls::MediaControls(GtkMediaStream* stream, bool isFullScreen, std::fun
       length_(makeTime(_("Duration"))),
       volume_(gtk_volume_button_new()) {
   gtk_widget_add_css_class(bar_, "toolbar");
+  // Time runs from the left in every language, as players have it.
+  for (GtkWidget* widget : {bar_, place_}) gtk_widget_set_direction(widget, GTK_TEXT_DIR_LTR);
   gtk_widget_set_hexpand(place_, TRUE);
   gtk_scale_set_draw_value(GTK_SCALE(place_), FALSE);
   gtk_range_set_increments(GTK_RANGE(place_), 5, 30);
