@@ -59,6 +59,14 @@ TEST_F(DetailsMeanwhileTest, OfADocumentThatIsGoneTheNewNameIsNotMade) {
   EXPECT_EQ(details->originalFilename(), "Report.pdf");
 }
 
+TEST_F(DetailsMeanwhileTest, WithoutAnItemTheEditingEndsAndNothingIsTold) {
+  type("Plan.pdf");
+  manager->setItemUpdatePreview(nullptr, false);
+  EXPECT_TRUE(field().resignFirstResponder());
+  EXPECT_EQ(presentedAlert(), nullptr);
+  EXPECT_TRUE(isThere(document));
+}
+
 // The screen goes, its field loses the keyboard, and nobody has asked for the new name.
 TEST_F(DetailsMeanwhileTest, AScreenThatGoesWithItsDocumentRenamesNothing) {
   type("Plan.pdf");
