@@ -184,18 +184,5 @@ TEST_F(PreviewDetailsLayoutTest, TheEmptySpaceBelowTheStackIsMeasuredInTheScroll
   EXPECT_EQ(details->scrollView()->contentInset().bottom, 240);
 }
 
-TEST_F(PreviewDetailsLayoutTest, WhatIsPresentedOverItHearsOfAnotherSizeToo) {
-  open();
-  struct Presented : ViewController {
-    void viewWillTransitionToSize(const Size& size, TransitionCoordinator&) override { sizes.push_back(size); }
-    std::vector<Size> sizes;
-  };
-  const auto presented = std::make_shared<Presented>();
-  details->presentViewController(presented, false);
-  TransitionCoordinator coordinator;
-  details->viewWillTransitionToSize({800, 400}, coordinator);
-  EXPECT_EQ(presented->sizes, (std::vector<Size>{{800, 400}}));
-}
-
 }  // namespace
 }  // namespace vaelo
