@@ -19,7 +19,7 @@ int widthInCharacters(const char* text) {
 // A toast gets the height of its widest shape. If that is wider than the window, what ends the toast is cut off.
 int widthBeside(const char* button) {
   constexpr double phoneWidth = 32;  // characters of the usual size, beside the button that closes it
-  constexpr double edges = 4;        // of another button
+  constexpr double edges = 6;        // of another button
   const double scale = std::max(textScale(), 1.0);
   if (!button) return static_cast<int>(phoneWidth / scale);
   return std::max(static_cast<int>((phoneWidth - edges) / scale) - widthInCharacters(button), 1);
