@@ -163,7 +163,7 @@ void FolderListScreen::fill() { view_->setFolder(presentedURL()->path()); }
 
 URL FolderListScreen::urlOf(const std::string& name) const { return presentedURL()->appendingPathComponent(name); }
 
-std::vector<std::string> FolderListScreen::searchedFolders() const { return {presentedURL()->path()}; }
+std::vector<FolderSearch::Folder> FolderListScreen::searchedFolders() const { return {{presentedURL()->path(), ""}}; }
 
 void FolderListScreen::reportItems() {
   reportedRevision_ = view_->model().revision();
@@ -251,6 +251,7 @@ void FolderListScreen::showSearch(const std::shared_ptr<SearchController>& searc
     searchEntry_ = gtk_search_entry_new();
     gtk_accessible_update_property(GTK_ACCESSIBLE(searchEntry_), GTK_ACCESSIBLE_PROPERTY_LABEL,
                                    _("Search below this folder"), -1);
+    g_object_set(searchEntry_, "placeholder-text", _("Search below this folder"), nullptr);
     GtkWidget* clamp = adw_clamp_new();
     gtk_widget_set_hexpand(clamp, TRUE);
     adw_clamp_set_child(ADW_CLAMP(clamp), searchEntry_);
@@ -258,7 +259,7 @@ void FolderListScreen::showSearch(const std::shared_ptr<SearchController>& searc
     gtk_box_prepend(GTK_BOX(content_), searchBar_);
     results_ = std::make_unique<FolderView>();
     gtk_stack_add_child(GTK_STACK(stack_), results_->widget());
-    results_->setEmptyText(_("Nothing found"), _("No item below this folder has such a name."));
+    results_->setEmptyText("system-search-symbolic", _("Nothing found"), _("No item below this folder has such a name."));
     FolderViewEvents events;
     events.activated = [this](const std::string& path) { activated(*results_, path, URL(path)); };
     events.contextRequested = [this](const std::string& path, GtkWidget* over, const GdkRectangle& at) {

@@ -45,7 +45,7 @@ class FolderListScreen : public DocumentListController, public HostScreen {
   /// The items of all rows, in their order.
   virtual URLList shownItems();
   /// Where a search looks.
-  virtual std::vector<std::string> searchedFolders() const;
+  virtual std::vector<FolderSearch::Folder> searchedFolders() const;
   void reportItems();
   /// What the list knows of an entry of a folder within a library.
   static ItemHint hintFor(EntryKind kind, std::string_view name);

@@ -29,7 +29,7 @@ FolderPicker::FolderPicker(std::shared_ptr<DocumentTargetSelectionController> pi
     if (shown_) goTo(URL(path, true));
   };
   view_.setEvents(std::move(events));
-  view_.setEmptyText(_("No folders here"), "");
+  view_.setEmptyText("folder-symbolic", _("No folders here"), "");
   // Within one library the way begins at its top; across libraries at the drive's root, which lists them.
   std::optional<URL> top = drive_.defaultContainerURL();
   if (!picker_->allowsCrossContainer() && !picker_->itemsToMove().empty()) {

@@ -21,6 +21,9 @@ std::string folded(const std::string& name) {
   return takeString(g_utf8_casefold(normal.c_str(), -1));
 }
 
+/// A name among others that may be read the other way.
+std::string isolated(const std::string& name) { return "\u2068" + name + "\u2069"; }
+
 struct Batch {
   FolderSearch::Report report;
   std::shared_ptr<std::atomic<bool>> stopped;
@@ -32,22 +35,33 @@ class Searching {
   Searching(std::string query, std::shared_ptr<std::atomic<bool>> stopped, std::shared_ptr<FolderSearch::Found> found)
       : query_(std::move(query)), stopped_(std::move(stopped)), found_(std::move(found)) {}
 
-  void run(std::vector<std::string> folders) {
+  void run(const std::vector<FolderSearch::Folder>& begin) {
+    std::vector<Folder> folders;
+    for (const FolderSearch::Folder& folder : begin) {
+      if (!folder.name.empty() && matches(folder.name)) {
+        add({folder.name, folder.path, EntryKind::Folder, LibraryIcon, ""});
+      }
+      folders.push_back({folder.path, folder.name.empty() ? "" : isolated(folder.name)});
+    }
     // Breadth first: what lies near is found first.
     for (std::size_t at = 0; at < folders.size() && !*stopped_ && count_ < MostResults; ++at) {
-      const std::string folder = folders[at];
-      const FolderReading reading = readFolder(folder);
+      const Folder folder = folders[at];
+      const FolderReading reading = readFolder(folder.path);
       if (!reading.snapshot) {
-        waiting_.unreadable.emplace_back(folder, g_strerror(reading.errorNumber));
+        waiting_.unreadable.emplace_back(folder.path, g_strerror(reading.errorNumber));
         continue;
       }
       for (std::size_t i = 0; i < reading.snapshot->size() && count_ < MostResults; ++i) {
         const std::string name(reading.snapshot->name(i));
         const EntryKind kind = reading.snapshot->kind(i);
-        const std::string path = folder + "/" + name;
-        if (folded(name).find(query_) != std::string::npos)
-          add({takeString(g_filename_display_name(name.c_str())), path, kind, ""});
-        if (kind == EntryKind::Folder) folders.push_back(path);
+        const std::string path = folder.path + "/" + name;
+        const bool found = matches(name);
+        if (!found && kind != EntryKind::Folder) continue;
+        const std::string shown = takeString(g_filename_display_name(name.c_str()));
+        if (found) add({shown, path, kind, "", folder.place});
+        if (kind == EntryKind::Folder) {
+          folders.push_back({path, folder.place.empty() ? isolated(shown) : folder.place + " ▸ " + isolated(shown)});
+        }
       }
       tellIfDue();
     }
@@ -55,6 +69,12 @@ class Searching {
   }
 
  private:
+  struct Folder {
+    std::string path;
+    std::string place;
+  };
+
+  bool matches(const std::string& name) const { return folded(name).find(query_) != std::string::npos; }
   void add(FolderEntry entry) {
     ++count_;
     waiting_.entries.push_back(std::move(entry));
@@ -88,13 +108,13 @@ class Searching {
 
 }  // namespace
 
-void FolderSearch::start(std::vector<std::string> folders, const std::string& query, Found found) {
+void FolderSearch::start(std::vector<Folder> folders, const std::string& query, Found found) {
   stop();
   stopped_ = std::make_shared<std::atomic<bool>>(false);
   Searching searching(folded(query), stopped_, std::make_shared<Found>(std::move(found)));
   // Detached, since a folder on a slow disk may keep it for long; it touches nothing of ours once it is stopped.
   std::thread([searching = std::move(searching), folders = std::move(folders)]() mutable {
-    searching.run(std::move(folders));
+    searching.run(folders);
   }).detach();
 }
 

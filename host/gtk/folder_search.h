@@ -22,15 +22,20 @@ class FolderSearch {
     std::vector<std::pair<std::string, std::string>> unreadable;
     bool finished = false;
   };
+  /// A folder to look into, and what a person calls it; empty for the one that is open.
+  struct Folder {
+    std::string path;
+    std::string name;
+  };
   using Found = std::function<void(Report)>;
   FolderSearch() = default;
   ~FolderSearch() { stop(); }
   FolderSearch(const FolderSearch&) = delete;
   FolderSearch& operator=(const FolderSearch&) = delete;
 
-  /// Ends an earlier search. Names match that hold the query, without regard to case and accents' composition. At most some
-  /// thousand items are reported.
-  void start(std::vector<std::string> folders, const std::string& query, Found found);
+  /// Ends an earlier search. Names match that hold the query, without regard to case and accents' composition, those of the
+  /// folders as well. Each item is told with the folders that lead to it. At most some thousand items are reported.
+  void start(std::vector<Folder> folders, const std::string& query, Found found);
   void stop();
 
  private:

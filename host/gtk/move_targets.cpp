@@ -75,7 +75,7 @@ MoveTarget moveTargetAt(const URL& folder, const std::vector<URL>& items, bool l
   for (const CloudContainerRef& container : drive.allContainers()) {
     const std::optional<URL> documents = container->documentsFolderURL();
     if (!documents || container->identifier() == drive.defaultContainerIdentifier()) continue;
-    target.folders.push_back({container->localizedName(), documents->path(), EntryKind::Folder, "applications-other"});
+    target.folders.push_back({container->localizedName(), documents->path(), EntryKind::Folder, LibraryIcon});
   }
   return target;
 }

@@ -56,7 +56,7 @@ std::vector<FolderEntry> RootListScreen::libraries() const {
   for (const CloudContainerRef& container : drive().allContainers()) {
     const std::optional<URL> documents = container->documentsFolderURL();
     if (!documents || container->identifier() == drive().defaultContainerIdentifier()) continue;
-    entries.push_back({container->localizedName(), documents->path(), EntryKind::Folder, "applications-other"});
+    entries.push_back({container->localizedName(), documents->path(), EntryKind::Folder, LibraryIcon});
   }
   return entries;
 }
@@ -76,9 +76,9 @@ URLList RootListScreen::shownItems() {
   return {entries->size(), [entries](std::size_t i) { return URL((*entries)[i].path); }, indexOf, hint};
 }
 
-std::vector<std::string> RootListScreen::searchedFolders() const {
-  std::vector<std::string> folders{presentedURL()->path()};
-  for (const FolderEntry& library : libraries()) folders.push_back(library.path);
+std::vector<FolderSearch::Folder> RootListScreen::searchedFolders() const {
+  std::vector<FolderSearch::Folder> folders{{presentedURL()->path(), ""}};
+  for (const FolderEntry& library : libraries()) folders.push_back({library.path, library.displayName});
   return folders;
 }
 

@@ -18,7 +18,7 @@ class RootListScreen : public FolderListScreen {
   void fill() override;
   URL urlOf(const std::string& name) const override { return URL(name); }
   URLList shownItems() override;
-  std::vector<std::string> searchedFolders() const override;
+  std::vector<FolderSearch::Folder> searchedFolders() const override;
 
  private:
   void follow();

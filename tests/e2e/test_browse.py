@@ -107,9 +107,22 @@ class Browse(unittest.TestCase):
         app.click("Search", "push button")
         app.wait("Search below this folder")
         app.type("owl")
-        app.wait("Owl.png", "list item")
+        # With where it lies: a library, and the folders in it.
+        app.wait("Owl.png, \u2068Sketchbook\u2069 ▸ \u2068Animals\u2069 ▸ \u2068Birds\u2069", "list item")
         app.key("Escape")
         app.wait("Documents,", "list item")
+
+    def test_a_folder_that_was_found_opens_where_it_lies(self):
+        # The lists below it are made anew while the window still holds the one that the pointer is over.
+        app = self.app
+        app.key("ctrl+f")
+        app.wait("Search below this folder")
+        app.type("projec")
+        app.click("Projects,", "list item")
+        app.wait_title("Projects")
+        app.key("alt+Left")
+        app.wait("Contract.pdf", "list item")
+        self.assertTrue(app.running())
 
     def test_shows_an_icon_grid_and_the_list_again(self):
         app = self.app

@@ -8,7 +8,7 @@ namespace {
 
 using Claim = SwipeTrack::Claim;
 
-constexpr double Width = 200;
+constexpr double ButtonsWidth = 200;
 
 TEST(SwipeTrack, IsDecidedByTheFirstStretch) {
   struct Case {
@@ -47,17 +47,17 @@ TEST(SwipeTrack, StaysDecided) {
 TEST(SwipeTrack, TheRowFollowsTheFingerWithinItsButtons) {
   SwipeTrack track(0, false);
   track.moved(-20, 0, 10);
-  EXPECT_EQ(track.uncovered(Width), 0) << "it doesn't jump";
+  EXPECT_EQ(track.uncovered(ButtonsWidth), 0) << "it doesn't jump";
   track.moved(-100, 0, 20);
-  EXPECT_EQ(track.uncovered(Width), 80);
+  EXPECT_EQ(track.uncovered(ButtonsWidth), 80);
   track.moved(-500, 0, 30);
-  EXPECT_EQ(track.uncovered(Width), Width);
+  EXPECT_EQ(track.uncovered(ButtonsWidth), ButtonsWidth);
   track.moved(50, 0, 40);
-  EXPECT_EQ(track.uncovered(Width), 0);
-  SwipeTrack closing(Width, true);
+  EXPECT_EQ(track.uncovered(ButtonsWidth), 0);
+  SwipeTrack closing(ButtonsWidth, true);
   closing.moved(-20, 0, 10);
   closing.moved(-70, 0, 20);
-  EXPECT_EQ(closing.uncovered(Width), 150);
+  EXPECT_EQ(closing.uncovered(ButtonsWidth), 150);
 }
 
 TEST(SwipeTrack, EndsWhereItIsNearerTo) {
@@ -65,7 +65,7 @@ TEST(SwipeTrack, EndsWhereItIsNearerTo) {
     SwipeTrack track(0, false);
     track.moved(-20, 0, 0);
     track.moved(x, 0, 1000);
-    EXPECT_EQ(track.endsOpen(Width, 1000), open) << x;
+    EXPECT_EQ(track.endsOpen(ButtonsWidth, 1000), open) << x;
   }
 }
 
@@ -73,21 +73,21 @@ TEST(SwipeTrack, AFlickGoesOn) {
   SwipeTrack opening(0, false);
   opening.moved(-20, 0, 0);
   opening.moved(-60, 0, 100);
-  EXPECT_TRUE(opening.endsOpen(Width, 110)) << "400 pixels a second";
-  EXPECT_FALSE(opening.endsOpen(Width, 400)) << "the finger rested before it was lifted";
+  EXPECT_TRUE(opening.endsOpen(ButtonsWidth, 110)) << "400 pixels a second";
+  EXPECT_FALSE(opening.endsOpen(ButtonsWidth, 400)) << "the finger rested before it was lifted";
   SwipeTrack slow(0, false);
   slow.moved(-20, 0, 0);
   slow.moved(-40, 0, 100);
-  EXPECT_FALSE(slow.endsOpen(Width, 110));
-  SwipeTrack closing(Width, false);
+  EXPECT_FALSE(slow.endsOpen(ButtonsWidth, 110));
+  SwipeTrack closing(ButtonsWidth, false);
   closing.moved(20, 0, 0);
   closing.moved(60, 0, 100);
-  EXPECT_FALSE(closing.endsOpen(Width, 110));
+  EXPECT_FALSE(closing.endsOpen(ButtonsWidth, 110));
   SwipeTrack turning(0, false);
   turning.moved(-20, 0, 0);
   turning.moved(-180, 0, 1000);
   turning.moved(-140, 0, 1100);
-  EXPECT_FALSE(turning.endsOpen(Width, 1100)) << "only its latest way counts";
+  EXPECT_FALSE(turning.endsOpen(ButtonsWidth, 1100)) << "only its latest way counts";
 }
 
 }  // namespace

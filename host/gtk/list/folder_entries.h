@@ -12,12 +12,15 @@
 
 namespace vaelo {
 
+inline constexpr const char* LibraryIcon = "applications-other";
+
 /// An entry that a caller supplies instead of a folder.
 struct FolderEntry {
   std::string displayName;  ///< UTF-8, shown as it is
   std::string path;         ///< absolute, bytes; names the entry in all calls
   EntryKind kind = EntryKind::Document;
-  std::string icon;  ///< the name of an icon; empty for that of the kind
+  std::string icon{};   ///< the name of an icon; empty for that of the kind
+  std::string place{};  ///< UTF-8, where it lies; empty where that is plain
 };
 
 /// Entries that a caller supplied, in their order. They don't change any more. Main thread.

@@ -30,6 +30,7 @@ struct FolderItem {
   std::string name;         ///< bytes; the path where the entries were supplied by the caller
   std::string displayName;  ///< UTF-8
   std::string icon;         ///< the name of an icon that stands in for that of the kind; may be empty
+  std::string place;        ///< UTF-8, where it lies, shown before what is read of it; may be empty
   EntryKind kind;
   bool detailsAreFresh = false;
   std::shared_ptr<const ItemDetails> details;  ///< null until read; kept while newer ones are on their way

@@ -219,7 +219,10 @@ GObject* FolderModel::makeShownItem(guint position) {
   item.name = name;
   item.displayName = old ? shownName(name, transition_->old->kind(i)) : displayNameAt(i);
   item.kind = old ? transition_->old->kind(i) : kindAt(i);
-  if (entries_) item.icon = (*entries_)[i].icon;
+  if (entries_) {
+    item.icon = (*entries_)[i].icon;
+    item.place = (*entries_)[i].place;
+  }
   item.finalized = [weak = std::weak_ptr(self_)](FolderItem& gone) {
     const auto self = weak.lock();
     if (!self || !*self) return;

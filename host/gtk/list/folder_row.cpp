@@ -84,16 +84,22 @@ const std::string& nameOf(const FolderItem& item) {
   return item.details && !item.details->displayName.empty() ? item.details->displayName : item.displayName;
 }
 
+/// What stands below the name: at the side of an icon everything, below one the first of it.
+std::string factsOf(const FolderItem& item, bool grid) {
+  std::string facts;
+  if (item.details) facts = grid ? item.details->shortLine : item.details->secondLine;
+  if (facts.empty() && isPromised(item.kind)) facts = _("Not downloaded");
+  if (item.place.empty()) return facts;
+  return grid || facts.empty() ? item.place : item.place + " · " + facts;
+}
+
 void makeLayouts(Row* row) {
   if (row->name) return;
   GtkWidget* widget = GTK_WIDGET(row);
   const FolderItem& item = folderItemOf(row->item);
   const bool grid = row->context->grid;
   row->name = makeLayout(widget, nameOf(item), false, grid, grid ? 2 : 1);
-  std::string second;
-  if (item.details) second = grid ? item.details->shortLine : item.details->secondLine;
-  if (second.empty() && isPromised(item.kind)) second = _("Not downloaded");
-  row->second = makeLayout(widget, second, true, grid, 1);
+  row->second = makeLayout(widget, factsOf(item, grid), true, grid, 1);
 }
 
 void drawLayout(GtkSnapshot* snapshot, PangoLayout* layout, int x, int y, int width, const GdkRGBA& color) {
@@ -256,12 +262,8 @@ void tellAccessibility(Row* row) {
   GtkWidget* listItem = gtk_widget_get_parent(GTK_WIDGET(row));
   if (!listItem) return;
   const FolderItem& item = folderItemOf(row->item);
-  std::string label = nameOf(item);
-  if (item.details && !item.details->secondLine.empty()) {
-    label = listedText(label, item.details->secondLine);
-  } else if (isPromised(item.kind)) {
-    label = listedText(label, _("Not downloaded"));
-  }
+  const std::string facts = factsOf(item, false);
+  const std::string label = facts.empty() ? nameOf(item) : listedText(nameOf(item), facts);
   gtk_accessible_update_property(GTK_ACCESSIBLE(listItem), GTK_ACCESSIBLE_PROPERTY_LABEL, label.c_str(), -1);
 }
 

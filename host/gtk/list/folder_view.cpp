@@ -86,6 +86,8 @@ FolderView::~FolderView() {
   g_signal_handlers_disconnect_by_data(list_, this);
   swipe_.reset();
   markDrag_.reset();
+  // The window may hold the list that the pointer is over for a while, but what it lists goes now.
+  setListModel(nullptr);
   adw_clamp_scrollable_set_child(clamp_, nullptr);
   folderRowsPart(context_);
   g_object_unref(pages_);
@@ -168,6 +170,14 @@ void FolderView::setMode(Mode mode) {
   if (!top.empty()) scrollTo(top);
 }
 
+void FolderView::setListModel(GtkSelectionModel* model) {
+  if (context_.grid) {
+    gtk_grid_view_set_model(GTK_GRID_VIEW(list_), model);
+  } else {
+    gtk_list_view_set_model(GTK_LIST_VIEW(list_), model);
+  }
+}
+
 void FolderView::setEditing(bool editing) {
   if (editing == context_.editing) return;
   context_.editing = editing;
@@ -212,7 +222,8 @@ void FolderView::allDetailsAreOld() {
   model_.forEachLiveItem([this](FolderItem& item) { detailsAreOld(item); });
 }
 
-void FolderView::setEmptyText(const std::string& title, const std::string& description) {
+void FolderView::setEmptyText(const char* icon, const std::string& title, const std::string& description) {
+  adw_status_page_set_icon_name(emptyPage_, icon);
   adw_status_page_set_title(emptyPage_, title.c_str());
   adw_status_page_set_description(emptyPage_, description.c_str());
 }

@@ -73,7 +73,7 @@ class FolderView {
   /// Instead of entries: that the folder they come from can't be read, with the system's error number.
   void setUnreadable(int errorNumber);
   /// What the page says when there is nothing to list; the default is of an empty folder.
-  void setEmptyText(const std::string& title, const std::string& description);
+  void setEmptyText(const char* icon, const std::string& title, const std::string& description);
   /// Reads the folder and the rows' details again. Rows keep their place and selection.
   void refresh();
 
@@ -113,6 +113,7 @@ class FolderView {
   void showPage();
   /// While editing, a pointer that is dragged over rows selects them.
   void setRubberband();
+  void setListModel(GtkSelectionModel* model);
   void follow();
   void read();
   void folderRead(std::shared_ptr<const FolderSnapshot> next, const std::vector<Splice>& splices, int errorNumber);
