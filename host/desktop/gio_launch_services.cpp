@@ -14,6 +14,12 @@ namespace {
 
 std::string text(const char* value) { return value ? value : ""; }
 
+/// Where a finger would find nothing to touch, if the desktop has a terminal at all.
+bool needsTerminal(GAppInfo* app) {
+  return G_IS_DESKTOP_APP_INFO(app) &&
+         g_desktop_app_info_get_boolean(G_DESKTOP_APP_INFO(app), "Terminal");  // not for people
+}
+
 ApplicationRecord recordOf(GAppInfo* app) {
   constexpr std::string_view suffix = ".desktop";
   ApplicationRecord record;
@@ -38,23 +44,24 @@ class GioDocumentRecord : public DocumentRecord {
   Result<Ranked> applicationsAvailableForOpeningByHandlerRank() override {
     const std::string type = contentTypeOf(url_.path());
     std::vector<ApplicationRecord> owners;
-    if (const GRef<GAppInfo> own{g_app_info_get_default_for_type(type.c_str(), FALSE)})
-      owners.push_back(recordOf(own.get()));
-    collect(g_app_info_get_recommended_for_type(type.c_str()), owners, {});
     std::vector<ApplicationRecord> others;
-    collect(g_app_info_get_fallback_for_type(type.c_str()), others, owners);
+    const auto add = [&](GAppInfo* app, bool owns) {
+      ApplicationRecord record = recordOf(app);
+      const auto isIn = [&](const auto& list) { return std::find(list.begin(), list.end(), record) != list.end(); };
+      if (isIn(owners) || isIn(others)) return;
+      (owns && !needsTerminal(app) ? owners : others).push_back(std::move(record));
+    };
+    const auto addAll = [&](GList* apps, bool own) {
+      for (GList* at = apps; at; at = at->next) add(G_APP_INFO(at->data), own);
+      g_list_free_full(apps, g_object_unref);
+    };
+    if (const GRef<GAppInfo> chosen{g_app_info_get_default_for_type(type.c_str(), FALSE)}) add(chosen.get(), true);
+    addAll(g_app_info_get_recommended_for_type(type.c_str()), true);
+    addAll(g_app_info_get_fallback_for_type(type.c_str()), false);
     return Ranked{{HandlerRankOwner, owners}, {"Alternate", others}};
   }
 
  private:
-  static void collect(GList* apps, std::vector<ApplicationRecord>& into, const std::vector<ApplicationRecord>& but) {
-    for (GList* at = apps; at; at = at->next) {
-      ApplicationRecord record = recordOf(G_APP_INFO(at->data));
-      const auto has = [&](const auto& list) { return std::find(list.begin(), list.end(), record) != list.end(); };
-      if (!has(into) && !has(but)) into.push_back(std::move(record));
-    }
-    g_list_free_full(apps, g_object_unref);
-  }
   URL url_;
 };
 

@@ -6,7 +6,7 @@
 namespace vaelo {
 
 /// Applications as the desktop knows them (Desktop Entry and MIME applications specifications). The user's default and the
-/// recommended handlers of a type are its owners.
+/// recommended handlers of a type are its owners, but for programs that run in a terminal.
 class GioLaunchServices : public LaunchServices {
  public:
   std::shared_ptr<DocumentRecord> documentRecord(const URL& url, bool sourceIsManaged) override;

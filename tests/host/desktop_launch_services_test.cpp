@@ -60,6 +60,8 @@ TEST(DesktopLaunchServicesApart, DISABLED_OwnersComeFirst) {
   const std::vector<std::string> others = identifiers(*ranked.value, "Alternate");
   EXPECT_NE(std::find(others.begin(), others.end(), "org.example.Text"), others.end());
   EXPECT_EQ(std::find(owners.begin(), owners.end(), "org.example.Text"), owners.end());
+  EXPECT_EQ(std::find(owners.begin(), owners.end(), "org.example.Lines"), owners.end()) << "it needs a terminal";
+  EXPECT_EQ(std::count(others.begin(), others.end(), "org.example.Lines"), 1);
 }
 
 TEST(DesktopLaunchServicesApart, DISABLED_RecordsSayWhatTheEntrySays) {
@@ -81,10 +83,13 @@ TEST_F(DesktopLaunchServicesTest, OwnersComeFirst) {
   application("org.example.Table", "true %F", "text/csv;");
   application("org.example.Chosen", "true %U", "text/csv;");
   application("org.example.Text", "true %f", "text/plain;");
-  // What update-desktop-database makes of the three.
+  // An editor for a terminal, which is on every desktop and would take each text from the preview.
+  application("org.example.Lines", "true %F", "text/csv;\nTerminal=true");
+  // What update-desktop-database makes of them.
   write(root + "/share/applications/mimeinfo.cache",
         "[MIME "
-        "Cache]\ntext/csv=org.example.Table.desktop;org.example.Chosen.desktop;\ntext/plain=org.example.Text.desktop;\n");
+        "Cache]\ntext/csv=org.example.Lines.desktop;org.example.Table.desktop;org.example.Chosen.desktop;\ntext/"
+        "plain=org.example.Text.desktop;\n");
   write(root + "/config/mimeapps.list", "[Default Applications]\ntext/csv=org.example.Chosen.desktop\n");
   runApart("OwnersComeFirst");
 }
