@@ -13,6 +13,8 @@ namespace {
 std::string wordsOf(const std::optional<Error>& error) {
   if (error && error->localizedDescription) return *error->localizedDescription;
   if (error && error->localizedFailureReason) return localized(error->localizedFailureReason->c_str());
+  // The one error that is made without words, and is told: a folder that would get the name of a file, and the reverse.
+  if (error && error->code == FileErrorCode::FeatureUnsupported) return localized("This can’t be done with this item.");
   return localized("Error exception");
 }
 
@@ -83,9 +85,7 @@ void UIUtils::showInvalidItemNameAlertParentViewController(const std::string& ba
 }
 
 void UIUtils::showUnsupportedError(const ViewControllerRef& parent) {
-  Error error{FileErrorDomain, FileErrorCode::FeatureUnsupported, {}, {}, {}};
-  error.localizedDescription = localized("This can’t be done with this item.");
-  showErrorParentViewController(error, parent);
+  showErrorParentViewController(Error{FileErrorDomain, FileErrorCode::FeatureUnsupported, {}, {}, {}}, parent);
 }
 
 std::string UIUtils::bestMessage(const std::optional<Error>& error) {

@@ -125,6 +125,8 @@ TEST_F(UIUtilsTest, APromptsLineSaysWhatIsWrong) {
   EXPECT_EQ(UIUtils::bestMessage(error(1, "description", "reason")), "description");
   EXPECT_EQ(UIUtils::bestMessage(error(1, std::nullopt, "reason")), "reason");
   EXPECT_EQ(UIUtils::bestMessage(error(1)), "Error exception");
+  EXPECT_EQ(UIUtils::bestMessage(error(FileErrorCode::FeatureUnsupported)), "This can’t be done with this item.");
+  EXPECT_EQ(UIUtils::bestMessage(error(FileErrorCode::FeatureUnsupported, "description")), "description");
 }
 
 TEST_F(UIUtilsTest, RenamingRefusesInTheGeneralDomain) {
