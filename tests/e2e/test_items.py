@@ -85,6 +85,30 @@ class Items(ItemsWindow):
             self.app.key("alt+Left")
             self.app.wait_title("Vaelo Drive")
 
+    def test_keys_mean_the_item_whose_menu_it_was(self):
+        app = self.app
+        app.click("Second.txt", "list item", button=3)
+        app.wait("Rename…", "menu item")
+        app.key("Escape")
+        app.wait_gone("Rename…")
+        app.key("F2")
+        app.wait("Enter a new name for this item.")
+        app.key("ctrl+a")
+        app.type("Renamed")
+        app.key("Return")
+        self.on_disk("Renamed.txt")
+        self.on_disk("Second.txt", there=False)
+
+    def test_a_folder_does_not_take_the_name_of_a_file(self):
+        app = self.app
+        self.menu("Plans", "r")
+        app.wait("Enter a new name for this item.")
+        app.key("ctrl+a")
+        app.type("Report.txt")
+        app.key("Return")
+        app.wait("This can’t be done with this item.")
+        self.on_disk("Plans")
+
     def test_the_details_show_facts(self):
         self.menu("Report.txt", "i")
         self.app.wait_log("Using PreviewDetailsViewController")

@@ -286,6 +286,16 @@ TEST_F(FolderViewTest, TabLeavesTheListAtOnce) {
   EXPECT_FALSE(key(GDK_KEY_Tab)) << "which is no longer the list's";
 }
 
+TEST_F(FolderViewTest, WhoTypesANameSeesWhereTheKeyboardIs) {
+  for (const char* name : {"alpha", "beta"}) folder_.write(name);
+  open();
+  view_->grabFocus();
+  // As after a press or a tap.
+  gtk_window_set_focus_visible(GTK_WINDOW(window_), FALSE);
+  EXPECT_TRUE(key(GDK_KEY_b));
+  EXPECT_TRUE(gtk_window_get_focus_visible(GTK_WINDOW(window_)));
+}
+
 TEST_F(FolderViewTest, GoesAwayWhileReading) {
   for (int i = 0; i < 1000; ++i) folder_.write("file " + std::to_string(i));
   view_->setFolder(folder_.path());

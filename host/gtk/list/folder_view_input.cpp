@@ -75,6 +75,8 @@ bool FolderView::keyPressed(guint key, GdkModifierType modifiers) {
   const auto found = typeAhead_.type(model_, utf8.data(), now, focusedRow);
   if (!found) return true;
   scrollTo(nameAt(*found));
+  // After a pointer or finger the window shows no longer where the keyboard is.
+  gtk_window_set_focus_visible(GTK_WINDOW(gtk_widget_get_root(widget())), TRUE);
   // A row that takes the focus before it has its place makes the list scroll by its guess again.
   focusRevealed_ = true;
   return true;
@@ -150,6 +152,10 @@ std::vector<RowSwipe::Button> FolderView::swipeButtons(const FolderItem& item) {
 void FolderView::requestContext(double x, double y) {
   FolderItem* item = itemOfRow(folderRowIn(gtk_widget_pick(scroller_, x, y, GTK_PICK_DEFAULT)));
   if (!item || !events_.contextRequested) return;
+  // Keys that come next mean the item whose menu it was. And the menu takes the release, for which the row would wait.
+  GtkWidget* listItem = gtk_widget_get_parent(item->row);
+  gtk_widget_grab_focus(listItem);
+  gtk_widget_unset_state_flags(listItem, GTK_STATE_FLAG_ACTIVE);
   const GdkRectangle at{static_cast<int>(x), static_cast<int>(y), 1, 1};
   events_.contextRequested(std::string(item->name), scroller_, at);
 }
