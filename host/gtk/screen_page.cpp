@@ -6,6 +6,7 @@
 #include "host/gtk/bar_item_widget.h"
 #include "host/gtk/details_tags.h"
 #include "host/gtk/host_screen.h"
+#include "host/gtk/menu_tooltip.h"
 #include "host/gtk/mirror/view_mirror.h"
 #include "host/gtk/pango_graphics.h"
 #include "host/gtk/preview/preview_page.h"
@@ -59,7 +60,7 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
     gtk_menu_button_set_icon_name(GTK_MENU_BUTTON(button), "open-menu-symbolic");
     gtk_menu_button_set_menu_model(GTK_MENU_BUTTON(button), menu);
     gtk_menu_button_set_primary(GTK_MENU_BUTTON(button), TRUE);  // F10 opens it
-    gtk_widget_set_tooltip_text(button, _("Main Menu"));
+    setTooltipWhileClosed(GTK_MENU_BUTTON(button), _("Main Menu"));
     gtk_accessible_update_property(GTK_ACCESSIBLE(button), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Main Menu"), -1);
     adw_header_bar_pack_end(ADW_HEADER_BAR(header_), button);
     menuButton_ = button;

@@ -85,6 +85,7 @@ class TagsPopover {
     gtk_scrolled_window_set_propagate_natural_height(GTK_SCROLLED_WINDOW(scroller), TRUE);
     gtk_scrolled_window_set_max_content_height(GTK_SCROLLED_WINDOW(scroller), 6 * RowHeight);
     gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scroller), rows_);
+    gtk_widget_set_visible(scroller, FALSE);  // while there are no rows
     gtk_box_append(GTK_BOX(box), scroller);
     makeField(box);
     gtk_popover_set_child(GTK_POPOVER(popover_), box);
@@ -194,6 +195,7 @@ class TagsPopover {
                      this);
     checks_[name] = check;
     gtk_box_append(GTK_BOX(rows_), check);
+    gtk_widget_set_visible(gtk_widget_get_ancestor(rows_, GTK_TYPE_SCROLLED_WINDOW), TRUE);
   }
 
   void toggled(const std::string& name, bool on) {

@@ -3,6 +3,7 @@
 
 #include <algorithm>
 
+#include "host/gtk/menu_tooltip.h"
 #include "host/gtk/pango_graphics.h"
 #include "host/gtk/preview/find_bar.h"
 #include "host/support/glib_ptr.h"
@@ -46,7 +47,7 @@ GtkWidget* DocumentButtons::makeMenu() {
   gtk_menu_button_set_icon_name(GTK_MENU_BUTTON(menu), "view-more-symbolic");
   gtk_menu_button_set_menu_model(GTK_MENU_BUTTON(menu), G_MENU_MODEL(items.get()));
   gtk_widget_insert_action_group(menu, "document", G_ACTION_GROUP(actions.get()));
-  gtk_widget_set_tooltip_text(menu, _("Find and Markup"));
+  setTooltipWhileClosed(GTK_MENU_BUTTON(menu), _("Find and Markup"));
   gtk_accessible_update_property(GTK_ACCESSIBLE(menu), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Find and Markup"), -1);
   return menu;
 }

@@ -3,6 +3,7 @@
 
 #include <string>
 
+#include "host/gtk/menu_tooltip.h"
 #include "host/support/texts.h"
 
 namespace vaelo {
@@ -12,7 +13,6 @@ PagesIndicator::PagesIndicator(std::function<void(int)> chosen)
       button_(GTK_WIDGET(g_object_ref_sink(gtk_menu_button_new()))),
       popover_(gtk_popover_new()),
       entry_(gtk_spin_button_new_with_range(1, 2, 1)) {
-  gtk_widget_set_tooltip_text(button_, _("Go to Page"));
   gtk_widget_add_css_class(button_, "osd");
   gtk_widget_add_css_class(button_, "numeric");
   gtk_widget_set_halign(button_, GTK_ALIGN_CENTER);
@@ -30,6 +30,7 @@ PagesIndicator::PagesIndicator(std::function<void(int)> chosen)
   for (GtkWidget* child : {label, entry_, go}) gtk_box_append(GTK_BOX(box), child);
   gtk_popover_set_child(GTK_POPOVER(popover_), box);
   gtk_menu_button_set_popover(GTK_MENU_BUTTON(button_), popover_);
+  setTooltipWhileClosed(GTK_MENU_BUTTON(button_), _("Go to Page"));
   g_signal_connect_swapped(go, "clicked", G_CALLBACK(+[](PagesIndicator* self) { self->activated(); }), this);
   // A spin button's own signal comes from the text inside of it.
   g_signal_connect_swapped(gtk_editable_get_delegate(GTK_EDITABLE(entry_)), "activate",
