@@ -123,9 +123,11 @@ void GtkWindowHost::addActions() {
   g_action_map_add_action_entries(G_ACTION_MAP(window_), entries, G_N_ELEMENTS(entries), this);
   GtkEventController* shortcuts = gtk_shortcut_controller_new();
   gtk_shortcut_controller_set_scope(GTK_SHORTCUT_CONTROLLER(shortcuts), GTK_SHORTCUT_SCOPE_GLOBAL);
-  constexpr const char* keys[][2] = {{"F5|<Control>r", "win.refresh"}, {"<Control>f", "win.search"},
-                                     {"<Control>a", "win.select-all"}, {"<Control>t", "win.tags"},
-                                     {"<Alt>Left|Back", "win.back"},   {"Escape", "win.escape"}};
+  // Of two for one action the menu shows the one that comes last.
+  constexpr const char* keys[][2] = {{"<Control>r", "win.refresh"}, {"F5", "win.refresh"},
+                                     {"<Control>f", "win.search"},  {"<Control>a", "win.select-all"},
+                                     {"<Control>t", "win.tags"},    {"<Alt>Left|Back", "win.back"},
+                                     {"Escape", "win.escape"}};
   for (const auto& [trigger, action] : keys) {
     gtk_shortcut_controller_add_shortcut(
         GTK_SHORTCUT_CONTROLLER(shortcuts),

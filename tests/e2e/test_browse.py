@@ -4,6 +4,8 @@ import os
 import shutil
 import unittest
 
+from PIL import Image
+
 from harness import App, Desktop, wait_for
 
 
@@ -123,6 +125,20 @@ class Browse(unittest.TestCase):
         app.key("alt+Left")
         app.wait("Contract.pdf", "list item")
         self.assertTrue(app.running())
+
+    def test_about_shows_the_applications_own_picture(self):
+        app = self.app
+
+        def greenish():
+            path = app.desktop.scratch / "screen.png"
+            app.desktop.tool("import", "-silent", "-window", "root", str(path))
+            return sum(g - r > 60 and abs(g - b) < 40 for r, g, b in Image.open(path).convert("RGB").getdata())
+        before = greenish()
+        app.key("F10")
+        wait_for("the menu", lambda: any(name == "Select All" for _, name in app.accessibility.focused()))
+        app.key("Up", "Return")
+        app.wait("Legal")
+        wait_for("the picture", lambda: greenish() > before + 1000)
 
     def test_shows_an_icon_grid_and_the_list_again(self):
         app = self.app
