@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/mirrored_text.h"
 
+#include <algorithm>
+
 #include "host/gtk/pango_graphics.h"
 
 namespace vaelo {
@@ -41,6 +43,13 @@ GtkJustification justificationOf(TextAlignment alignment) {
   return GTK_JUSTIFY_LEFT;
 }
 
+bool isLargeText() {
+  constexpr double large = 1.5;
+  return textScale() >= large;
+}
+
+int linesOf(const Label& label) { return isLargeText() ? 2 * label.numberOfLines() : label.numberOfLines(); }
+
 }  // namespace
 
 PangoAttrList* attributesOf(const Font& font) {
@@ -52,31 +61,53 @@ PangoAttrList* attributesOf(const Font& font) {
   return attributes;
 }
 
+double heightOf(const Label& label, double width) {
+  const Size usual = label.sizeThatFits({width, 0});
+  if (!isLargeText()) return usual.height;
+  if (!label.attributedText()) {
+    return PangoGraphics().measure(label.text(), label.font(), width, linesOf(label)).height;
+  }
+  const auto& runs = label.attributedText()->runs();
+  const auto pictures = std::count_if(runs.begin(), runs.end(), [](const auto& run) { return run.image != nullptr; });
+  return usual.height * static_cast<double>(std::max<std::ptrdiff_t>(pictures, 1));
+}
+
 MirroredText::MirroredText(Label& label) : label_(label), box_(gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 0)) { update(); }
 
 void MirroredText::update() {
   while (GtkWidget* child = gtk_widget_get_first_child(box_)) gtk_box_remove(GTK_BOX(box_), child);
   if (!label_.attributedText()) {
-    gtk_widget_set_hexpand(appendText(label_.text()), TRUE);
+    gtk_widget_set_hexpand(appendText(label_.text(), box_), TRUE);
     return;
   }
+  const bool isColumn = isLargeText();
+  gtk_orientable_set_orientation(GTK_ORIENTABLE(box_), isColumn ? GTK_ORIENTATION_VERTICAL : GTK_ORIENTATION_HORIZONTAL);
+  GtkWidget* line = isColumn ? appendLine() : box_;
   for (const AttributedString::Run& run : label_.attributedText()->runs()) {
     const auto* image = dynamic_cast<const GtkImageData*>(run.image.get());
     if (!image) {
-      appendText(run.text);
+      appendText(run.text, line);
       continue;
     }
+    if (isColumn && gtk_widget_get_first_child(line)) line = appendLine();
     GtkWidget* picture = gtk_picture_new_for_paintable(image->paintable());
     gtk_picture_set_can_shrink(GTK_PICTURE(picture), FALSE);
     gtk_widget_set_valign(picture, GTK_ALIGN_CENTER);
-    gtk_box_append(GTK_BOX(box_), picture);
+    gtk_box_append(GTK_BOX(line), picture);
   }
 }
 
-GtkWidget* MirroredText::appendText(const std::string& text) {
+GtkWidget* MirroredText::appendLine() {
+  GtkWidget* line = gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 0);
+  gtk_widget_set_vexpand(line, TRUE);
+  gtk_box_append(GTK_BOX(box_), line);
+  return line;
+}
+
+GtkWidget* MirroredText::appendText(const std::string& text, GtkWidget* line) {
   GtkWidget* widget = gtk_label_new(text.c_str());
   style(widget);
-  gtk_box_append(GTK_BOX(box_), widget);
+  gtk_box_append(GTK_BOX(line), widget);
   return widget;
 }
 
@@ -88,10 +119,11 @@ void MirroredText::style(GtkWidget* text) const {
   pango_attr_list_unref(attributes);
   gtk_label_set_xalign(widget, textXalignOf(label_.textAlignment(), rightToLeft));
   gtk_label_set_justify(widget, justificationOf(label_.textAlignment()));
-  gtk_label_set_ellipsize(widget, label_.numberOfLines() == 0 ? PANGO_ELLIPSIZE_NONE : PANGO_ELLIPSIZE_END);
-  gtk_label_set_wrap(widget, label_.numberOfLines() != 1);
+  const int lines = linesOf(label_);
+  gtk_label_set_ellipsize(widget, lines == 0 ? PANGO_ELLIPSIZE_NONE : PANGO_ELLIPSIZE_END);
+  gtk_label_set_wrap(widget, lines != 1);
   gtk_label_set_wrap_mode(widget, PANGO_WRAP_WORD_CHAR);
-  if (label_.numberOfLines() > 0) gtk_label_set_lines(widget, label_.numberOfLines());
+  if (lines > 0) gtk_label_set_lines(widget, lines);
   if (const char* name = classOf(label_.textColor())) gtk_widget_add_css_class(text, name);
 }
 

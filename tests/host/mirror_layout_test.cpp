@@ -209,6 +209,22 @@ TEST_F(ViewLayoutTest, WhereThereIsTooLittleRoomTheFarEdgeGivesWay) {
   expectFrame(*column->arrangedSubviews()[1], {175, 210, 50, 200});
 }
 
+TEST_F(ViewLayoutTest, WhatIsInAStackWithTooLittleRoomStaysInIt) {
+  const auto column = stack(LayoutAxis::Vertical, StackAlignment::Center, StackDistribution::Fill);
+  fill(*column);
+  const auto inner = stack(LayoutAxis::Vertical, StackAlignment::Center, StackDistribution::Fill);
+  inner->removeFromSuperview();
+  column->addArrangedSubview(inner);
+  for (StackView* place : {inner.get(), inner.get(), column.get()}) {
+    const auto part = std::make_shared<SizedView>(50, 200);
+    part->setContentCompressionResistancePriority(LayoutPriority::Required, LayoutAxis::Vertical);
+    place->addArrangedSubview(part);
+  }
+  solve();
+  EXPECT_NEAR(inner->frame().height, 410, 1e-3);
+  EXPECT_NEAR(column->arrangedSubviews()[1]->frame().y, 420, 1e-3);
+}
+
 TEST_F(ViewLayoutTest, CentresStandWhereTheRelationSays) {
   const auto view = block(100, 40);
   LayoutConstraint::activate({LayoutConstraint::makeEqual(*view, CenterX, *root, CenterX, 10),

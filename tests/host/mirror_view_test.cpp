@@ -238,6 +238,69 @@ TEST_F(MirrorViewTest, SmallPicturesAreMagnifiedInSquaresAndOnlyOnce) {
   EXPECT_EQ(gtk_picture_get_paintable(GTK_PICTURE(widget)), shown);
 }
 
+TEST_F(MirrorViewTest, APictureThatIsTooLargeForItsViewIsShownSmaller) {
+  const auto around = std::make_shared<View>(Rect{20, 100, 60, 30});
+  const auto picture = std::make_shared<ImageView>(Rect{-20, -35, 100, 100});
+  picture->setImage(PangoGraphics().renderImage({10, 10}, [](DrawingContext& context) { context.fillRect({0, 0, 5, 10}); }));
+  around->addSubview(picture);
+  content->addSubview(around);
+  show();
+  const Rect shown = placeOf(widgets().back());
+  EXPECT_NEAR(shown.width, 30, 1);
+  EXPECT_NEAR(shown.height, 30, 1);
+  EXPECT_NEAR(shown.center().x, 50, 1);
+  EXPECT_NEAR(shown.center().y, 115, 1);
+}
+
+/// Letters of twice the size, for as long as it lives.
+struct LargeLetters {
+  LargeLetters() { set(2); }
+  ~LargeLetters() { set(1); }
+  static void set(int scale) {
+    adw_init();
+    g_object_set(gtk_settings_get_default(), "gtk-xft-dpi", scale * 96 * 1024, nullptr);
+  }
+};
+
+TEST_F(MirrorViewTest, LargeLettersTakeASecondLine) {
+  label->setText("plain text document of a kind");
+  show();
+  GtkLabel* shown = GTK_LABEL(gtk_widget_get_first_child(widgets()[0]));
+  EXPECT_FALSE(gtk_label_get_wrap(shown));
+  const LargeLetters large;
+  label->setText("plain text document of a kind, and more of it");
+  settle();
+  shown = GTK_LABEL(gtk_widget_get_first_child(widgets()[0]));
+  EXPECT_TRUE(gtk_label_get_wrap(shown));
+  EXPECT_EQ(gtk_label_get_lines(shown), 2);
+  const double line = PangoGraphics().measure("X", label->font(), 0, 1).height;
+  EXPECT_NEAR(label->frame().height, 2 * line, 2);
+}
+
+TEST_F(MirrorViewTest, InLargeLettersThingsWithPicturesStandBelowEachOther) {
+  const LargeLetters large;
+  const ImageRef dot = PangoGraphics().renderImage({10, 10}, [](DrawingContext& context) {
+    context.fillRect({0, 0, 5, 10});
+  });
+  AttributedString tags;
+  for (const char* name : {"Work ", "Holiday"}) {
+    tags.appendImage(dot);
+    tags.append(name);
+  }
+  label->setAttributedText(tags);
+  show();
+  GtkWidget* box = widgets()[0];
+  ASSERT_EQ(gtk_orientable_get_orientation(GTK_ORIENTABLE(box)), GTK_ORIENTATION_VERTICAL);
+  int lines = 0;
+  for (GtkWidget* line = gtk_widget_get_first_child(box); line; line = gtk_widget_get_next_sibling(line)) {
+    ++lines;
+    EXPECT_TRUE(GTK_IS_PICTURE(gtk_widget_get_first_child(line)));
+    EXPECT_TRUE(GTK_IS_LABEL(gtk_widget_get_last_child(line)));
+  }
+  EXPECT_EQ(lines, 2);
+  EXPECT_NEAR(label->frame().height, 2 * label->sizeThatFits({}).height, 1);
+}
+
 TEST_F(MirrorViewTest, AMirrorThatIsGoneLeavesTheViews) {
   show();
   gtk_window_set_child(GTK_WINDOW(window), nullptr);

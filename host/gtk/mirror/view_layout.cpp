@@ -1,11 +1,13 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/mirror/view_layout.h"
 
+#include <algorithm>
 #include <cmath>
 #include <map>
 #include <optional>
 
 #include "host/gtk/mirror/layout_solver.h"
+#include "host/gtk/mirrored_text.h"
 #include "platform/ui/button.h"
 #include "platform/ui/stack_view.h"
 
@@ -17,8 +19,10 @@ using Length = LayoutSolver::Length;
 using Terms = std::vector<LayoutSolver::Term>;
 using enum LayoutRelation;
 
-// What gives way where there is too little room: the far edge first, never the near one, and texts last.
+// What gives way where there is too little room: the far edge first, of all of them the outermost, so that what is in a
+// stack stays in it; never the near one, and texts last.
 constexpr double FarEdgeWeight = 1;
+constexpr double FarEdgeWeightOfDepth = 1 / 16.0;
 constexpr double OtherWeight = 2;
 constexpr double NaturalSizeWeight = 4;
 constexpr double NearEdgeWeight = 16;
@@ -121,7 +125,8 @@ class AxisLayout {
     const Size natural = view.intrinsicContentSize();
     if (horizontal_) return natural.width == View::NoIntrinsicMetric ? std::nullopt : std::optional(natural.width);
     if (natural.height == View::NoIntrinsicMetric) return std::nullopt;
-    return dynamic_cast<const Label*>(&view) ? view.sizeThatFits(view.frame().size()).height : natural.height;
+    const auto* label = dynamic_cast<const Label*>(&view);
+    return label ? heightOf(*label, view.frame().width) : natural.height;
   }
 
   void addNaturalSize(const View& view, const Extent& extent) {
@@ -177,7 +182,13 @@ class AxisLayout {
     if (turned && relation != Equal) relation = relation == LessThanOrEqual ? GreaterThanOrEqual : LessThanOrEqual;
     const bool farEdge = first == LayoutAttribute::Bottom || first == LayoutAttribute::Trailing;
     row(std::move(*terms), relation, turned ? -constraint.constant() : constraint.constant(), constraint.priority(),
-        farEdge ? FarEdgeWeight : OtherWeight);
+        farEdge ? farEdgeWeightIn(*constraint.firstItem()) : OtherWeight);
+  }
+
+  double farEdgeWeightIn(const View& view) const {
+    int depth = 0;
+    for (const View* each = &view; each && each != &root_; each = each->superview()) ++depth;
+    return std::min(FarEdgeWeight + depth * FarEdgeWeightOfDepth, OtherWeight);
   }
 
   void addStack(const StackView& stack, const Extent& extent) {
@@ -189,7 +200,7 @@ class AxisLayout {
     if (stack.axis() == axis_) {
       addAlong(stack, extent, parts);
     } else {
-      for (const Extent& part : parts) addAcross(stack.alignment(), extent, part);
+      for (const Extent& part : parts) addAcross(stack, extent, part);
     }
   }
 
@@ -216,17 +227,18 @@ class AxisLayout {
     }
     const Extent& last = parts.back();
     row({{last.start, 1}, {last.size, 1}, {extent.start, -1}, {extent.size, -1}}, Equal, 0, LayoutPriority::Required,
-        FarEdgeWeight);
+        farEdgeWeightIn(stack));
   }
 
-  void addAcross(StackAlignment alignment, const Extent& extent, const Extent& part) {
+  void addAcross(const StackView& stack, const Extent& extent, const Extent& part) {
+    const StackAlignment alignment = stack.alignment();
     const Terms nearEdges = {{part.start, 1}, {extent.start, -1}};
     const Terms farEdges = {{part.start, 1}, {part.size, 1}, {extent.start, -1}, {extent.size, -1}};
     const bool atStart = alignment == StackAlignment::Fill || alignment == StackAlignment::Leading ||
                          alignment == StackAlignment::FirstBaseline;
     const bool atEnd = alignment == StackAlignment::Fill || alignment == StackAlignment::Trailing;
     row(nearEdges, atStart ? Equal : GreaterThanOrEqual, 0, LayoutPriority::Required, NearEdgeWeight);
-    row(farEdges, atEnd ? Equal : LessThanOrEqual, 0, LayoutPriority::Required, FarEdgeWeight);
+    row(farEdges, atEnd ? Equal : LessThanOrEqual, 0, LayoutPriority::Required, farEdgeWeightIn(stack));
     if (alignment == StackAlignment::Center) {
       row({{part.start, 1}, {part.size, 0.5}, {extent.start, -1}, {extent.size, -0.5}}, Equal, 0, LayoutPriority::Required,
           OtherWeight);

@@ -38,6 +38,17 @@ bool shows(const View& view) {
   return true;
 }
 
+/// Where the view is shown, in `origin`. A picture that is too large for the view that it is in would cover what stands beside
+/// that, so it comes as large as there is room for.
+Rect placeOf(const View& view, const View& origin) {
+  const Rect frame = view.convertRectTo(view.bounds(), origin);
+  const View* around = view.superview();
+  if (!around || !dynamic_cast<const ImageView*>(&view) || frame.width <= 0 || frame.height <= 0) return frame;
+  const Size room = around->frame().size();
+  const double scale = std::clamp(std::min(room.width / frame.width, room.height / frame.height), 0.0, 1.0);
+  return frame.insetBy(frame.width * (1 - scale) / 2, frame.height * (1 - scale) / 2);
+}
+
 int least(GtkWidget* widget, GtkOrientation orientation, int across) {
   int size = 0;
   gtk_widget_measure(widget, orientation, across, &size, nullptr, nullptr, nullptr);
@@ -230,7 +241,7 @@ void ViewMirror::place(Slot& slot) {
   GtkWidget* widget = slot.content->widget();
   gtk_widget_set_child_visible(widget, shows(*slot.view));
   const View& origin = scroll_ ? *scroll_ : *root_;
-  const Rect frame = slot.view->convertRectTo(slot.view->bounds(), origin);
+  const Rect frame = placeOf(*slot.view, origin);
   const auto room = [](double length, int needed) { return std::max(needed, static_cast<int>(std::ceil(length - 0.01))); };
   const int width = room(frame.width, least(widget, GTK_ORIENTATION_HORIZONTAL, -1));
   const int height = room(frame.height, least(widget, GTK_ORIENTATION_VERTICAL, width));
