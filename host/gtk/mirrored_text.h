@@ -27,8 +27,8 @@ class MirroredText {
   GtkWidget* box_;
 };
 
-/// How high the label's text is in so much room, in points. Where people have letters so large that a line holds few words it
-/// takes twice the lines that the label says, and things with pictures stand below each other.
+/// How high the label's text is in so much room, in points. Where people have letters so large that a line holds few words
+/// it takes twice the lines that the label says, and things with pictures stand below each other.
 double heightOf(const Label& label, double width);
 
 /// The attributes that make a text as large as the font says.

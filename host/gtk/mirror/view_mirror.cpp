@@ -38,8 +38,8 @@ bool shows(const View& view) {
   return true;
 }
 
-/// Where the view is shown, in `origin`. A picture that is too large for the view that it is in would cover what stands beside
-/// that, so it comes as large as there is room for.
+/// Where the view is shown, in `origin`. A picture that is too large for the view that it is in would cover what stands
+/// beside that, so it comes as large as there is room for.
 Rect placeOf(const View& view, const View& origin) {
   const Rect frame = view.convertRectTo(view.bounds(), origin);
   const View* around = view.superview();
