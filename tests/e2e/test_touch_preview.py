@@ -61,6 +61,20 @@ class TouchPreview(unittest.TestCase):
         self.pinch(60, 120)
         wait_for("twice the width", lambda: abs(self.app.find("Page 1 ")[4] - 2 * width) <= 0.1 * width)
 
+    def test_a_swipe_from_the_edge_leaves_a_portable_document(self):
+        # A width of which the fitting page was wider by some millionths of a pixel, and the swipe scrolled that.
+        self.app.resize(360, 720)
+        self.open("Documents", "Contract.pdf")
+        page = [None]
+
+        def rests():
+            row = self.app.find("Page 1 ")
+            page[0], same = row, row is not None and row == page[0]
+            return same
+        wait_for("the page to rest", rests)
+        self.app.desktop.screen.drag((12, 350), (330, 350), 0.25)
+        self.app.wait_gone("Page 1 ")
+
 
 if __name__ == "__main__":
     unittest.main()

@@ -8,6 +8,8 @@ namespace vaelo {
 
 namespace {
 
+constexpr double LeastScroll = 0.5;  // pixels
+
 struct PagesArea {
   GtkWidget parent;
   PagesCanvas* canvas;  // null when it is gone
@@ -138,7 +140,8 @@ void PagesCanvas::configure(double x, double y) {
   const double values[2] = {x, y};
   for (std::size_t i = 0; i < 2; ++i) {
     if (!adjustments_[i]) continue;
-    const double upper = std::max(widths[i], pages[i]);
+    // What fits but for the rounding of numbers has nothing to scroll: it would take the swipe that goes back for that.
+    const double upper = widths[i] < pages[i] + LeastScroll ? pages[i] : widths[i];
     const double value = std::clamp(values[i], 0.0, upper - pages[i]);
     gtk_adjustment_configure(adjustments_[i], value, 0, upper, pages[i] * 0.1, pages[i] * 0.9, pages[i]);
   }
