@@ -10,6 +10,9 @@ namespace vaelo {
 
 namespace {
 
+/// The library takes no more of this once there is a thread, of which tests before these may have made one.
+const GLibLog beforeAnyThread;
+
 class FilesLogTest : public testing::Test {
  protected:
   FilesLogTest() { g_unsetenv("G_MESSAGES_DEBUG"); }
