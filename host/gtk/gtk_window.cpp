@@ -36,6 +36,10 @@ GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds, Dr
   const GRef<GMenuItem> grid(g_menu_item_new(_("View as _Grid"), "narrow.grid"));
   g_menu_item_set_attribute(grid.get(), "hidden-when", "s", "action-missing");
   g_menu_append_item(menu_, grid.get());
+  const GRef<GMenuItem> tagsOfItem(g_menu_item_new(_("_Tags…"), "details.tags"));
+  g_menu_item_set_attribute(tagsOfItem.get(), "hidden-when", "s", "action-missing");
+  g_menu_item_set_attribute(tagsOfItem.get(), "accel", "s", "<Control>t");
+  g_menu_append_item(menu_, tagsOfItem.get());
   g_menu_append(menu_, _("Select A_ll"), "win.select-all");
   g_menu_append(menu_, _("_Refresh"), "win.refresh");
   g_menu_append(menu_, _("A_ccounts…"), "app.accounts");

@@ -81,6 +81,12 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
     gtk_box_append(GTK_BOX(box_), mirror_->widget());
     if (const auto details = std::dynamic_pointer_cast<PreviewDetailsViewController>(screen_)) {
       tags_ = std::make_unique<DetailsTags>(details, mirror_->widget(), tags);
+      // For the window's menu: an item without tags has no row of them to be pressed.
+      const GRef<GSimpleActionGroup> actions(g_simple_action_group_new());
+      const GRef<GSimpleAction> show(g_simple_action_new("tags", nullptr));
+      g_signal_connect_swapped(show.get(), "activate", G_CALLBACK(+[](ScreenPage* self) { self->showTags(); }), this);
+      g_action_map_add_action(G_ACTION_MAP(actions.get()), G_ACTION(show.get()));
+      gtk_widget_insert_action_group(box_, "details", G_ACTION_GROUP(actions.get()));
     }
   }
   gtk_widget_add_css_class(toolbar_, "toolbar");
@@ -99,6 +105,7 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
 
 ScreenPage::~ScreenPage() {
   preview_.reset();  // while there is a bar that it may change
+  gtk_widget_insert_action_group(box_, "details", nullptr);
   tags_.reset();
   mirror_.reset();
   g_signal_handlers_disconnect_by_data(back_, this);

@@ -88,6 +88,25 @@ class Tags(unittest.TestCase):
         wait_for("Garden among the tags", is_offered)
         self.assertIsNone(self.app.find("Red", "check box"))
 
+    def test_the_menu_of_the_details_leads_to_the_first_tag(self):
+        app = self.app
+        app.key("F10")
+        app.wait("Refresh", "menu item")
+        self.assertIsNone(app.find("Tags…", "menu item"), "there is no item that it could mean")
+        app.key("Escape")
+        app.wait_gone("Refresh")
+        app.click("Photo.png", "list item", button=3)
+        app.wait("Info", "menu item")
+        app.key("i")
+        wait_for("the facts", lambda: app.find("Kind", "label"))
+        app.key("F10")
+        app.wait("Tags…", "menu item")
+        app.key("t")
+        app.wait("New tag")
+        app.wait("Red", "check box")
+        app.key("space")
+        wait_for("the tag", lambda: "user.xdg.tags" in os.listxattr(app.drive / "Photo.png"))
+
     def test_a_missing_thumbnail_is_made(self):
         cache = self.app.base / "cache" / "thumbnails" / "normal"
         wait_for("the thumbnail", lambda: cache.is_dir() and list(cache.glob("*.png")))
