@@ -2,14 +2,15 @@
 """What people do with items, and what the application asks and answers."""
 from .stage import furnish
 
-NAMES = ("item-menu", "share", "tags", "rename", "rename-taken", "delete-one", "select", "new-folder", "delete-many",
-         "picker-libraries", "move-taken", "undo", "refusal", "delete-library")
+NAMES = ("item-menu", "share", "tags", "rename", "rename-taken", "rename-forbidden", "delete-one", "select", "new-folder",
+         "delete-many", "picker-libraries", "move-taken", "moves-taken", "undo", "refusal", "delete-library")
 SKETCHBOOK = {"rtl": "دفتر الرسم"}
 
 
 def prepare(app):
     furnish(app)
-    (app.drive / "Documents" / "Projects" / "Minutes 1.txt").write_text("Minutes of another meeting\n")
+    for name in ("Minutes 1.txt", "Minutes 2.txt"):
+        (app.drive / "Documents" / "Projects" / name).write_text("Minutes of another meeting\n")
 
 
 def item_menu(stage, item):
@@ -41,6 +42,10 @@ def one_item(stage):
     app.key("Return")
     stage.wait("Name is already taken")
     stage.shot("rename-taken")
+    app.key("ctrl+a")
+    app.type("Draft/Contract.pdf")
+    stage.wait("Character not allowed in filename")
+    stage.shot("rename-forbidden")
     app.key("Escape")
     stage.wait_gone("Enter a new name for this item.")
     app.key("Delete")
@@ -73,18 +78,33 @@ def several_items(stage):
 
 def move(stage, item, picture=None):
     """To the folder Projects beside it."""
-    app = stage.app
     item_menu(stage, item)
     stage.choose("_Move…")
     stage.wait("Cancel", "push button")
     stage.settle()
     if picture:
         stage.shot(picture)
+    to_projects(stage)
+
+
+def to_projects(stage):
+    app = stage.app
     for folder in ("documents", "projects"):
         stage.to_row(folder)
         app.key("Return")
         app.wait(folder.capitalize(), "label")
     stage.press("Move")
+
+
+def move_several(stage):
+    stage.click("Select")
+    stage.wait("New Folder", "push button")
+    for name in ("Minutes 1.txt", "Minutes 2.txt", "Minutes 10.txt"):
+        stage.app.click(name, "list item")
+    stage.click("Move")
+    stage.wait("Cancel", "push button")
+    stage.settle()
+    to_projects(stage)
 
 
 def play(stage):
@@ -99,6 +119,11 @@ def play(stage):
     stage.shot("move-taken")
     app.key("Escape")
     stage.wait_gone("An item named “%@” already exists in the new location.")
+    move_several(stage)
+    stage.wait("OK", "push button")
+    stage.shot("moves-taken")
+    app.key("Escape")
+    stage.wait_gone("OK")
     move(stage, "Budget 2026.csv")
     stage.wait("Undo", "push button")
     stage.shot("undo")
