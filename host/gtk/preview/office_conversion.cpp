@@ -102,7 +102,9 @@ struct OfficeConversion::State {
                                               "--norestore", "--nolockcheck", "--convert-to", "pdf", "--outdir", out.c_str(),
                                               path.c_str(), nullptr));
     if (!process) return false;
-    group = static_cast<pid_t>(std::atoi(g_subprocess_get_identifier(process.get())));
+    // One that has ended by now has none any more.
+    const char* identifier = g_subprocess_get_identifier(process.get());
+    group = identifier ? static_cast<pid_t>(std::atoi(identifier)) : 0;
     return true;
   }
 
