@@ -5,6 +5,7 @@
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
 #include "items/file_utils.h"
+#include "platform/localized.h"
 #include "platform/platform.h"
 
 namespace vaelo {
@@ -45,6 +46,7 @@ FolderPicker::~FolderPicker() {
   g_signal_handlers_disconnect_by_data(back_, this);
   g_signal_handlers_disconnect_by_data(move_, this);
   g_signal_handlers_disconnect_by_data(newFolder_, this);
+  if (prompt_ && prompt_->alert()->presentingViewController()) prompt_->alert()->dismissViewControllerAnimated(false);
   gtk_window_destroy(GTK_WINDOW(window_));
 }
 
@@ -186,51 +188,23 @@ void FolderPicker::choose() {
 }
 
 void FolderPicker::askForNewFolder() {
-  GtkWidget* dialog = adw_message_dialog_new(GTK_WINDOW(window_), _("New Folder"), _("Enter a name for this folder."));
-  GtkWidget* entry = gtk_entry_new();
-  gtk_entry_set_placeholder_text(GTK_ENTRY(entry), _("Folder Name"));
-  gtk_entry_set_activates_default(GTK_ENTRY(entry), TRUE);
-  gtk_accessible_update_property(GTK_ACCESSIBLE(entry), GTK_ACCESSIBLE_PROPERTY_LABEL, _("Folder Name"), -1);
-  adw_message_dialog_set_extra_child(ADW_MESSAGE_DIALOG(dialog), entry);
-  adw_message_dialog_add_responses(ADW_MESSAGE_DIALOG(dialog), "cancel", _("_Cancel"), "create", _("C_reate"), nullptr);
-  adw_message_dialog_set_default_response(ADW_MESSAGE_DIALOG(dialog), "create");
-  adw_message_dialog_set_response_enabled(ADW_MESSAGE_DIALOG(dialog), "create", FALSE);
-  g_signal_connect(entry, "changed", G_CALLBACK(+[](GtkEditable* changed, AdwMessageDialog* shown) {
-                     const std::string name =
-                         Platform::current().characterClasses.trimmingWhitespaceAndNewlines(gtk_editable_get_text(changed));
-                     adw_message_dialog_set_response_enabled(shown, "create", FileUtils::isValidFilename(name));
-                   }),
-                   dialog);
-  g_signal_connect_object(dialog, "response::create", G_CALLBACK(+[](AdwMessageDialog* shown, char*, GtkWidget* window) {
-                            auto* self = static_cast<FolderPicker*>(g_object_get_data(G_OBJECT(window), "vaelo-picker"));
-                            GtkWidget* typed = adw_message_dialog_get_extra_child(shown);
-                            self->makeFolder(Platform::current().characterClasses.trimmingWhitespaceAndNewlines(
-                                gtk_editable_get_text(GTK_EDITABLE(typed))));
-                          }),
-                          window_, static_cast<GConnectFlags>(0));
-  g_object_set_data(G_OBJECT(window_), "vaelo-picker", this);
-  gtk_window_present(GTK_WINDOW(dialog));
+  prompt_ = NewFolderPrompt::newWithTitleDoneButtonTextCompletion(
+      localized("New Folder"), localized("Create"), [weak = weak_from_this()](const std::string& name, bool& accepted) {
+        const auto self = weak.lock();
+        return self ? self->makeFolder(name, accepted) : std::string();
+      });
+  picker_->presentViewController(prompt_->alert(), true);
 }
 
-void FolderPicker::makeFolder(const std::string& name) {
+/// Answers what is wrong with the name, or with the folder that is to have it.
+std::string FolderPicker::makeFolder(const std::string& name, bool& accepted) {
   const URL made = way_.back().appendingPathComponent(name, true);
-  worker_.run([this, made]() -> std::function<void()> {
-    std::optional<Error> error;
-    if (FileUtils::exists(made)) {
-      error = Error{FileErrorDomain, FileErrorCode::WriteFileExists, {}, {}, {}};
-    } else {
-      error = FileUtils::mkdir(made);
-    }
-    return [this, made, error] {
-      if (way_.back() != made.deletingLastPathComponent()) return;  // the user has walked on
-      if (!error) {
-        goTo(made);
-        return;
-      }
-      gtk_label_set_text(GTK_LABEL(refusal_), UIUtils::bestMessage(error).c_str());
-      gtk_widget_set_visible(refusal_, TRUE);
-    };
-  });
+  const std::optional<Error> error =
+      FileUtils::exists(made) ? Error{FileErrorDomain, FileErrorCode::WriteFileExists, {}, {}, {}} : FileUtils::mkdir(made);
+  accepted = !error;
+  if (error) return UIUtils::bestMessage(error);
+  goTo(made);
+  return "";
 }
 
 }  // namespace vaelo

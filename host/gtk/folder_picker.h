@@ -7,6 +7,7 @@
 #include <string>
 #include <vector>
 
+#include "fileops/new_folder_prompt.h"
 #include "host/gtk/list/folder_view.h"
 #include "host/gtk/list/worker.h"
 #include "host/gtk/move_targets.h"
@@ -16,13 +17,15 @@ namespace vaelo {
 
 /// The window in which the user walks to the folder that items are to move to. It lives while its picker is presented. Main
 /// thread.
-class FolderPicker {
+class FolderPicker : public std::enable_shared_from_this<FolderPicker> {
  public:
   /// `over` is the window that it belongs to.
   FolderPicker(std::shared_ptr<DocumentTargetSelectionController> picker, CloudDocuments& drive, GtkWindow* over);
   ~FolderPicker();
   FolderPicker(const FolderPicker&) = delete;
   FolderPicker& operator=(const FolderPicker&) = delete;
+
+  GtkWindow* window() const { return GTK_WINDOW(window_); }
 
  private:
   void build(GtkWindow* over);
@@ -31,7 +34,7 @@ class FolderPicker {
   void show(const URL& folder, MoveTarget target);
   void choose();
   void askForNewFolder();
-  void makeFolder(const std::string& name);
+  std::string makeFolder(const std::string& name, bool& accepted);
   std::string titleOf(const URL& folder) const;
   std::string invitation() const;
 
@@ -45,6 +48,7 @@ class FolderPicker {
   GtkWidget* move_ = nullptr;
   GtkWidget* newFolder_ = nullptr;
   GtkWidget* refusal_ = nullptr;
+  std::shared_ptr<NewFolderPrompt> prompt_;  ///< the latest
   FolderView view_;
   Worker worker_;
 };

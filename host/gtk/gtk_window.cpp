@@ -210,7 +210,8 @@ void GtkWindowHost::present(const ViewControllerRef&, const ViewControllerRef& p
     sheets_[presented.get()] =
         std::make_unique<ActionSheet>(alert, self, [this, key = presented.get()] { sheets_.erase(key); });
   } else if (alert) {
-    dialogs_[presented.get()] = showAlertDialog(alert, widget(), std::move(done));
+    GtkWindow* over = folderPicker_ ? folderPicker_->window() : widget();
+    dialogs_[presented.get()] = showAlertDialog(alert, over, std::move(done));
     return;
   }
   if (const auto screen = std::dynamic_pointer_cast<HostDialog>(presented)) {

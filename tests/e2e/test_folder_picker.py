@@ -43,6 +43,23 @@ class FolderPicker(ItemsWindow):
         wait_for("the item", (made / "Second.txt").exists)
         self.on_disk("Second.txt", False)
 
+    def test_a_name_that_cannot_be_is_told_and_the_prompt_stays(self):
+        self.open_picker()
+        self.press("New Folder")
+        self.app.wait("Enter a name for this folder.")
+        self.app.type("a/b")
+        self.app.wait("Character not allowed in filename")
+        self.app.key("ctrl+a")
+        self.app.type("Plans")
+        self.app.wait_gone("Character not allowed in filename")
+        self.app.key("Return")
+        self.app.wait("Name is already taken")
+        self.app.key("Escape")
+        self.app.wait_gone("Enter a name for this folder.")
+        self.press("Cancel")
+        self.app.wait_gone("Move “Second.txt” to")
+        self.on_disk("Second.txt")
+
     def test_a_library_without_folders_takes_the_item_but_no_folder(self):
         before = content(self.drive.parent)
         self.open_picker()
