@@ -39,6 +39,11 @@ void launched(GObject* app, GAsyncResult* result, gpointer held) {
 
 }  // namespace
 
+bool needsTerminal(GAppInfo* app) {
+  return G_IS_DESKTOP_APP_INFO(app) &&
+         g_desktop_app_info_get_boolean(G_DESKTOP_APP_INFO(app), "Terminal");  // not for people
+}
+
 bool launchApplication(GAppInfo* app, const std::vector<std::string>& uris, GAppLaunchContext* context,
                        LaunchFailed failed) {
   GList* list = nullptr;

@@ -5,6 +5,7 @@
 
 #include <algorithm>
 
+#include "host/desktop/application_launch.h"
 #include "host/desktop/content_type.h"
 #include "host/support/glib_ptr.h"
 
@@ -13,12 +14,6 @@ namespace vaelo {
 namespace {
 
 std::string text(const char* value) { return value ? value : ""; }
-
-/// Where a finger would find nothing to touch, if the desktop has a terminal at all.
-bool needsTerminal(GAppInfo* app) {
-  return G_IS_DESKTOP_APP_INFO(app) &&
-         g_desktop_app_info_get_boolean(G_DESKTOP_APP_INFO(app), "Terminal");  // not for people
-}
 
 ApplicationRecord recordOf(GAppInfo* app) {
   constexpr std::string_view suffix = ".desktop";

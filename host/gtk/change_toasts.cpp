@@ -37,6 +37,7 @@ ChangeToasts::~ChangeToasts() {
   drive_.removals().setObserver(nullptr);
   g_clear_weak_pointer(&undo_);
   g_clear_weak_pointer(&removal_);
+  g_clear_weak_pointer(&told_);
 }
 
 std::string ChangeToasts::folderName(const URL& folder) const {
@@ -84,6 +85,8 @@ void ChangeToasts::removalWent(const TreeRemovals::News& news) {
   switch (news.stage) {
     case Stage::Waiting: {
       forget(removal_);
+      // Messages wait for each other: it would come again after this one, when it is true no more.
+      forget(told_);
       const std::string text =
           filled(ngettext("Deleting “%s” and its %s item…", "Deleting “%s” and its %s items…", news.total - 1),
                  {name, number(news.total - 1)});
@@ -116,8 +119,11 @@ void ChangeToasts::removalWent(const TreeRemovals::News& news) {
   }
 }
 
-void ChangeToasts::say(const std::string& text) const {
-  if (const auto window = screens_.window()) window->showToast(text);
+void ChangeToasts::say(const std::string& text) {
+  const auto window = screens_.window();
+  if (!window) return;
+  forget(told_);
+  g_set_weak_pointer(&told_, window->showToast(text));
 }
 
 }  // namespace vaelo

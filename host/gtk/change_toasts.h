@@ -28,13 +28,14 @@ class ChangeToasts {
   void removalWent(const TreeRemovals::News& news);
   std::string textFor(const MoveHistory::Batch& batch) const;
   std::string folderName(const URL& folder) const;
-  void say(const std::string& text) const;
+  void say(const std::string& text);
 
   GtkScreens& screens_;
   LocalCloudDocuments& drive_;
   MoveHistory& moves_;
   AdwToast* undo_ = nullptr;     // weak pointer
   AdwToast* removal_ = nullptr;  // weak pointer
+  AdwToast* told_ = nullptr;     // how the latest removal ended; weak pointer
 };
 
 }  // namespace vaelo

@@ -289,10 +289,11 @@ void GtkWindowHost::escape() {
   }
 }
 
-void GtkWindowHost::showToast(const std::string& text, bool stays) {
+AdwToast* GtkWindowHost::showToast(const std::string& text, bool stays) {
   AdwToast* toast = makeToast(text);
   if (stays) adw_toast_set_timeout(toast, 0);
   adw_toast_overlay_add_toast(ADW_TOAST_OVERLAY(toasts_), toast);
+  return toast;
 }
 
 AdwToast* GtkWindowHost::showToast(const std::string& text, const char* button, std::function<void()> pressed,

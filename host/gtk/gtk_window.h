@@ -32,7 +32,7 @@ class GtkWindowHost : public Window, private NavigationHost, private Presentatio
   /// Holds the pages and the messages over them as its child; what lies over them all is put on it.
   GtkOverlay* overlay() const { return GTK_OVERLAY(overlay_); }
   /// A short message at the bottom of the window. One that stays goes when the user closes it.
-  void showToast(const std::string& text, bool stays = false);
+  AdwToast* showToast(const std::string& text, bool stays = false);
   /// One at once, with a button that calls `pressed`; it goes after `seconds`, or with 0 when it is dismissed. Its custom
   /// title is a GtkLabel. Owned by the window.
   AdwToast* showToast(const std::string& text, const char* button, std::function<void()> pressed, unsigned seconds);

@@ -5,6 +5,8 @@
 
 #include <algorithm>
 
+#include "host/desktop/application_launch.h"
+#include "host/desktop/application_launch.h"
 #include "host/desktop/bluetooth_sender.h"
 #include "host/desktop/mail_composer.h"
 #include "host/desktop/recent_documents.h"
@@ -72,7 +74,7 @@ void ShareActions::addApplicationRows(std::vector<ShareRow>& rows) {
     const std::shared_ptr<GAppInfo> app(G_APP_INFO(g_object_ref(at->data)), g_object_unref);
     const char* id = g_app_info_get_id(app.get());
     const bool takesFiles = g_app_info_supports_files(app.get()) || g_app_info_supports_uris(app.get());
-    if (!id || !takesFiles || std::find(ids.begin(), ids.end(), id) != ids.end()) continue;
+    if (!id || !takesFiles || needsTerminal(app.get()) || std::find(ids.begin(), ids.end(), id) != ids.end()) continue;
     ids.emplace_back(id);
     rows.push_back({filled(_("Open in “%s”"), {nameOf(app.get())}), "application-x-executable-symbolic",
                     g_app_info_get_icon(app.get()), item_.downloaded, [self, app] { self->openWith(app.get()); }});

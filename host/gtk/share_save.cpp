@@ -81,14 +81,18 @@ class Saving {
     if (!window) return;
     switch (outcome.kind) {
       case CopyOutcome::Kind::Cancelled:
-        return window->showToast(_("No copy was saved."));
+        window->showToast(_("No copy was saved."));
+        return;
       case CopyOutcome::Kind::Failed:
         return showMessage(window->widget(), _("The Copy Could Not Be Saved"),
                            filled(_("“%s”: %s"), {name, outcome.reason}));
       case CopyOutcome::Kind::Copied:
         break;
     }
-    if (outcome.notCopied == 0) return window->showToast(filled(_("Saved a copy of “%s”."), {name}));
+    if (outcome.notCopied == 0) {
+      window->showToast(filled(_("Saved a copy of “%s”."), {name}));
+      return;
+    }
     showMessage(window->widget(), _("The Copy Is Not Complete"),
                 filled(ngettext("%s item in “%s” is not downloaded and was left out of the copy.",
                                 "%s items in “%s” are not downloaded and were left out of the copy.",

@@ -2,7 +2,7 @@
 """Deletions in a real window, their question, and how they are called off; each seen on the disk."""
 import unittest
 
-from harness import PROGRAM, wait_for
+from harness import PROGRAM, pause, wait_for
 from items_window import ItemsWindow, content
 
 
@@ -91,6 +91,15 @@ class Deletions(ItemsWindow):
         app.wait("“Plans” is back, with everything in it.")
         self.assertEqual(content(self.drive), before)
         app.wait("Plans", "list item")
+        self.menu("Plans", "d")
+        app.wait("Delete from Vaelo Drive")
+        self.delete_for_good()
+        app.wait("Deleting “Plans”")
+        app.wait_gone("“Plans” is back")
+        wait_for("nothing of it to be left", lambda: not self.held())
+        app.wait_gone("Deleting “Plans”")
+        pause(0.5)  # in which the next message would come
+        self.assertIsNone(app.find("“Plans” is back"), "of the time before")
 
     def test_a_large_folder_goes_though_the_program_ends(self):
         app = self.app

@@ -45,6 +45,7 @@ def install_application(app, identifier, name, types, more=""):
 def install_applications(app):
     install_application(app, "org.example.Table", "Table", "text/csv;")
     install_application(app, "org.example.Post", "Post", "x-scheme-handler/mailto;")
+    install_application(app, "org.example.Lines", "Lines", "text/csv;", "Terminal=true\n")
     programs = app.base / "bin"
     programs.mkdir()
     sender = programs / "bluetooth-sendto"
@@ -53,7 +54,7 @@ def install_applications(app):
     app.desktop.environment["PATH"] = f"{programs}:{os.environ['PATH']}"
     applications = app.base / "data" / "applications"
     (applications / "mimeinfo.cache").write_text(
-        "[MIME Cache]\ntext/csv=org.example.Table.desktop;\nx-scheme-handler/mailto=org.example.Post.desktop;\n")
+        "[MIME Cache]\ntext/csv=org.example.Lines.desktop;org.example.Table.desktop;\nx-scheme-handler/mailto=org.example.Post.desktop;\n")
 
 
 class Share(unittest.TestCase):
@@ -111,6 +112,11 @@ class Wide(Share):
         self.app.wait("Opening “Budget 2026.csv” in Table…")
         self.assertEqual(self.record("org.example.Table"), [str(self.document)])
         self.app.wait_gone("Copy Link")
+
+    def test_a_program_for_a_terminal_is_none_of_the_first(self):
+        self.share()
+        self.assertTrue(self.rows()[0][1].startswith("Open in “Table”"), self.rows()[0])
+        self.assertIsNone(self.app.find("Open in “Lines”"))
 
     def test_an_application_that_is_gone_is_told(self):
         self.share()
