@@ -6,7 +6,6 @@
 #include <algorithm>
 
 #include "host/desktop/application_launch.h"
-#include "host/desktop/application_launch.h"
 #include "host/desktop/bluetooth_sender.h"
 #include "host/desktop/mail_composer.h"
 #include "host/desktop/recent_documents.h"
