@@ -25,14 +25,6 @@ namespace {
 
 constexpr const char* OwnIcon = "com.marrow.VaeloDrive";
 
-/// The desktop knows it only where the application is installed.
-void findOwnIcon(GdkDisplay* display) {
-  GtkIconTheme* theme = gtk_icon_theme_get_for_display(display);
-  if (gtk_icon_theme_has_icon(theme, OwnIcon)) return;
-  const std::string folder = ownFolder("icons", "share/icons", std::string("hicolor/scalable/apps/") + OwnIcon + ".svg");
-  if (!folder.empty()) gtk_icon_theme_add_search_path(theme, folder.c_str());
-}
-
 constexpr unsigned IdleServiceEnds = 30000;  // milliseconds without a call from the desktop
 
 bool hasOption(GApplicationCommandLine* line, const char* name) {
@@ -329,7 +321,6 @@ void GtkApplicationLoop::showAccounts() {
 void GtkApplicationLoop::showAbout() {
   const auto window = screens_.window();
   if (!window) return;
-  findOwnIcon(gtk_widget_get_display(GTK_WIDGET(window->widget())));
   adw_show_about_window(window->widget(), "application-name", "Vaelo Drive", "application-icon", OwnIcon, "version",
                         VAELO_VERSION, "license-type", GTK_LICENSE_GPL_3_0, "comments",
                         _("Browse and manage the documents of your cloud drive."), "translator-credits",
