@@ -33,6 +33,10 @@ GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds, Dr
   // A message may stand at the bottom still when a sheet rises from there, whose answers it must not hide.
   gtk_overlay_set_child(GTK_OVERLAY(overlay_), toasts_);
   adw_application_window_set_content(window_, overlay_);
+  setToastRoom(ADW_TOAST_OVERLAY(toasts_), [this] {
+    const ScreenPage* page = topPage();
+    return ToastRoom{static_cast<int>(this->bounds().width), page ? page->toolbarHeight() : 0};
+  });
   const GRef<GMenuItem> grid(g_menu_item_new(_("View as _Grid"), "narrow.grid"));
   g_menu_item_set_attribute(grid.get(), "hidden-when", "s", "action-missing");
   g_menu_append_item(menu_, grid.get());
@@ -67,6 +71,7 @@ GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds, Dr
 GtkWindowHost::~GtkWindowHost() {
   setPresentationHost(nullptr);
   if (const auto controller = navigation()) controller->setHost(nullptr);
+  setToastRoom(ADW_TOAST_OVERLAY(toasts_), [] { return ToastRoom(); });
   g_signal_handlers_disconnect_by_data(window_, this);
   if (surface()) g_signal_handlers_disconnect_by_data(surface(), this);
   sheets_.clear();
@@ -176,6 +181,7 @@ void GtkWindowHost::stackChanged(const Stack&, const Stack& newStack, bool anima
     if (!page) {
       page = std::make_unique<ScreenPage>(
           screen, [this] { goBack(); }, G_MENU_MODEL(menu_), tags_);
+      page->onToolbarShown([this] { fitToasts(ADW_TOAST_OVERLAY(toasts_)); });
       if (makeBanner_) page->setBanner(makeBanner_());
       page->setToolbarHidden(!controller || controller->toolbarHidden());
       page->setNarrow(traitCollection().horizontalSizeClass == SizeClass::Compact);
@@ -254,6 +260,7 @@ void GtkWindowHost::followTop() {
   topToken_.reset();
   GAction* selects = g_action_map_lookup_action(G_ACTION_MAP(window_), "select-all");
   g_simple_action_set_enabled(G_SIMPLE_ACTION(selects), std::dynamic_pointer_cast<DocumentListController>(top) != nullptr);
+  fitToasts(ADW_TOAST_OVERLAY(toasts_));
   if (!top) return;
   const auto follow = [this](NavigationItem& item) { stack_.setSwipesBack(!item.hidesBackButton()); };
   topToken_ = top->navigationItem().changed().connect(follow);
@@ -342,6 +349,7 @@ void GtkWindowHost::sizeChanged() {
     page->setNarrow(traitCollection().horizontalSizeClass == SizeClass::Compact);
   }
   resize(Size{static_cast<double>(width), static_cast<double>(height)}, false);
+  fitToasts(ADW_TOAST_OVERLAY(toasts_));
   keyboard_.windowResized(width, height);
 }
 

@@ -125,6 +125,17 @@ void ScreenPage::setToolbarHidden(bool hidden) {
   showToolbar();
 }
 
+int ScreenPage::toolbarHeight() const {
+  int height = 0;
+  for (GtkWidget* widget : {toolbarEdge_, toolbar_}) {
+    int natural = 0;
+    if (gtk_widget_get_visible(widget))
+      gtk_widget_measure(widget, GTK_ORIENTATION_VERTICAL, -1, nullptr, &natural, nullptr, nullptr);
+    height += natural;
+  }
+  return height;
+}
+
 void ScreenPage::setNarrow(bool narrow) {
   if (narrow == narrow_) return;
   narrow_ = narrow;
@@ -223,6 +234,7 @@ void ScreenPage::showToolbar() {
   const bool shows = !buttons.empty() || (!toolbarHidden_ && !screen_->toolbarItems().empty());
   for (GtkWidget* widget : {toolbarEdge_, toolbar_}) gtk_widget_set_visible(widget, shows);
   keepFocus();
+  if (toolbarShown_) toolbarShown_();
 }
 
 }  // namespace vaelo

@@ -5,6 +5,7 @@
 
 #include <functional>
 #include <memory>
+#include <utility>
 
 #include "platform/ui/view_controller.h"
 
@@ -42,6 +43,10 @@ class ScreenPage {
   void setBanner(GtkWidget* banner);
   void setCanGoBack(bool can);
   void setToolbarHidden(bool hidden);
+  /// 0 while there is none.
+  int toolbarHeight() const;
+  /// Calls when the toolbar has come or gone, or may have another height.
+  void onToolbarShown(std::function<void()> shown) { toolbarShown_ = std::move(shown); }
   /// On a narrow window the title needs the room of the buttons that a phone's windows don't have, and of those that can
   /// be in the menu.
   void setNarrow(bool narrow);
@@ -67,6 +72,7 @@ class ScreenPage {
   std::vector<GtkWidget*> hostWidgets_;
   std::vector<GtkWidget*> barWidgets_;
   std::function<void()> goBack_;
+  std::function<void()> toolbarShown_;
   std::unique_ptr<PreviewPage> preview_;
   std::unique_ptr<ViewMirror> mirror_;  // of a screen that has neither content nor a preview
   std::unique_ptr<DetailsTags> tags_;

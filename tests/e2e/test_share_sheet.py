@@ -292,7 +292,10 @@ class Phone(Share):
         self.share()
         wait_for("the sheet to have risen", lambda: self.app.find("Save a Copy…")[3] > 600)
         self.app.click("Open in “Table”", "list item")
-        self.app.wait("Opening “Budget 2026.csv” in Table…")
+        said = "Opening “Budget 2026.csv” in Table…"
+        self.app.wait(said)
+        bar = self.app.wait("Share", "push button")
+        wait_for("the message above the bar", lambda: sum(self.app.find(said)[i] for i in (3, 5)) < bar[3])
         self.assertEqual(self.record("org.example.Table"), [str(self.document)])
 
 
