@@ -125,6 +125,49 @@ TEST_F(FolderViewTest, ManyChangesASecondAllArrive) {
   EXPECT_EQ(view_->nameAt(0), "file 1");
 }
 
+TEST_F(FolderViewTest, ARowFollowsWhatComesIntoAndLeavesItsFolder) {
+  folder_.makeFolder("Plans");
+  folder_.write("Plans/a");
+  open();
+  const auto counts = [&](const std::string& text) {
+    return waitUntil([&] {
+      FolderItem* item = view_->model().liveItem("Plans");
+      return item && item->details && item->details->secondLine == text;
+    });
+  };
+  ASSERT_TRUE(counts("1 item"));
+  folder_.write("Plans/b");
+  EXPECT_TRUE(counts("2 items"));
+  folder_.remove("Plans/a");
+  folder_.remove("Plans/b");
+  EXPECT_TRUE(counts("0 items"));
+  std::filesystem::rename(folder_.path() + "/Plans", folder_.path() + "/Beds");
+  ASSERT_TRUE(waitUntil([&] { return names() == std::vector<std::string>{"Beds"}; }));
+  folder_.makeFolder("Plans");
+  folder_.write("Plans/c");
+  EXPECT_TRUE(counts("1 item"));
+}
+
+TEST_F(FolderViewTest, RowsOfSuppliedEntriesFollowTheirFolders) {
+  folder_.makeFolder("Library");
+  folder_.makeFolder("Library/Documents");
+  folder_.write("Library/Documents/a");
+  const std::string path = folder_.path() + "/Library/Documents";
+  view_->setEntries({{"Notes", path, EntryKind::Folder}});
+  const auto counts = [&](const std::string& text) {
+    return waitUntil([&] {
+      FolderItem* item = view_->model().liveItem(path);
+      return item && item->details && item->details->secondLine == text;
+    });
+  };
+  ASSERT_TRUE(counts("1 item"));
+  folder_.remove("Library/Documents");
+  folder_.makeFolder("Library/Documents");
+  EXPECT_TRUE(counts("0 items")) << "another folder stands in its place";
+  folder_.write("Library/Documents/b");
+  EXPECT_TRUE(counts("1 item"));
+}
+
 TEST_F(FolderViewTest, VisibleRowsGetTheirDetails) {
   for (int i = 0; i < 300; ++i) folder_.write("file " + std::to_string(i), std::string(2500, 'x'));
   open();

@@ -10,23 +10,33 @@ namespace vaelo {
 namespace {
 
 constexpr std::size_t BatchSize = 16;
+constexpr std::size_t MostWatched = 256;  // more than the rows that are kept in a list
 
 struct Job {
   std::string name;
   EntryKind kind;
   std::shared_ptr<const ItemDetails> details;
+  int watch = -1;
 };
 
 }  // namespace
 
 DetailsLoader::DetailsLoader(FolderModel& model, std::function<void(FolderItem&)> loaded)
-    : model_(model), loaded_(std::move(loaded)) {}
+    : model_(model), loaded_(std::move(loaded)), contents_([this](const std::string& name) { contentChanged(name); }) {}
 
 void DetailsLoader::setFolder(const std::string& folder) {
   folder_ = folder;
   ++generation_;
   wanted_.clear();
   missing_.clear();
+  contents_.keep([](const std::string&) { return false; });
+}
+
+void DetailsLoader::contentChanged(const std::string& name) {
+  FolderItem* item = model_.liveItem(name);
+  if (!item) return;
+  item->detailsAreFresh = false;
+  if (item->row) gtk_widget_queue_draw(item->row);
 }
 
 void DetailsLoader::request(FolderItem& item) {
@@ -40,7 +50,7 @@ void DetailsLoader::readNext() {
   while (!wanted_.empty() && batch.size() < BatchSize) {
     FolderItem* item = model_.liveItem(wanted_.back());
     if (item && item->row) {
-      batch.push_back({item->name, item->kind, nullptr});
+      batch.push_back({item->name, item->kind, nullptr, -1});
     } else if (item) {
       item->detailsAreFresh = false;  // asks again when it is drawn again
     }
@@ -48,10 +58,19 @@ void DetailsLoader::readNext() {
   }
   reading_ = !batch.empty();
   if (!reading_) return;
-  worker_.run([this, generation = generation_, folder = folder_, pixels = thumbnailPixels_,
+  worker_.run([this, generation = generation_, folder = folder_, pixels = thumbnailPixels_, queue = contents_.queue(),
                jobs = std::move(batch)]() mutable -> std::function<void()> {
-    for (Job& job : jobs) job.details = readDetails(folder.empty() ? job.name : folder + "/" + job.name, job.kind, pixels);
+    for (Job& job : jobs) {
+      const std::string path = folder.empty() ? job.name : folder + "/" + job.name;
+      // Before it is counted, so that nothing is missed in between.
+      if (isListedAsFolder(job.kind)) job.watch = queue->watch(path);
+      job.details = readDetails(path, job.kind, pixels);
+    }
     return [this, generation, done = std::move(jobs)] {
+      for (const Job& job : done) contents_.add(job.watch, job.name);
+      if (contents_.size() > MostWatched) {
+        contents_.keep([this](const std::string& name) { return model_.liveItem(name) != nullptr; });
+      }
       if (generation == generation_) {
         for (const Job& job : done) {
           FolderItem* item = model_.liveItem(job.name);

@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "host/gtk/list/content_monitor.h"
 #include "host/gtk/list/folder_model.h"
 #include "host/gtk/list/worker.h"
 
@@ -15,6 +16,7 @@ namespace vaelo {
 /// Rows ask when they are drawn. The names go to a worker in small batches, the ones asked for last first, since they are
 /// what is on screen now; a row that shows something else by the time its turn comes costs nothing. Thumbnails that are
 /// missing are made by another worker, one at a time, likewise: a thumbnailer may take long, and texts do not wait for it.
+/// Folders whose items were counted are watched, and counted again when items come or go.
 class DetailsLoader {
  public:
   /// `loaded` is called for each item whose details came.
@@ -29,6 +31,7 @@ class DetailsLoader {
  private:
   void readNext();
   void makeNextThumbnail();
+  void contentChanged(const std::string& name);
   FolderItem* shownItem(const std::string& name);
 
   FolderModel& model_;
@@ -40,6 +43,7 @@ class DetailsLoader {
   bool making_ = false;
   std::vector<std::string> wanted_;
   std::vector<std::string> missing_;  // thumbnails
+  ContentMonitor contents_;
   Worker worker_;
   Worker maker_;
 };
