@@ -129,5 +129,41 @@ TEST(DetailsReader, CountsWhatAFolderLists) {
   EXPECT_EQ(readDetails(folder.path() + "/gone", EntryKind::Document, 40)->secondLine, "");
 }
 
+TEST(DetailsReader, ALinkThatLeadsNowhereSaysSo) {
+  const TestFolder folder;
+  folder.write("there");
+  std::filesystem::create_symlink("there", folder.path() + "/link");
+  std::filesystem::create_symlink("nowhere", folder.path() + "/broken");
+  std::filesystem::create_symlink("circle", folder.path() + "/circle");
+  EXPECT_EQ(readDetails(folder.path() + "/broken", EntryKind::Symlink, 40)->secondLine, "Broken link");
+  EXPECT_EQ(readDetails(folder.path() + "/broken", EntryKind::Symlink, 40)->shortLine, "Broken link");
+  EXPECT_EQ(readDetails(folder.path() + "/circle", EntryKind::Symlink, 40)->secondLine, "Broken link");
+  EXPECT_EQ(readDetails(folder.path() + "/link", EntryKind::Symlink, 40)->shortLine, "1 byte");
+}
+
+TEST(DetailsReader, APackageIsAsLargeAsItsFiles) {
+  const TestFolder folder;
+  folder.makeFolder("Trip.textbundle");
+  folder.makeFolder("Trip.textbundle/assets");
+  folder.write("Trip.textbundle/text.md", std::string(1500, 'x'));
+  folder.write("Trip.textbundle/.hidden", std::string(500, 'x'));
+  folder.write("Trip.textbundle/assets/map.png", std::string(1000, 'x'));
+  PromiseInfo info;
+  info.name = "film.mp4";
+  info.size = 5000;
+  ASSERT_FALSE(writePromise(folder.path() + "/Trip.textbundle/assets", info));
+  EXPECT_EQ(readDetails(folder.path() + "/Trip.textbundle", EntryKind::Package, 40)->shortLine, "8 KB");
+  folder.makeFolder("Empty.textbundle");
+  EXPECT_EQ(readDetails(folder.path() + "/Empty.textbundle", EntryKind::Package, 40)->shortLine.find("byte"),
+            std::string::npos);
+}
+
+TEST(DetailsReader, APackageOfVeryManyFilesKeepsNobodyWaiting) {
+  const TestFolder folder;
+  folder.makeFolder("Many.bundle");
+  for (int i = 0; i < 1001; ++i) folder.write("Many.bundle/" + std::to_string(i));
+  EXPECT_EQ(readDetails(folder.path() + "/Many.bundle", EntryKind::Package, 40)->shortLine.find("byte"), std::string::npos);
+}
+
 }  // namespace
 }  // namespace vaelo

@@ -9,8 +9,10 @@
 
 #include <array>
 #include <chrono>
+#include <filesystem>
 #include <initializer_list>
 #include <optional>
+#include <system_error>
 
 #include "host/drive/item_attributes.h"
 #include "host/drive/promise_file.h"
@@ -72,6 +74,27 @@ std::string nameWithoutExtension(const std::string& path) {
   return shown;
 }
 
+/// What the files of a package take together; 0 for one with so many that adding them up would keep other rows waiting.
+std::uint64_t packageSize(const std::string& path) {
+  constexpr int mostEntries = 1000;
+  std::uint64_t sum = 0;
+  int entries = 0;
+  std::error_code error;
+  constexpr auto options = std::filesystem::directory_options::skip_permission_denied;
+  for (std::filesystem::recursive_directory_iterator at(path, options, error), end; !error && at != end;
+       at.increment(error)) {
+    if (++entries > mostEntries) return 0;
+    const std::string file = at->path().string();
+    struct stat status;
+    if (isPromiseName(at->path().filename().string())) {
+      if (const auto promise = readPromise(file)) sum += promise.value->size;
+    } else if (lstat(file.c_str(), &status) == 0 && !S_ISDIR(status.st_mode)) {
+      sum += static_cast<std::uint64_t>(status.st_size);
+    }
+  }
+  return error ? 0 : sum;
+}
+
 }  // namespace
 
 std::shared_ptr<const ItemDetails> readDetails(const std::string& path, EntryKind kind, int thumbnailPixels) {
@@ -93,13 +116,17 @@ std::shared_ptr<const ItemDetails> readDetails(const std::string& path, EntryKin
     return details;
   }
   struct statx status;
-  if (statx(AT_FDCWD, path.c_str(), AT_STATX_DONT_SYNC, STATX_TYPE | STATX_SIZE | STATX_MTIME, &status) != 0) return details;
+  if (statx(AT_FDCWD, path.c_str(), AT_STATX_DONT_SYNC, STATX_TYPE | STATX_SIZE | STATX_MTIME, &status) != 0) {
+    if (kind == EntryKind::Symlink) setFacts(*details, {_("Broken link")});
+    return details;
+  }
   if (kind == EntryKind::Bookmark || kind == EntryKind::Alias || extensionIsHiddenAt(path)) {
     details->displayName = nameWithoutExtension(path);
   }
   const std::string date = dateText(static_cast<double>(status.stx_mtime.tv_sec));
   if (!S_ISREG(status.stx_mode)) {
-    setFacts(*details, {date});
+    const std::uint64_t size = kind == EntryKind::Package ? packageSize(path) : 0;
+    setFacts(*details, {size == 0 ? std::string() : sizeText(size), date});
     return details;
   }
   setFacts(*details, {sizeText(status.stx_size), date});
