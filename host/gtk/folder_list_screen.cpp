@@ -302,7 +302,6 @@ void FolderListScreen::queryTyped() {
 
 void FolderListScreen::beginSearch() {
   folderSearch_.stop();
-  found_.clear();
   if (!search_ || search_->query().empty()) {
     gtk_stack_set_visible_child(GTK_STACK(stack_), view_->widget());
     return;
@@ -312,8 +311,7 @@ void FolderListScreen::beginSearch() {
       Platform::current().log.write(LogType::Default, "search: can't read " + folder + ": " + reason);
     }
     if (report.entries.empty() && !report.finished) return;
-    found_.insert(found_.end(), report.entries.begin(), report.entries.end());
-    results_->setEntries(found_);
+    results_->setEntries(report.entries);
     gtk_stack_set_visible_child(GTK_STACK(stack_), results_->widget());
   });
 }

@@ -77,7 +77,6 @@ class FolderListScreen : public DocumentListController, public HostScreen {
   GtkWidget* searchBar_ = nullptr;
   GtkWidget* searchEntry_ = nullptr;
   GtkWidget* stack_ = nullptr;
-  std::vector<FolderEntry> found_;
   unsigned reportedRevision_ = 0;  ///< of the rows that reportItems() told last
   FolderSearch folderSearch_;
   std::shared_ptr<SearchController> search_;

@@ -1,11 +1,14 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/folder_search.h"
 
+#include <algorithm>
 #include <chrono>
+#include <iterator>
 #include <thread>
 #include <utility>
 
 #include "host/gtk/list/folder_reader.h"
+#include "host/gtk/list/name_order.h"
 #include "host/support/glib_ptr.h"
 
 namespace vaelo {
@@ -23,6 +26,13 @@ std::string folded(const std::string& name) {
 
 /// A name among others that may be read the other way.
 std::string isolated(const std::string& name) { return "\u2068" + name + "\u2069"; }
+
+bool standsBefore(const FolderEntry& left, const FolderEntry& right) {
+  const bool folder = isListedAsFolder(left.kind);
+  if (folder != isListedAsFolder(right.kind)) return folder;
+  const int order = compareNames(left.displayName, right.displayName);
+  return order == 0 ? left.path < right.path : order < 0;
+}
 
 struct Batch {
   FolderSearch::Report report;
@@ -77,16 +87,22 @@ class Searching {
   bool matches(const std::string& name) const { return folded(name).find(query_) != std::string::npos; }
   void add(FolderEntry entry) {
     ++count_;
-    waiting_.entries.push_back(std::move(entry));
+    latest_.push_back(std::move(entry));
     tellIfDue();
   }
   void tellIfDue() {
     constexpr std::chrono::milliseconds interval(100);
-    if (!waiting_.entries.empty() && std::chrono::steady_clock::now() - told_ >= interval) tell(false);
+    if (!latest_.empty() && std::chrono::steady_clock::now() - told_ >= interval) tell(false);
   }
   void tell(bool finished) {
     told_ = std::chrono::steady_clock::now();
     waiting_.finished = finished;
+    std::sort(latest_.begin(), latest_.end(), standsBefore);
+    const auto known = static_cast<std::ptrdiff_t>(entries_.size());
+    entries_.insert(entries_.end(), std::make_move_iterator(latest_.begin()), std::make_move_iterator(latest_.end()));
+    latest_.clear();
+    std::inplace_merge(entries_.begin(), entries_.begin() + known, entries_.end(), standsBefore);
+    waiting_.entries = entries_;
     auto* batch = new Batch{std::exchange(waiting_, {}), stopped_, found_};
     g_main_context_invoke_full(
         nullptr, G_PRIORITY_DEFAULT,
@@ -102,6 +118,8 @@ class Searching {
   std::shared_ptr<std::atomic<bool>> stopped_;
   std::shared_ptr<FolderSearch::Found> found_;
   FolderSearch::Report waiting_;
+  std::vector<FolderEntry> entries_;  // in their order
+  std::vector<FolderEntry> latest_;   // not among them yet
   std::chrono::steady_clock::time_point told_;
   std::size_t count_ = 0;
 };

@@ -15,10 +15,10 @@ namespace vaelo {
 /// followed. Main thread.
 class FolderSearch {
  public:
-  /// What was found since the last report.
   struct Report {
+    /// All that was found so far, in the order of a list; those of one name, by their paths.
     std::vector<FolderEntry> entries;
-    /// Folders that were passed over, each with the system's reason.
+    /// Folders that were passed over since the last report, each with the system's reason.
     std::vector<std::pair<std::string, std::string>> unreadable;
     bool finished = false;
   };

@@ -116,7 +116,7 @@ TEST_F(BadInputListTest, ASearchTellsWhatItPassesOverAndEnds) {
   std::vector<std::pair<std::string, std::string>> unreadable;
   bool finished = false;
   search.start({{folder_.path() + "/gone", ""}, {folder_.path(), ""}}, "wanted", [&](const FolderSearch::Report& report) {
-    found.insert(found.end(), report.entries.begin(), report.entries.end());
+    found = report.entries;
     unreadable.insert(unreadable.end(), report.unreadable.begin(), report.unreadable.end());
     finished = report.finished;
   });
