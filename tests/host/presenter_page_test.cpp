@@ -79,11 +79,13 @@ TEST_F(PresenterPageTest, APackageIsADocument) {
 TEST_F(PresenterPageTest, ADocumentThatComes) {
   promise("Table.unknown", 200);
   show(document);
-  ASSERT_TRUE(says("Not downloaded")) << said();
+  ASSERT_TRUE(says("Not downloaded\n\nIt opens here as soon as it is on this device.")) << said();
   EXPECT_EQ(progressShownIn(window), "");
   const std::string partial = DriveFileProgress::partialPathFor(document);
   write(partial, std::string(50, 'x'));
   ASSERT_TRUE(waitUntil([&] { return progressShownIn(window) == "Downloading… 25%"; }));
+  EXPECT_EQ(said().find("Not downloaded"), std::string::npos) << "it is on its way";
+  EXPECT_NE(said().find("200 bytes"), std::string::npos) << said();
   std::filesystem::remove(partial);
   ASSERT_TRUE(waitUntil([&] { return progressShownIn(window).empty(); }));
   EXPECT_TRUE(says("Not downloaded"));

@@ -92,17 +92,32 @@ void FactsPage::showValues(const URL& item, const ResourceMap& values, const std
     const std::string bytes = Platform::current().formatting.byteCount(size->second.unsignedValue(), ByteCountStyle::File);
     facts += (facts.empty() ? "" : "\n") + bytes;
   }
-  const bool here = isHere(values);
-  if (!here) facts += std::string("\n") + _("Not downloaded");
-  if (!message.empty()) facts += "\n\n" + message;
+  here_ = isHere(values);
+  facts_ = facts;
+  message_ = message;
   const std::string name = textOf(values, ResourceKey::LocalizedName);
   AdwStatusPage* page = ADW_STATUS_PAGE(page_);
   adw_status_page_set_title(page, markupOf(name.empty() ? item.lastPathComponent() : name).c_str());
-  adw_status_page_set_description(page, markupOf(facts).c_str());
+  describe();
   gtk_widget_set_visible(box_, TRUE);
   // What is not here, or not here any more, can't be opened anywhere.
-  gtk_widget_set_visible(open_, here && values.contains(ResourceKey::LocalizedName));
+  gtk_widget_set_visible(open_, here_ && values.contains(ResourceKey::LocalizedName));
   showIcon(item);
+}
+
+void FactsPage::describe() {
+  std::string text = facts_;
+  if (!here_ && !gtk_widget_get_visible(bar_)) {
+    text += std::string("\n") + _("Not downloaded") + "\n\n" + _("It opens here as soon as it is on this device.");
+  }
+  if (!message_.empty()) text += "\n\n" + message_;
+  adw_status_page_set_description(ADW_STATUS_PAGE(page_), markupOf(text).c_str());
+}
+
+void FactsPage::showBar(bool shows) {
+  if (shows == static_cast<bool>(gtk_widget_get_visible(bar_))) return;
+  gtk_widget_set_visible(bar_, shows);
+  describe();
 }
 
 void FactsPage::stopFollowing() {
@@ -115,8 +130,8 @@ void FactsPage::stopFollowing() {
 // Told from within the subscription, which ends when the document is shown; so that waits for the next turn.
 void FactsPage::downloadEnded() {
   observation_.reset();
-  gtk_widget_set_visible(bar_, FALSE);
-  if (arrival_ || !isDownloaded(URL(path_))) return;
+  if (arrival_) return;
+  if (!isDownloaded(URL(path_))) return showBar(false);
   arrival_ = g_idle_add(
       +[](gpointer data) -> gboolean {
         auto* self = static_cast<FactsPage*>(data);
@@ -150,7 +165,7 @@ void FactsPage::followDownload(const URL& item) {
 }
 
 void FactsPage::progressChanged(const std::shared_ptr<Progress>& progress) {
-  gtk_widget_set_visible(bar_, TRUE);
+  showBar(true);
   const std::int64_t total = progress->totalUnits();
   std::string text;
   if (total > 0) {

@@ -26,7 +26,8 @@ class FactsPage {
 
   /// `message` is a sentence, or empty.
   void show(const URL& item, const std::string& message);
-  /// The same of a document that is not on this device, with the progress of its download while there is one.
+  /// The same of a document that is not on this device: the progress of its download, or while there is none, what it waits
+  /// for.
   void showNotDownloaded(const URL& item);
   void showNothing();
   /// Fails when the document is not on this device.
@@ -34,6 +35,8 @@ class FactsPage {
 
  private:
   void showValues(const URL& item, const ResourceMap& values, const std::string& message);
+  void describe();
+  void showBar(bool shows);
   void stopFollowing();
   void downloadEnded();
   void showIcon(const URL& item);
@@ -46,6 +49,9 @@ class FactsPage {
   GtkWidget* bar_;
   GtkWidget* open_;
   std::string path_;
+  std::string facts_;    // of the item that shows
+  std::string message_;  // likewise
+  bool here_ = true;     // likewise
   std::function<void()> arrived_;
   guint arrival_ = 0;
   std::shared_ptr<void> subscription_;
