@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "host/gtk/gtk_window.h"
+#include "host/gtk/menu_tooltip.h"
 
 namespace vaelo {
 
@@ -75,7 +76,16 @@ void SharePresentation::riseFromBottom(GtkWidget* content) {
       }),
       this);
   gtk_widget_add_controller(flap_, keys);
-  adw_flap_set_reveal_flap(flap, TRUE);
+  // How far it has to rise is known once it has a size; without, its place is no number.
+  rising_ = gtk_widget_add_tick_callback(
+      flap_,
+      +[](GtkWidget* widget, GdkFrameClock*, gpointer held) -> gboolean {
+        if (gtk_widget_get_height(widget) == 0) return G_SOURCE_CONTINUE;
+        static_cast<SharePresentation*>(held)->rising_ = 0;
+        adw_flap_set_reveal_flap(ADW_FLAP(widget), TRUE);
+        return G_SOURCE_REMOVE;
+      },
+      this, nullptr);
   gtk_widget_child_focus(content, GTK_DIR_TAB_FORWARD);
 }
 
@@ -97,6 +107,7 @@ void SharePresentation::pointAt(GtkWidget* content, const ShareAnchor& anchor) {
   gtk_popover_set_pointing_to(popover, &rectangle);
   const bool low = rectangle.y + rectangle.height / 2 > gtk_widget_get_height(overlay_) / 2;
   gtk_popover_set_position(popover, low ? GTK_POS_TOP : GTK_POS_BOTTOM);
+  if (anchor.widget && gtk_widget_get_has_tooltip(anchor.widget)) hideTooltipWhileShown(anchor.widget, popover_);
   g_signal_connect_swapped(popover, "closed", G_CALLBACK(+[](SharePresentation* self) { self->gone(); }), this);
   gtk_popover_popup(popover);
 }
@@ -105,6 +116,8 @@ void SharePresentation::close(std::function<void()> then) {
   if (then) then_ = std::move(then);
   if (popover_) {
     gtk_popover_popdown(GTK_POPOVER(popover_));
+  } else if (rising_) {
+    gone();  // there is nothing to be seen yet
   } else if (flap_) {
     adw_flap_set_reveal_flap(ADW_FLAP(flap_), FALSE);
   }
@@ -139,6 +152,7 @@ void SharePresentation::drop() {
     g_object_unref(std::exchange(popover_, nullptr));
   }
   if (flap_) {
+    if (rising_) gtk_widget_remove_tick_callback(flap_, std::exchange(rising_, 0));
     g_signal_handlers_disconnect_by_data(flap_, this);
     // A window that ended first has let go of it.
     if (gtk_widget_get_parent(flap_) == overlay_) gtk_overlay_remove_overlay(GTK_OVERLAY(overlay_), flap_);

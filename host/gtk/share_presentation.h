@@ -52,6 +52,7 @@ class SharePresentation {
   GtkWidget* popover_ = nullptr;      // strong reference
   GtkWidget* focusBefore_ = nullptr;  // weak pointer
   unsigned ending_ = 0;               // idle source
+  unsigned rising_ = 0;               // tick callback, until it has a size
 };
 
 }  // namespace vaelo
