@@ -37,6 +37,9 @@ std::string dotOf(const Color& color) {
       g_strdup_printf("<span foreground=\"#%02x%02x%02x\">●</span>", byte(color.red), byte(color.green), byte(color.blue)));
 }
 
+/// Takes as much room as a dot: the names of all tags begin at one place.
+constexpr const char* NoDot = "<span fgalpha=\"1\">●</span>";
+
 /// On one line, whatever another program has put into a name.
 std::string shown(std::string name) {
   std::replace_if(
@@ -176,7 +179,8 @@ class TagsPopover {
     if (checks_.contains(name)) return;
     const auto color = palette_.find(name);
     GtkWidget* text = gtk_label_new(nullptr);
-    const std::string markup = dotOf(color == palette_.end() ? FileTags::_tagBlipColors()[0] : color->second) + " " +
+    // One that is not among the user's tags has no dot in the details either.
+    const std::string markup = (color == palette_.end() ? std::string(NoDot) : dotOf(color->second)) + " " +
                                takeString(g_markup_escape_text(shown(name).c_str(), -1));
     gtk_label_set_markup(GTK_LABEL(text), markup.c_str());
     gtk_label_set_ellipsize(GTK_LABEL(text), PANGO_ELLIPSIZE_END);
@@ -243,10 +247,19 @@ class TagsPopover {
     FileTags::_tagColorsDidChange();
     palette_ = FileTags::tagColorsByTag();
     addRow(name, true);
+    GtkWidget* check = checks_.at(name);
     settling_ = true;
-    gtk_check_button_set_active(GTK_CHECK_BUTTON(checks_.at(name)), TRUE);
+    gtk_check_button_set_active(GTK_CHECK_BUTTON(check), TRUE);
     settling_ = false;
+    showFirst(check);
     if (changed_) changed_();
+  }
+
+  /// Below all others nobody would see what became of what was typed.
+  void showFirst(GtkWidget* check) {
+    gtk_box_reorder_child_after(GTK_BOX(rows_), check, nullptr);
+    GtkWidget* scroller = gtk_widget_get_ancestor(rows_, GTK_TYPE_SCROLLED_WINDOW);
+    gtk_adjustment_set_value(gtk_scrolled_window_get_vadjustment(GTK_SCROLLED_WINDOW(scroller)), 0);
   }
 
   const std::string path_;
