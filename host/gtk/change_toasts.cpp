@@ -5,6 +5,7 @@
 #include "host/gtk/gtk_window.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
+#include "items/file_utils.h"
 
 namespace vaelo {
 
@@ -13,7 +14,12 @@ namespace {
 constexpr unsigned UndoSeconds = 8;
 
 std::string shown(const std::string& name) { return takeString(g_filename_display_name(name.c_str())); }
-std::string nameOf(const URL& url) { return shown(url.lastPathComponent()); }
+/// As lists show it, which may be without its extension.
+std::string nameOf(const URL& url) {
+  const Value name = FileUtils::getResourceValueForURL(ResourceKey::LocalizedName, url);
+  const std::string* text = name.get<std::string>();
+  return text ? *text : shown(url.lastPathComponent());
+}
 
 std::string number(std::size_t value) { return numberText(static_cast<std::int64_t>(value)); }
 

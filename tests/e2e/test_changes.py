@@ -91,6 +91,12 @@ class Names(ItemsWindow):
         self.on_disk("Report.txt")
         self.on_disk("Summary.txt", False)
         self.app.wait("Report.txt", "list item")
+        # Of an item without its extension the message says what the list says.
+        os.setxattr(self.drive / "Report.txt", "user.vaelo.hidden-extension", b"true")
+        self.app.wait("Report, ", "list item")
+        self.rename("Report,", "Letter")
+        self.on_disk("Letter.txt")
+        self.app.wait("Renamed to “Letter”")
 
     def test_undo_does_not_replace_what_came_meanwhile(self):
         self.rename("Report.txt", "Summary.txt")
