@@ -5,10 +5,26 @@
 
 #include "host/gtk/list/folder_reader.h"
 #include "host/support/glib_ptr.h"
+#include "host/support/texts.h"
 
 namespace vaelo {
 
+namespace {
+
+/// As people write it.
+std::string withoutHome(const std::string& path) {
+  const std::string home = g_get_home_dir();
+  const std::string shown = path.starts_with(home + "/") ? "~" + path.substr(home.size()) : path;
+  return takeString(g_filename_display_name(shown.c_str()));
+}
+
+}  // namespace
+
 void RootListScreen::fill() {
+  folderView().setEmptyText("folder-symbolic", _("This folder is empty"),
+                            // TRANSLATORS: "Select" is the button that begins selecting; %s is a folder's path.
+                            filled(_("Press “Select” to make a folder. Files that you put into “%s” appear here."),
+                                   {withoutHome(presentedURL()->path())}));
   follow();
   read();
 }

@@ -1,5 +1,6 @@
 # SPDX-License-Identifier: GPL-3.0-or-later
 """Deletions in a real window, their question, and how they are called off; each seen on the disk."""
+import shutil
 import unittest
 
 from harness import PROGRAM, pause, wait_for
@@ -28,6 +29,15 @@ class Deletions(ItemsWindow):
         wait_for("the library to be empty",
                  lambda: sorted(content(library)) == [".vaelo-container", "Documents"])
         wait_for("the disk to be free of it", lambda: not self.held())
+        self.app.wait("Notes, 0 items", "list item")
+
+    def test_an_empty_drive_tells_how_things_come_into_it(self):
+        app = self.app
+        shutil.rmtree(app.data / "mirror" / "org~example~Notes")
+        for item in self.drive.iterdir():
+            shutil.rmtree(item) if item.is_dir() else item.unlink()
+        app.wait("This folder is empty")
+        app.wait(f"Press “Select” to make a folder. Files that you put into “{self.drive}” appear here.")
 
     def test_a_library_and_a_document_are_not_deleted_together(self):
         app = self.app

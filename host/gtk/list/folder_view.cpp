@@ -6,6 +6,7 @@
 #include <utility>
 
 #include "host/gtk/list/folder_reader.h"
+#include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
 
 namespace vaelo {
@@ -224,8 +225,9 @@ void FolderView::allDetailsAreOld() {
 
 void FolderView::setEmptyText(const char* icon, const std::string& title, const std::string& description) {
   adw_status_page_set_icon_name(emptyPage_, icon);
-  adw_status_page_set_title(emptyPage_, title.c_str());
-  adw_status_page_set_description(emptyPage_, description.c_str());
+  const auto markupOf = [](const std::string& text) { return takeString(g_markup_escape_text(text.c_str(), -1)); };
+  adw_status_page_set_title(emptyPage_, markupOf(title).c_str());
+  adw_status_page_set_description(emptyPage_, markupOf(description).c_str());
 }
 
 void FolderView::setUnreadable(int errorNumber) {
