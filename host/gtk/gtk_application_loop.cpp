@@ -11,6 +11,7 @@
 #include "host/gtk/gtk_window.h"
 #include "host/gtk/preview/decoder_starter.h"
 #include "host/gtk/preview/portable_document_marks.h"
+#include "host/gtk/shortcuts_window.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/message_catalogue.h"
 #include "host/support/own_folder.h"
@@ -121,6 +122,12 @@ int GtkApplicationLoop::run(int argc, char** argv, std::function<std::shared_ptr
        nullptr,
        nullptr,
        {0, 0, 0}},
+      {"shortcuts",
+       [](GSimpleAction*, GVariant*, gpointer self) { static_cast<GtkApplicationLoop*>(self)->showShortcuts(); },
+       nullptr,
+       nullptr,
+       nullptr,
+       {0, 0, 0}},
       {"quit",
        [](GSimpleAction*, GVariant*, gpointer self) {
          g_application_quit(G_APPLICATION(static_cast<GtkApplicationLoop*>(self)->application_));
@@ -132,6 +139,8 @@ int GtkApplicationLoop::run(int argc, char** argv, std::function<std::shared_ptr
   g_action_map_add_action_entries(G_ACTION_MAP(application_), entries, G_N_ELEMENTS(entries), this);
   const char* quitKeys[] = {"<Control>q", nullptr};
   gtk_application_set_accels_for_action(GTK_APPLICATION(application_), "app.quit", quitKeys);
+  const char* shortcutsKeys[] = {"<Control>question", nullptr};
+  gtk_application_set_accels_for_action(GTK_APPLICATION(application_), "app.shortcuts", shortcutsKeys);
   const int status = g_application_run(G_APPLICATION(application_), argc, argv);
   focus_.reset();
   PortableDocumentMarks::finishAll();
@@ -316,6 +325,10 @@ void GtkApplicationLoop::saveState() {
 
 void GtkApplicationLoop::showAccounts() {
   if (const auto window = screens_.window()) showAccountsPage(window->widget(), drive_.layout(), notifications_);
+}
+
+void GtkApplicationLoop::showShortcuts() {
+  if (const auto window = screens_.window()) showShortcutsWindow(window->widget());
 }
 
 void GtkApplicationLoop::showAbout() {

@@ -50,6 +50,7 @@ class GtkApplicationLoop : public Application {
   void focusChanged(bool focused);
   void restore();
   void saveState();
+  void showShortcuts();
   void showAbout();
   void showAccounts();
   void tellOfDamage();

@@ -47,6 +47,7 @@ GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds, Dr
   g_menu_append(menu_, _("Select A_ll"), "win.select-all");
   g_menu_append(menu_, _("_Refresh"), "win.refresh");
   g_menu_append(menu_, _("A_ccounts…"), "app.accounts");
+  g_menu_append(menu_, _("_Keyboard Shortcuts"), "app.shortcuts");
   g_menu_append(menu_, _("_About Vaelo Drive"), "app.about");
   addActions();
   stack_.onSwipedBack([this](std::size_t left) {
@@ -135,7 +136,7 @@ void GtkWindowHost::addActions() {
   // Of two for one action the menu shows the one that comes last.
   constexpr const char* keys[][2] = {{"<Control>r", "win.refresh"}, {"F5", "win.refresh"},
                                      {"<Control>f", "win.search"},  {"<Control>a", "win.select-all"},
-                                     {"<Control>t", "win.tags"},    {"<Alt>Left|Back", "win.back"},
+                                     {"<Control>t", "win.tags"},    {"<Alt>Left|<Alt>Up|Back", "win.back"},
                                      {"Escape", "win.escape"}};
   for (const auto& [trigger, action] : keys) {
     gtk_shortcut_controller_add_shortcut(

@@ -254,6 +254,11 @@ def window_menu(app, keys):
     yield "about"
     app.key("Escape")
     app.wait_gone("Legal")
+    app.key("ctrl+question")
+    app.wait("Folder Above", "list item")
+    yield "keyboard shortcuts"
+    app.key("Escape")
+    app.wait_gone("Folder Above")
     keys.open_menu()
     app.key("c")
     app.wait("Sign Out: Ada")

@@ -4,7 +4,7 @@ import harness
 
 from .stage import furnish
 
-NAMES = ("root", "menu", "folder", "grid", "search", "empty")
+NAMES = ("root", "menu", "shortcuts", "folder", "grid", "search", "empty")
 
 
 def add_pictures(app):
@@ -26,6 +26,11 @@ def play(stage):
     stage.shot("menu")
     app.key("Escape")
     stage.wait_gone("_Refresh")
+    app.key("ctrl+question")
+    stage.wait("Main Menu", "list item")
+    stage.shot("shortcuts")
+    app.key("Escape")
+    stage.wait_gone("Folder Above")
     stage.show("Documents")
     app.wait("Minutes 2.txt", "list item")
     stage.shot("folder")
