@@ -153,7 +153,11 @@ std::optional<Error> DriveSyncedStore::addTag(const std::string& name, unsigned 
   if (changed.error) return changed.error;
   if (text.value && *text.value == *changed.value) return std::nullopt;
   if (changed.value->size() > LargestFile) return fileError(FileErrorCode::WriteUnknown, file, "there are too many tags");
-  return writeSmallFile(file, *changed.value);
+  std::optional<Error> failed = writeSmallFile(file, *changed.value);
+  // Who asks now is not to wait until the file's watch has told of it.
+  const std::lock_guard lock(mutex_);
+  current_ = false;
+  return failed;
 }
 
 void DriveSyncedStore::watch() {

@@ -93,6 +93,9 @@ void MirroredText::update() {
     GtkWidget* picture = gtk_picture_new_for_paintable(image->paintable());
     gtk_picture_set_can_shrink(GTK_PICTURE(picture), FALSE);
     gtk_widget_set_valign(picture, GTK_ALIGN_CENTER);
+    if (gtk_widget_get_first_child(line)) {
+      gtk_widget_set_margin_start(picture, static_cast<int>(AttributedString::RoomBeforeImage));
+    }
     gtk_box_append(GTK_BOX(line), picture);
   }
 }

@@ -260,6 +260,7 @@ class TagsPopover {
     gtk_box_reorder_child_after(GTK_BOX(rows_), check, nullptr);
     GtkWidget* scroller = gtk_widget_get_ancestor(rows_, GTK_TYPE_SCROLLED_WINDOW);
     gtk_adjustment_set_value(gtk_scrolled_window_get_vadjustment(GTK_SCROLLED_WINDOW(scroller)), 0);
+    gtk_popover_present(GTK_POPOVER(popover_));
   }
 
   const std::string path_;

@@ -30,6 +30,9 @@ class AttributedString {
     friend bool operator==(const Run&, const Run&) = default;
   };
 
+  /// The room that is left before an image behind other things, so that it is seen to belong to what follows it. In points.
+  static constexpr double RoomBeforeImage = 6;
+
   AttributedString() = default;
   explicit AttributedString(std::string text, TextAttributes attributes = {}) { append(std::move(text), attributes); }
   void append(std::string text, const TextAttributes& attributes = {});

@@ -55,6 +55,7 @@ Size Label::measured(double maxWidth) const {
   if (attributedText_) {
     for (const AttributedString::Run& run : attributedText_->runs()) {
       if (!run.image) continue;
+      if (&run != &attributedText_->runs().front()) size.width += AttributedString::RoomBeforeImage;
       size.width += run.image->width();
       size.height = std::max(size.height, run.image->height());
     }

@@ -68,6 +68,10 @@ class Tags(unittest.TestCase):
         app.key("Return")
         wait_for("the new tag", lambda: self.tags() == "Work,Own,To do")
         app.wait("To do", "check box")
+        wait_for("the new tag above the others", lambda: [row[1] for row in sorted(
+            (row for row in app.accessibility.showing() if row[0] == "check box"), key=lambda row: row[3])][0] == "To do")
+        wait_for("room for all of them above the field", lambda: app.find("New tag")[3] >= max(
+            row[3] + row[5] for row in app.accessibility.showing() if row[0] == "check box"))
         self.assertIn("'To do'", self.values.read_text())
         self.assertIn("'Red'", self.values.read_text())
 

@@ -112,6 +112,13 @@ TEST_F(SyncedTagsTest, ANewTagIsAddedOnceAtTheEnd) {
   EXPECT_EQ(names(), (Names{"Red 6", "It's \"new\" 0"}));
 }
 
+TEST_F(SyncedTagsTest, ANewTagIsKnownBeforeTheFilesWatchTellsOfIt) {
+  store.accountChanged();
+  EXPECT_FALSE(store.objectForKey("RoverTagDict").isPresent());
+  ASSERT_FALSE(store.addTag("Red", 6));
+  EXPECT_TRUE(store.objectForKey("RoverTagDict").isPresent());
+}
+
 TEST_F(SyncedTagsTest, WhatElseTheFileSaysStays) {
   write(file,
         "{'other': <[1, 2]>, 'RoverTagDict': <{'RoverTagDictVersion': <2>, 'x': <true>, "

@@ -277,6 +277,29 @@ TEST_F(MirrorViewTest, LargeLettersTakeASecondLine) {
   EXPECT_NEAR(label->frame().height, 2 * line, 2);
 }
 
+TEST_F(MirrorViewTest, APictureInATextStandsNearerToWhatFollowsIt) {
+  const ImageRef dot = PangoGraphics().renderImage({10, 10}, [](DrawingContext& context) {
+    context.fillRect({0, 0, 10, 10});
+  });
+  AttributedString tags;
+  for (const char* name : {"Work ", "Holiday"}) {
+    tags.appendImage(dot);
+    tags.append(name);
+  }
+  label->setAttributedText(tags);
+  show();
+  GtkWidget* first = gtk_widget_get_first_child(widgets()[0]);
+  GtkWidget* work = gtk_widget_get_next_sibling(first);
+  GtkWidget* second = gtk_widget_get_next_sibling(work);
+  EXPECT_EQ(gtk_widget_get_margin_start(first), 0);
+  EXPECT_EQ(gtk_widget_get_margin_start(second), AttributedString::RoomBeforeImage);
+  // The label asks for that room, so that no name is cut.
+  Label words;
+  words.setText("Work Holiday");
+  EXPECT_EQ(label->intrinsicContentSize().width,
+            words.intrinsicContentSize().width + 2 * dot->width() + AttributedString::RoomBeforeImage);
+}
+
 TEST_F(MirrorViewTest, InLargeLettersThingsWithPicturesStandBelowEachOther) {
   const LargeLetters large;
   const ImageRef dot = PangoGraphics().renderImage({10, 10}, [](DrawingContext& context) {
