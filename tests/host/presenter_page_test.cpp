@@ -96,6 +96,34 @@ TEST_F(PresenterPageTest, ADocumentThatComes) {
   EXPECT_TRUE(waitUntil([&] { return !said().empty() && said().find("Not downloaded") == std::string::npos; })) << said();
 }
 
+// An empty frame in between would flicker, and hold up the document by a whole frame.
+TEST_F(PresenterPageTest, WhatIsSeenStaysUntilTheNextDocumentIsThere) {
+  write(document, noText);
+  write(drive + "/Plan.txt", "milk");
+  show(document);
+  ASSERT_TRUE(says("9 bytes")) << said();
+  const std::string seen = said();
+  source->pointTo(drive + "/Plan.txt");
+  controller->reloadData();
+  EXPECT_EQ(said(), seen);
+  EXPECT_TRUE(waitUntil([&] { return said() != seen; }));
+  EXPECT_EQ(said(), "");
+}
+
+TEST_F(PresenterPageTest, APageThatIsOutOfSightDoesNotKeepWhatItShowed) {
+  write(document, noText);
+  write(drive + "/Plan.txt", "milk");
+  show(document);
+  ASSERT_TRUE(says("9 bytes")) << said();
+  g_object_ref(page->widget());
+  gtk_window_set_child(GTK_WINDOW(window), nullptr);
+  source->pointTo(drive + "/Plan.txt");
+  controller->reloadData();
+  gtk_window_set_child(GTK_WINDOW(window), page->widget());
+  g_object_unref(page->widget());
+  EXPECT_EQ(said(), "");
+}
+
 TEST_F(PresenterPageTest, ADownloadOfUnknownSizeTellsItsBytes) {
   promise("Table.unknown", 0);
   show(document);

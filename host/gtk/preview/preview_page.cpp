@@ -208,8 +208,10 @@ void PreviewPage::showFacts(const std::string& message) {
   headerChanged_();
 }
 
+// What the user looks at stays until the document is there: an empty frame in between would hold it up by a whole frame.
 void PreviewPage::showLoadingSoon() {
-  gtk_stack_set_visible_child_name(GTK_STACK(stack_), "empty");
+  const bool isSeen = gtk_widget_get_mapped(stack_) && gtk_stack_get_visible_child(GTK_STACK(stack_));
+  if (!isSeen) gtk_stack_set_visible_child_name(GTK_STACK(stack_), "empty");
   loadingTimer_ = g_timeout_add(
       LoadingNoticeAfter,
       +[](gpointer data) -> gboolean {
