@@ -15,6 +15,7 @@
 
 #include "host/gtk/gtk_screens.h"
 #include "host/gtk/preview/preview_page.h"
+#include "host/gtk/scrolled_windows.h"
 #include "host/host_platform.h"
 #include "host/support/graphics_device.h"
 
@@ -27,14 +28,19 @@ inline double median(std::vector<double> values) {
   return values[values.size() / 2];
 }
 
-/// Without what the allocator keeps for later.
-inline long residentKibibytes() {
+struct Held {
+  long allocated;  // of all arenas
+  long resident;   // without what the allocator keeps for later
+};
+
+inline Held heldKibibytes() {
   ::malloc_trim(0);
+  const struct ::mallinfo2 info = ::mallinfo2();
   std::ifstream file("/proc/self/statm");
   long total = 0;
   long resident = 0;
   file >> total >> resident;
-  return resident * (::sysconf(_SC_PAGESIZE) / 1024);
+  return {static_cast<long>((info.uordblks + info.hblkhd) / 1024), resident * (::sysconf(_SC_PAGESIZE) / 1024)};
 }
 
 class PreviewWindow : public PreviewControllerDataSource, public std::enable_shared_from_this<PreviewWindow> {
@@ -45,6 +51,7 @@ class PreviewWindow : public PreviewControllerDataSource, public std::enable_sha
     g_setenv("XDG_DATA_HOME", (folder + "/share").c_str(), TRUE);
     gtk_init();
     adw_init();
+    mendScrolledWindows();
     std::shared_ptr<PreviewWindow> window(new PreviewWindow(folder));
     window->controller_->setDataSource(window);
     window->page_ = std::make_unique<PreviewPage>(window->controller_, [] {});

@@ -11,6 +11,7 @@
 #include "host/gtk/gtk_window.h"
 #include "host/gtk/preview/decoder_starter.h"
 #include "host/gtk/preview/portable_document_marks.h"
+#include "host/gtk/scrolled_windows.h"
 #include "host/gtk/shortcuts_window.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/message_catalogue.h"
@@ -70,6 +71,7 @@ int GtkApplicationLoop::run(int argc, char** argv, std::function<std::shared_ptr
   g_application_add_main_option_entries(G_APPLICATION(application_), options);
   // The toolkit goes by its own translations, which need not be installed.
   g_signal_connect(application_, "startup", G_CALLBACK(+[](GApplication*, gpointer) {
+                     mendScrolledWindows();
                      gtk_widget_set_default_direction(messagesAreRightToLeft() ? GTK_TEXT_DIR_RTL : GTK_TEXT_DIR_LTR);
                      gtk_icon_theme_add_search_path(
                          gtk_icon_theme_get_for_display(gdk_display_get_default()),
