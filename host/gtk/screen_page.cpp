@@ -21,7 +21,9 @@ constexpr const char* NarrowActions = "narrow";
 constexpr double LargeText = 1.3;  // times the usual size
 constexpr const char* TightClass = "vaelo-tight";
 constexpr const char* TightStyle =
-    ".vaelo-tight headerbar button.text-button, .vaelo-tight .toolbar button { padding-left: 6px; padding-right: 6px; }";
+    ".vaelo-tight headerbar button.text-button, .vaelo-tight .toolbar button { padding-left: 6px; padding-right: 6px; }"
+    ".vaelo-tight headerbar windowtitle .title { font-size: 70%; }";
+constexpr int MostTitleLines = 2;
 
 void addStyle() {
   static bool added = false;
@@ -31,6 +33,16 @@ void addStyle() {
   gtk_css_provider_load_from_data(provider.get(), TightStyle, -1);
   gtk_style_context_add_provider_for_display(display, GTK_STYLE_PROVIDER(provider.get()),
                                              GTK_STYLE_PROVIDER_PRIORITY_APPLICATION);
+}
+
+void setLines(GtkWidget* title, int lines) {
+  for (GtkWidget* child = gtk_widget_get_first_child(title); child; child = gtk_widget_get_next_sibling(child)) {
+    setLines(child, lines);
+    if (!GTK_IS_LABEL(child)) continue;
+    gtk_label_set_wrap(GTK_LABEL(child), lines > 1);
+    gtk_label_set_lines(GTK_LABEL(child), lines);
+    gtk_label_set_justify(GTK_LABEL(child), GTK_JUSTIFY_CENTER);
+  }
 }
 
 }  // namespace
@@ -139,10 +151,11 @@ int ScreenPage::toolbarHeight() const {
 void ScreenPage::setNarrow(bool narrow) {
   if (narrow == narrow_) return;
   narrow_ = narrow;
-  // Large letters need the room of the last of the window's own buttons, and of some of the others' edges.
+  // Large letters need the room of the last of the window's own buttons, of some of the others' edges, and of a second line.
   const bool tight = narrow && textScale() > LargeText;
   adw_header_bar_set_decoration_layout(ADW_HEADER_BAR(header_), tight ? ":" : narrow ? ":close" : nullptr);
   (tight ? gtk_widget_add_css_class : gtk_widget_remove_css_class)(box_, TightClass);
+  setLines(title_, tight ? MostTitleLines : 1);
   if (hostScreen_) {
     // The menu hides what it finds no action for.
     gtk_widget_insert_action_group(box_, NarrowActions, narrow ? hostScreen_->narrowActions() : nullptr);

@@ -17,7 +17,7 @@ gboolean unrealized(GSignalInvocationHint*, guint, const GValue* values, gpointe
 }  // namespace
 
 void mendScrolledWindows() {
-  g_type_ensure(GTK_TYPE_WIDGET);
+  g_type_class_unref(g_type_class_ref(GTK_TYPE_WIDGET));  // which makes the signal
   g_signal_add_emission_hook(g_signal_lookup("unrealize", GTK_TYPE_WIDGET), 0, unrealized, nullptr, nullptr);
 }
 
