@@ -52,6 +52,9 @@ class LargeText(unittest.TestCase):
                 self.assertEqual([row for row in windows if row[4] > width or row[5] > height], [])
                 told = [row for row in showing if row[0] in ("label", "push button", "toggle button", "check box", "list item",
                                                              "menu item", "text") and len(row[1]) > 2]
+                if screen == "name in the details":
+                    heights = [row[5] for row in showing if row[:2] == ("label", "Rename File")]
+                    self.assertGreater(max(heights, default=0), 45, "of two lines, for one has no room")
                 self.assertEqual([row for row in told if row[4] < least.get(row[0], 20) or row[4] > width or row[2] < 0], [])
 
     def test_the_way_out_of_marking_stays_in_sight_on_a_phone(self):
