@@ -14,7 +14,9 @@ using list_test::waitUntil;
 
 class ContentMonitorTest : public testing::Test {
  protected:
-  void watch(const std::string& name) { monitor_.add(monitor_.queue()->watch(folder_.path() + "/" + name), name); }
+  void watch(const std::string& name) {
+    monitor_.add(monitor_.queue(), monitor_.queue()->watch(folder_.path() + "/" + name), name);
+  }
   bool told(const std::string& name) {
     return waitUntil([&] { return told_[name] > 0; });
   }
@@ -64,7 +66,7 @@ TEST_F(ContentMonitorTest, WhatHappensBeforeAFolderIsAddedIsTold) {
   folder_.write("a/new");
   ASSERT_TRUE(told("a"));
   EXPECT_EQ(told_["early"], 0);
-  monitor_.add(early, "early");
+  monitor_.add(monitor_.queue(), early, "early");
   EXPECT_TRUE(told("early"));
 }
 
@@ -75,6 +77,23 @@ TEST_F(ContentMonitorTest, ForgetsFoldersThatNobodyWants) {
   watch("b");
   monitor_.keep([](const std::string& key) { return key == "b"; });
   EXPECT_EQ(monitor_.size(), 1U);
+  folder_.write("a/new");
+  folder_.write("b/new");
+  EXPECT_TRUE(told("b"));
+  EXPECT_EQ(told_["a"], 0);
+}
+
+TEST_F(ContentMonitorTest, BeginsAnewAfterItWasStopped) {
+  folder_.makeFolder("a");
+  folder_.makeFolder("b");
+  const auto before = monitor_.queue();
+  const int late = before->watch(folder_.path() + "/a");
+  watch("a");
+  monitor_.stop();
+  EXPECT_EQ(monitor_.size(), 0U);
+  watch("b");
+  monitor_.add(before, late, "a");
+  EXPECT_EQ(monitor_.size(), 1U) << "its number is another folder's now";
   folder_.write("a/new");
   folder_.write("b/new");
   EXPECT_TRUE(told("b"));

@@ -148,6 +148,24 @@ TEST_F(FolderViewTest, ARowFollowsWhatComesIntoAndLeavesItsFolder) {
   EXPECT_TRUE(counts("1 item"));
 }
 
+TEST_F(FolderViewTest, ARowThatWasOutOfSightFollowsAgain) {
+  folder_.makeFolder("Plans");
+  open();
+  const auto counts = [&](const std::string& text) {
+    return waitUntil([&] {
+      FolderItem* item = view_->model().liveItem("Plans");
+      return item && item->details && item->details->secondLine == text;
+    });
+  };
+  ASSERT_TRUE(counts("0 items"));
+  gtk_widget_set_visible(view_->widget(), FALSE);
+  folder_.write("Plans/a");
+  gtk_widget_set_visible(view_->widget(), TRUE);
+  EXPECT_TRUE(counts("1 item"));
+  folder_.write("Plans/b");
+  EXPECT_TRUE(counts("2 items"));
+}
+
 TEST_F(FolderViewTest, RowsOfSuppliedEntriesFollowTheirFolders) {
   folder_.makeFolder("Library");
   folder_.makeFolder("Library/Documents");

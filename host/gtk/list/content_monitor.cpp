@@ -27,9 +27,10 @@ int ContentMonitor::Queue::watch(const std::string& folder) const {
   return descriptor_ < 0 ? -1 : inotify_add_watch(descriptor_, folder.c_str(), comingAndGoing);
 }
 
-ContentMonitor::ContentMonitor(std::function<void(const std::string&)> changed)
-    : queue_(std::make_shared<Queue>()), changed_(std::move(changed)) {
-  if (queue_->descriptor_ < 0) return;
+const std::shared_ptr<const ContentMonitor::Queue>& ContentMonitor::queue() {
+  if (queue_) return queue_;
+  queue_ = std::make_shared<Queue>();
+  if (queue_->descriptor_ < 0) return queue_;
   source_ = g_unix_fd_add(
       queue_->descriptor_, G_IO_IN,
       [](gint, GIOCondition, gpointer self) -> gboolean {
@@ -37,15 +38,21 @@ ContentMonitor::ContentMonitor(std::function<void(const std::string&)> changed)
         return G_SOURCE_CONTINUE;
       },
       this);
+  return queue_;
 }
 
-ContentMonitor::~ContentMonitor() {
-  if (source_) g_source_remove(source_);
-  if (timer_) g_source_remove(timer_);
+void ContentMonitor::stop() {
+  if (source_) g_source_remove(std::exchange(source_, 0));
+  if (timer_) g_source_remove(std::exchange(timer_, 0));
+  queue_.reset();
+  keys_.clear();
+  touched_.clear();
+  early_.clear();
+  ended_.clear();
 }
 
-void ContentMonitor::add(int watch, const std::string& key) {
-  if (watch < 0) return;
+void ContentMonitor::add(const std::shared_ptr<const Queue>& queue, int watch, const std::string& key) {
+  if (watch < 0 || queue != queue_) return;
   keys_[watch].insert(key);
   if (early_.erase(watch) == 0) return;
   touched_.insert(watch);

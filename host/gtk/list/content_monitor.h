@@ -8,6 +8,7 @@
 #include <string>
 #include <unordered_map>
 #include <unordered_set>
+#include <utility>
 
 namespace vaelo {
 
@@ -18,8 +19,8 @@ namespace vaelo {
 class ContentMonitor {
  public:
   /// `changed` is called with each folder's own key.
-  explicit ContentMonitor(std::function<void(const std::string& key)> changed);
-  ~ContentMonitor();
+  explicit ContentMonitor(std::function<void(const std::string& key)> changed) : changed_(std::move(changed)) {}
+  ~ContentMonitor() { stop(); }
   ContentMonitor(const ContentMonitor&) = delete;
   ContentMonitor& operator=(const ContentMonitor&) = delete;
 
@@ -37,12 +38,16 @@ class ContentMonitor {
     friend class ContentMonitor;
     int descriptor_;
   };
-  std::shared_ptr<const Queue> queue() const { return queue_; }
+  /// Another one after stop(): the system has few for a person, and gives one to whoever asks here.
+  const std::shared_ptr<const Queue>& queue();
 
-  /// Tells changes of the folder that `watch` is the number of by `key`; one folder may be told by several.
-  void add(int watch, const std::string& key);
+  /// Tells changes of the folder that `queue` gave the number `watch` by `key`; one folder may be told by several. Nothing
+  /// happens when the queue was stopped meanwhile.
+  void add(const std::shared_ptr<const Queue>& queue, int watch, const std::string& key);
   /// Forgets the folders by whose keys nobody wants to be told.
   void keep(const std::function<bool(const std::string& key)>& wanted);
+  /// Forgets all folders.
+  void stop();
   std::size_t size() const { return keys_.size(); }
 
  private:
@@ -50,7 +55,7 @@ class ContentMonitor {
   void reportSoon();
   void report();
 
-  std::shared_ptr<const Queue> queue_;
+  std::shared_ptr<const Queue> queue_;  // null while nothing is watched
   std::function<void(const std::string&)> changed_;
   std::unordered_map<int, std::unordered_set<std::string>> keys_;  // by watch
   std::unordered_set<int> touched_;                                // watches

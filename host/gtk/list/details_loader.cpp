@@ -66,8 +66,8 @@ void DetailsLoader::readNext() {
       if (isListedAsFolder(job.kind)) job.watch = queue->watch(path);
       job.details = readDetails(path, job.kind, pixels);
     }
-    return [this, generation, done = std::move(jobs)] {
-      for (const Job& job : done) contents_.add(job.watch, job.name);
+    return [this, generation, queue, done = std::move(jobs)] {
+      for (const Job& job : done) contents_.add(queue, job.watch, job.name);
       if (contents_.size() > MostWatched) {
         contents_.keep([this](const std::string& name) { return model_.liveItem(name) != nullptr; });
       }

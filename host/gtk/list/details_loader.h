@@ -25,6 +25,8 @@ class DetailsLoader {
   /// The folder of the names; empty where names are paths. What is on its way for another folder is dropped.
   void setFolder(const std::string& folder);
   void setThumbnailPixels(int pixels) { thumbnailPixels_ = pixels; }
+  /// Watches no folders until details are requested again, for which all are to be old then.
+  void rest() { contents_.stop(); }
   /// Does nothing when the details are fresh or already asked for.
   void request(FolderItem& item);
 

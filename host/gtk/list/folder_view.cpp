@@ -78,6 +78,7 @@ FolderView::FolderView()
   connectDrags();
   // Whoever comes back to a list may have changed what its rows count.
   g_signal_connect_swapped(pages_, "map", G_CALLBACK(+[](FolderView* self) { self->allDetailsAreOld(); }), this);
+  g_signal_connect_swapped(pages_, "unmap", G_CALLBACK(+[](FolderView* self) { self->details_.rest(); }), this);
 }
 
 FolderView::~FolderView() {
