@@ -3,6 +3,7 @@
 
 #include <adwaita.h>
 
+#include <algorithm>
 #include <functional>
 #include <memory>
 #include <vector>
@@ -66,6 +67,8 @@ class AccountsPage {
     name_ = adw_entry_row_new();
     adw_preferences_row_set_title(ADW_PREFERENCES_ROW(name_), _("Name"));
     adw_entry_row_set_show_apply_button(ADW_ENTRY_ROW(name_), TRUE);
+    // A field that has the keyboard raises a phone's: not before it is known that there is nothing else to begin with.
+    gtk_widget_set_can_focus(name_, FALSE);
     g_signal_connect_swapped(name_, "apply", G_CALLBACK(+[](AccountsPage* self) {
                                const std::string name = gtk_editable_get_text(GTK_EDITABLE(self->name_));
                                self->change([name](LocalAccounts& accounts) { return accounts.add(name); });
@@ -88,10 +91,18 @@ class AccountsPage {
   }
 
   void show(const std::vector<LocalAccounts::Known>& known) {
+    GtkWidget* focus = gtk_window_get_focus(window_);
+    const auto had = std::find_if(rows_.begin(), rows_.end(),
+                                  [&](GtkWidget* row) { return focus && gtk_widget_is_ancestor(focus, row); });
+    const auto focused = static_cast<std::size_t>(had - rows_.begin());
+    const bool takesFocus = !gtk_widget_get_can_focus(name_) || focused < rows_.size();
     for (GtkWidget* row : rows_) adw_preferences_group_remove(known_, row);
     rows_.clear();
     for (const LocalAccounts::Known& account : known) rows_.push_back(makeRow(account));
     for (GtkWidget* row : rows_) adw_preferences_group_add(known_, row);
+    gtk_widget_set_can_focus(name_, TRUE);
+    if (!takesFocus) return;
+    gtk_widget_grab_focus(rows_.empty() ? name_ : rows_[focused < rows_.size() ? focused : 0]);
   }
 
   GtkWidget* makeRow(const LocalAccounts::Known& account) {

@@ -66,6 +66,7 @@ std::string ChangeToasts::textFor(const MoveHistory::Batch& batch) const {
 void ChangeToasts::offerUndo(const std::shared_ptr<const MoveHistory::Batch>& batch) {
   const auto window = screens_.window();
   if (!window) return;
+  for (const MoveHistory::Move& move : *batch) window->itemMoved(move.from, move.to);
   forget(undo_);
   AdwToast* toast = window->showToast(
       textFor(*batch), _("Undo"), [this, batch] { undo(*batch); }, UndoSeconds);
@@ -74,6 +75,11 @@ void ChangeToasts::offerUndo(const std::shared_ptr<const MoveHistory::Batch>& ba
 
 void ChangeToasts::undo(const MoveHistory::Batch& batch) {
   const std::vector<Error> errors = moves_.undo(batch);
+  if (const auto window = screens_.window()) {
+    for (const MoveHistory::Move& move : batch) window->itemMoved(move.to, move.from);
+    // The button that was pressed goes with its message.
+    window->returnFocus(nullptr);
+  }
   if (errors.size() == 1) {
     const Error& error = errors.front();
     say(error.localizedDescription ? *error.localizedDescription : error.description());

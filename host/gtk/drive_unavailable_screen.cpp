@@ -29,11 +29,11 @@ DriveUnavailableController::DriveUnavailableController(const std::optional<Error
   const std::string reason = takeString(g_markup_escape_text(reasonOf(setUpFailure).c_str(), -1));
   adw_status_page_set_description(ADW_STATUS_PAGE(page_), reason.c_str());
   if (!setUpFailure) {
-    GtkWidget* accounts = gtk_button_new_with_label(_("Accounts…"));
-    gtk_actionable_set_action_name(GTK_ACTIONABLE(accounts), "app.accounts");
-    gtk_widget_add_css_class(accounts, "pill");
-    gtk_widget_set_halign(accounts, GTK_ALIGN_CENTER);
-    adw_status_page_set_child(ADW_STATUS_PAGE(page_), accounts);
+    accounts_ = gtk_button_new_with_label(_("Accounts…"));
+    gtk_actionable_set_action_name(GTK_ACTIONABLE(accounts_), "app.accounts");
+    gtk_widget_add_css_class(accounts_, "pill");
+    gtk_widget_set_halign(accounts_, GTK_ALIGN_CENTER);
+    adw_status_page_set_child(ADW_STATUS_PAGE(page_), accounts_);
   }
   setTitle("Vaelo Drive");
 }

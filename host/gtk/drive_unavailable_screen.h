@@ -16,9 +16,13 @@ class DriveUnavailableController : public ViewController, public HostScreen {
   ~DriveUnavailableController() override;
   std::string className() const override { return "DriveUnavailableController"; }
   GtkWidget* contentWidget() override { return page_; }
+  void takeFocus() override {
+    if (accounts_) gtk_widget_grab_focus(accounts_);
+  }
 
  private:
   GtkWidget* page_;
+  GtkWidget* accounts_ = nullptr;  // part of the page
 };
 
 }  // namespace vaelo

@@ -217,6 +217,12 @@ void FolderListScreen::activated(FolderView& view, const std::string& name, cons
   }
 }
 
+void FolderListScreen::takeFocus() {
+  build();
+  const bool showsResults = results_ && gtk_stack_get_visible_child(GTK_STACK(stack_)) == results_->widget();
+  (showsResults ? *results_ : *view_).grabFocusWhenLoaded();
+}
+
 std::vector<GtkWidget*> FolderListScreen::headerWidgets(bool narrow) {
   GtkWidget* search = gtk_button_new_from_icon_name("system-search-symbolic");
   gtk_widget_set_tooltip_text(search, _("Search"));

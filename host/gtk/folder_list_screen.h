@@ -32,7 +32,9 @@ class FolderListScreen : public DocumentListController, public HostScreen {
   bool toggleSearch() override;
   bool closeSearch() override;
   void refresh() override { folderView().refresh(); }
-  void takeFocus() override { folderView().grabFocusWhenLoaded(); }
+  void takeFocus() override;
+  void itemMoved(const URL& from, const URL& to) override { folderView().itemMoved(from.path(), to.path()); }
+  void cameBackFrom(const URL& item) override { folderView().setKeyboardItem(item.path()); }
   void showSearch(const std::shared_ptr<SearchController>& search) override;
   void hideSearch() override;
 

@@ -46,6 +46,8 @@ bool GtkDocumentInteraction::present(const ShareAnchor& anchor) {
     sheet_.reset();
     if (const auto delegate = delegate_.lock()) delegate->documentInteractionControllerDidDismissOptionsMenu(*this);
   });
+  // A menu begins there by itself.
+  if (narrow) focusFirstShareRow(content);
   return true;
 }
 

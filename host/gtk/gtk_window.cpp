@@ -11,11 +11,30 @@
 #include "host/gtk/toast.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
+#include "items/dr_item.h"
 #include "platform/platform.h"
 #include "platform/ui/document_list_controller.h"
+#include "platform/ui/preview_controller.h"
 #include "platform/ui/search_controller.h"
+#include "preview/preview_details_view_controller.h"
+#include "preview/preview_item_manager.h"
 
 namespace vaelo {
+
+namespace {
+
+/// The item that a screen is about.
+std::optional<URL> itemOf(ViewController& screen) {
+  if (auto* list = dynamic_cast<DocumentListController*>(&screen)) return list->presentedURL();
+  if (auto* preview = dynamic_cast<PreviewController*>(&screen)) {
+    return preview->itemCount() > 0 ? std::optional(preview->itemAtIndex(0)) : std::nullopt;
+  }
+  const auto* details = dynamic_cast<PreviewDetailsViewController*>(&screen);
+  const auto manager = details ? details->itemManager() : nullptr;
+  return manager && manager->item() ? manager->item()->url() : std::nullopt;
+}
+
+}  // namespace
 
 GtkWindowHost::GtkWindowHost(GtkApplication* application, const Rect& bounds, DriveSyncedStore& tags)
     : Window(bounds),
@@ -191,6 +210,10 @@ void GtkWindowHost::stackChanged(const Stack&, const Stack& newStack, bool anima
     widgets.push_back(page->widget());
   }
   followTop();
+  ScreenPage* top = topPage();
+  if (top && top->hostScreen() && latestStack_.size() > newStack.size()) {
+    if (const auto item = itemOf(*latestStack_.back())) top->hostScreen()->cameBackFrom(*item);
+  }
   latestStack_ = newStack;
   stack_.setPages(widgets, animated, [this, newStack, done = std::move(done)] {
     const auto holds = [](const Stack& stack, const ViewController* screen) {
@@ -203,7 +226,17 @@ void GtkWindowHost::stackChanged(const Stack&, const Stack& newStack, bool anima
     done();
   });
   // The keyboard went to the first button of the page, where Enter would go back.
-  if (ScreenPage* page = topPage()) page->takeFocus();
+  if (top) top->takeFocus();
+}
+
+void GtkWindowHost::returnFocus(GtkWidget* before) {
+  if (ScreenPage* page = topPage()) page->returnFocus(before);
+}
+
+void GtkWindowHost::itemMoved(const URL& from, const URL& to) {
+  for (const auto& [screen, page] : pages_) {
+    if (HostScreen* list = page->hostScreen()) list->itemMoved(from, to);
+  }
 }
 
 void GtkWindowHost::toolbarHiddenChanged(bool hidden, bool) {

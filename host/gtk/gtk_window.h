@@ -36,6 +36,10 @@ class GtkWindowHost : public Window, private NavigationHost, private Presentatio
   /// One at once, with a button that calls `pressed`; it goes after `seconds`, or with 0 when it is dismissed. Its custom
   /// title is a GtkLabel. Owned by the window.
   AdwToast* showToast(const std::string& text, const char* button, std::function<void()> pressed, unsigned seconds);
+  /// After a sheet went; `before` had the keyboard before it came, null when that is gone.
+  void returnFocus(GtkWidget* before);
+  /// Items were moved, or got other names: the lists follow them.
+  void itemMoved(const URL& from, const URL& to);
   /// Puts what `make` makes between header and content of each page, of those that are shown and those to come.
   void setPageBanner(std::function<GtkWidget*()> make);
 

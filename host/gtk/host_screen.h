@@ -6,6 +6,8 @@
 #include <memory>
 #include <vector>
 
+#include "platform/url.h"
+
 namespace vaelo {
 
 class BarButtonItem;
@@ -30,6 +32,10 @@ class HostScreen {
   virtual void refresh() {}
   /// The page came to be the one that shows: its content takes the keyboard, where there is something to do with it.
   virtual void takeFocus() {}
+  /// An item was moved, or got another name.
+  virtual void itemMoved(const URL& /*from*/, const URL& /*to*/) {}
+  /// The page came to be the one that shows again, after that of the item: its row is where the keyboard belongs.
+  virtual void cameBackFrom(const URL& /*item*/) {}
   /// Shows the search that was presented over the screen, and takes it away.
   virtual void showSearch(const std::shared_ptr<SearchController>& /*search*/) {}
   virtual void hideSearch() {}

@@ -188,8 +188,23 @@ void ScreenPage::showHostWidgets() {
 void ScreenPage::takeFocus() {
   GtkRoot* root = gtk_widget_get_root(box_);
   GtkWidget* focus = root ? gtk_root_get_focus(root) : nullptr;
-  if (!hostScreen_ || (focus && gtk_widget_is_ancestor(focus, hostScreen_->contentWidget()))) return;
-  hostScreen_->takeFocus();
+  GtkWidget* content = hostScreen_ ? hostScreen_->contentWidget() : mirror_ ? mirror_->widget() : nullptr;
+  if (!content || (focus && gtk_widget_is_ancestor(focus, content))) return;
+  if (hostScreen_) {
+    hostScreen_->takeFocus();
+  } else {
+    mirror_->takeFocus();
+  }
+}
+
+void ScreenPage::returnFocus(GtkWidget* before) {
+  // A row may show another item by now.
+  const bool wasRow = hostScreen_ && before && gtk_widget_is_ancestor(before, hostScreen_->contentWidget());
+  if (before && !wasRow && gtk_widget_get_mapped(before)) {
+    gtk_widget_grab_focus(before);
+  } else {
+    takeFocus();
+  }
 }
 
 void ScreenPage::showBar() {

@@ -39,6 +39,8 @@ class ScreenPage {
   void refresh();
   /// Gives the keyboard to the content, unless something in it has it.
   void takeFocus();
+  /// After a sheet over the page went; `before` had the keyboard before it came, and may be gone since.
+  void returnFocus(GtkWidget* before);
   /// A widget between header and content; the page owns it.
   void setBanner(GtkWidget* banner);
   void setCanGoBack(bool can);

@@ -159,7 +159,7 @@ void SharePresentation::drop() {
     g_object_unref(std::exchange(flap_, nullptr));
     if (GtkWidget* pages = gtk_overlay_get_child(GTK_OVERLAY(overlay_))) gtk_widget_set_can_focus(pages, TRUE);
   }
-  if (focusBefore_ && gtk_widget_get_mapped(focusBefore_)) gtk_widget_grab_focus(focusBefore_);
+  if (const auto window = window_.lock()) window->returnFocus(focusBefore_);
   g_clear_weak_pointer(&focusBefore_);
 }
 

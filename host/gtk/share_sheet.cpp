@@ -13,6 +13,8 @@ namespace vaelo {
 
 namespace {
 
+constexpr const char* RowsKey = "vaelo-share-rows";
+
 using Callback = std::function<void()>;
 
 void deleteCallback(gpointer held, GClosure*) { delete static_cast<Callback*>(held); }
@@ -112,7 +114,12 @@ GtkWidget* makeShareSheet(const SharedItem& item, const std::string& notice, std
   gtk_scrolled_window_set_max_content_height(GTK_SCROLLED_WINDOW(scrolled), mostHeight);
   gtk_widget_set_size_request(scrolled, 340, -1);
   gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scrolled), box);
+  g_object_set_data(G_OBJECT(scrolled), RowsKey, list);
   return scrolled;
+}
+
+void focusFirstShareRow(GtkWidget* sheet) {
+  gtk_widget_child_focus(static_cast<GtkWidget*>(g_object_get_data(G_OBJECT(sheet), RowsKey)), GTK_DIR_TAB_FORWARD);
 }
 
 }  // namespace vaelo

@@ -25,5 +25,7 @@ struct ShareRow {
 /// The caller sinks the reference. Main thread.
 GtkWidget* makeShareSheet(const SharedItem& item, const std::string& notice, std::vector<ShareRow> rows, int mostHeight,
                           std::function<void()> closed);
+/// Gives the keyboard to the first row of a sheet that shows.
+void focusFirstShareRow(GtkWidget* sheet);
 
 }  // namespace vaelo

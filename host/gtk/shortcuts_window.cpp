@@ -26,51 +26,48 @@ constexpr const char* DeleteKey = "Delete";  // not for people
 constexpr const char* HomeKey = "Home";      // not for people
 constexpr const char* EndKey = "End";        // not for people
 
-constexpr Shortcut General[] = {{"F10", N_("Main Menu")},
-                                {"<Control>question", N_("Keyboard Shortcuts")},
-                                {"Escape <Alt>Left", N_("Back")},
-                                {TabKey, N_("From the List to the Buttons")},
-                                {"<Control>q", N_("Quit")}};
-constexpr Shortcut Folders[] = {{EnterKey, N_("Open")},
-                                {"<Alt>Up", N_("Folder Above")},
-                                {"<Control>f", N_("Search below this folder")},
-                                {"F5 <Control>r", N_("Refresh")},
-                                {"Menu <Shift>F10", N_("Menu of the Item")},
-                                {"F2", N_("Rename")},
-                                {"<Alt>Return", N_("Info")},
-                                {"<Control>m", N_("Move")},
-                                {DeleteKey, N_("Delete")}};
-constexpr Shortcut Selecting[] = {
+constexpr Shortcut GeneralKeys[] = {{"F10", N_("Main Menu")},
+                                    {"<Control>question", N_("Keyboard Shortcuts")},
+                                    {"Escape <Alt>Left", N_("Back")},
+                                    {TabKey, N_("From the List to the Buttons")},
+                                    {"<Control>q", N_("Quit")}};
+constexpr Shortcut FolderKeys[] = {{EnterKey, N_("Open")},
+                                   {"<Alt>Up", N_("Folder Above")},
+                                   {"<Control>f", N_("Search below this folder")},
+                                   {"F5 <Control>r", N_("Refresh")},
+                                   {"Menu <Shift>F10", N_("Menu of the Item")},
+                                   {"F2", N_("Rename")},
+                                   {"<Alt>Return", N_("Info")},
+                                   {"<Control>m", N_("Move")},
+                                   {DeleteKey, N_("Delete")}};
+constexpr Shortcut SelectingKeys[] = {
     {"<Control>a", N_("Select All")}, {"space", N_("Select or Unselect")}, {"<Shift>Down", N_("Select a Range")}};
-constexpr Shortcut Documents[] = {{"<Control>f", N_("Find in this document")},
-                                  {EnterKey, N_("Find Next")},
-                                  {"<Shift>Return", N_("Find Previous")},
-                                  {"<Control>plus", N_("Zoom in")},
-                                  {"<Control>minus", N_("Zoom out")},
-                                  {"<Control>0", N_("Usual Size")},
-                                  {"1", N_("Picture in Its Own Size")},
-                                  {HomeKey, N_("Beginning")},
-                                  {EndKey, N_("End")},
-                                  {"<Control>c", N_("Copy")},
-                                  {"<Control>z", N_("Undo Mark")}};
-constexpr Shortcut SoundAndFilm[] = {{"space", N_("Play or Pause")}, {"m", N_("Mute")}, {"F11 f", N_("Full Screen")}};
+constexpr Shortcut DocumentKeys[] = {{"<Control>f", N_("Find in this document")},
+                                     {EnterKey, N_("Find Next")},
+                                     {"<Shift>Return", N_("Find Previous")},
+                                     {"<Control>plus", N_("Zoom in")},
+                                     {"<Control>minus", N_("Zoom out")},
+                                     {"<Control>0", N_("Usual Size")},
+                                     {"1", N_("Picture in Its Own Size")},
+                                     {HomeKey, N_("Beginning")},
+                                     {EndKey, N_("End")},
+                                     {"<Control>c", N_("Copy")},
+                                     {"<Control>z", N_("Undo Mark")}};
+constexpr Shortcut MediaKeys[] = {{"space", N_("Play or Pause")}, {"m", N_("Mute")}, {"F11 f", N_("Full Screen")}};
 constexpr Shortcut InfoKeys[] = {
     {"<Control>t", N_("Change the Tags")}, {EnterKey, N_("Rename as Typed")}, {"Escape", N_("Keep the Old Name")}};
 
-struct Group {
+struct ShortcutGroup {
   const char* title;
   std::span<const Shortcut> shortcuts;
 };
 
-constexpr Group Groups[] = {{N_("General"), General},
-                            {N_("Folders"), Folders},
-                            {N_("Selecting"), Selecting},
-                            {N_("Documents"), Documents},
-                            {N_("Sound and Film"), SoundAndFilm},
-                            {N_("Info"), InfoKeys}};
+constexpr ShortcutGroup ShortcutGroups[] = {{N_("General"), GeneralKeys},      {N_("Folders"), FolderKeys},
+                                            {N_("Selecting"), SelectingKeys},  {N_("Documents"), DocumentKeys},
+                                            {N_("Sound and Film"), MediaKeys}, {N_("Info"), InfoKeys}};
 
 /// The keys in words, for those who don't see them drawn.
-std::string spoken(const char* keys) {
+std::string spokenKeys(const char* keys) {
   std::string text;
   char** each = g_strsplit(keys, " ", -1);
   for (char** key = each; *key; ++key) {
@@ -92,7 +89,7 @@ GtkWidget* makeShortcutRow(const Shortcut& shortcut) {
   adw_action_row_add_suffix(ADW_ACTION_ROW(row), keys);
   // Drawn keys are no words.
   gtk_accessible_update_state(GTK_ACCESSIBLE(keys), GTK_ACCESSIBLE_STATE_HIDDEN, TRUE, -1);
-  gtk_accessible_update_property(GTK_ACCESSIBLE(row), GTK_ACCESSIBLE_PROPERTY_DESCRIPTION, spoken(shortcut.keys).c_str(),
+  gtk_accessible_update_property(GTK_ACCESSIBLE(row), GTK_ACCESSIBLE_PROPERTY_DESCRIPTION, spokenKeys(shortcut.keys).c_str(),
                                  -1);
   return row;
 }
@@ -109,7 +106,7 @@ GtkWindow* showShortcutsWindow(GtkWindow* over) {
   gtk_window_set_default_size(window, 360, 560);
   GtkWidget* page = adw_preferences_page_new();
   GtkWidget* first = nullptr;
-  for (const Group& group : Groups) {
+  for (const ShortcutGroup& group : ShortcutGroups) {
     GtkWidget* rows = adw_preferences_group_new();
     adw_preferences_group_set_title(ADW_PREFERENCES_GROUP(rows), _(group.title));
     for (const Shortcut& shortcut : group.shortcuts) {

@@ -44,7 +44,7 @@ void fit(GtkWidget* label, AdwToastOverlay* toasts) {
   if (toast) gtk_widget_set_margin_bottom(toast, room.below);
 }
 
-void shown(GtkWidget* label, gpointer) {
+void fitWhenShown(GtkWidget* label, gpointer) {
   GtkWidget* toasts = gtk_widget_get_ancestor(label, ADW_TYPE_TOAST_OVERLAY);
   if (toasts) fit(label, ADW_TOAST_OVERLAY(toasts));
 }
@@ -68,7 +68,7 @@ AdwToast* makeToast(const std::string& text, const char* button) {
   gtk_label_set_xalign(GTK_LABEL(label), 0);
   gtk_widget_add_css_class(label, "heading");
   g_object_set_data_full(G_OBJECT(label), ButtonKey, g_strdup(button ? button : ""), g_free);
-  g_signal_connect(label, "map", G_CALLBACK(shown), nullptr);
+  g_signal_connect(label, "map", G_CALLBACK(fitWhenShown), nullptr);
   AdwToast* toast = adw_toast_new("");
   adw_toast_set_custom_title(toast, label);
   if (button) adw_toast_set_button_label(toast, button);

@@ -334,6 +334,38 @@ TEST_F(FolderViewTest, TheKeyboardStaysInTheListWhenItsRowGoes) {
   EXPECT_EQ(focusedRow(), "b");
 }
 
+TEST_F(FolderViewTest, TheKeyboardGoesWithAnItemThatGetsAnotherName) {
+  for (const char* name : {"a", "b", "c"}) folder_.write(name);
+  view_->grabFocusWhenLoaded();
+  open();
+  view_->itemMoved(folder_.path() + "/a", folder_.path() + "/z");
+  folder_.write("z");
+  folder_.remove("a");
+  EXPECT_TRUE(waitUntil([&] { return focusedRow() == "z"; })) << focusedRow();
+}
+
+TEST_F(FolderViewTest, AnEmptyFolderKeepsTheKeyboardForTheFirstItem) {
+  view_->grabFocusWhenLoaded();
+  open();
+  folder_.write("a");
+  EXPECT_TRUE(waitUntil([&] { return focusedRow() == "a"; })) << focusedRow();
+}
+
+TEST_F(FolderViewTest, TheKeyboardComesBackToTheRowAtItsPlaceWhenThatWentMeanwhile) {
+  GtkWidget* elsewhere = addEntry();
+  for (const char* name : {"a", "b", "c"}) folder_.write(name);
+  view_->grabFocusWhenLoaded();
+  open();
+  view_->setKeyboardItem(folder_.path() + "/b");
+  view_->setKeyboardItem("/elsewhere/c");
+  gtk_widget_grab_focus(elsewhere);
+  folder_.remove("b");
+  ASSERT_TRUE(waitUntil([&] { return view_->itemCount() == 2; }));
+  EXPECT_EQ(focusedRow(), "");
+  view_->grabFocus();
+  EXPECT_TRUE(waitUntil([&] { return focusedRow() == "c"; })) << focusedRow();
+}
+
 TEST_F(FolderViewTest, TabLeavesTheListAtOnce) {
   GtkWidget* elsewhere = addEntry();
   for (int i = 0; i < 20; ++i) folder_.write("file " + std::to_string(i));

@@ -303,6 +303,10 @@ void FolderModel::forEachSelected(const std::function<void(guint)>& visit) const
 
 bool FolderModel::selectRange(guint position, guint count, bool only) {
   if (!selectable_) return false;
+  if (only && rangeWished_) {
+    rangeWished_();
+    return true;
+  }
   if (only) gtk_bitset_remove_all(selection_);
   gtk_bitset_add_range(selection_, position, count);
   tellSelection(0, itemCount());

@@ -66,6 +66,8 @@ class FolderModel {
   std::vector<std::string> selectedNames() const;
   std::vector<std::size_t> selectedRows() const;
   void setSelectable(bool selectable) { selectable_ = selectable; }
+  /// Called when the toolkit's lists wish a range of rows alone to be selected; without it they get it.
+  void onRangeWished(std::function<void()> handler) { rangeWished_ = std::move(handler); }
   /// Called after the selection changed, whoever changed it.
   void onSelectionChanged(std::function<void()> handler) { selectionChanged_ = std::move(handler); }
 
@@ -101,6 +103,7 @@ class FolderModel {
   bool selectable_ = false;
   std::optional<Transition> transition_;
   std::function<void()> selectionChanged_;
+  std::function<void()> rangeWished_;
   std::shared_ptr<FolderModel*> self_;  // for items that outlive this
 };
 

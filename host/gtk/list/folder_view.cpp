@@ -56,6 +56,7 @@ GtkListItemFactory* makeFactory(RowContext& context) {
 
 FolderView::FolderView()
     : icons_([this] { redrawRows(); }),
+      range_(model_),
       details_(model_,
                [](FolderItem& item) {
                  if (item.row) folderRowItemChanged(item.row);
@@ -73,6 +74,8 @@ FolderView::FolderView()
   });
   makePages();
   makeList();
+  keyboardRow_ = std::make_unique<KeyboardRow>(widget(), model_, [this] { return focusedItem(); });
+  model_.onRangeWished([this] { extendToFocus(); });
   connectKeys();
   connectContextGestures();
   connectDrags();
@@ -86,6 +89,7 @@ FolderView::~FolderView() {
   g_signal_handlers_disconnect_by_data(pages_, this);
   g_signal_handlers_disconnect_by_data(adjustment(), this);
   g_signal_handlers_disconnect_by_data(list_, this);
+  keyboardRow_.reset();
   swipe_.reset();
   markDrag_.reset();
   // The window may hold the list that the pointer is over for a while, but what it lists goes now.
@@ -121,6 +125,8 @@ void FolderView::makePages() {
   emptyPage_ = ADW_STATUS_PAGE(adw_status_page_new());
   adw_status_page_set_icon_name(emptyPage_, "folder-symbolic");
   adw_status_page_set_title(emptyPage_, _("This folder is empty"));
+  // Where there is no row, the keyboard would be left on a page that is out of sight.
+  gtk_widget_set_focusable(GTK_WIDGET(emptyPage_), TRUE);
   errorPage_ = ADW_STATUS_PAGE(adw_status_page_new());
   adw_status_page_set_icon_name(errorPage_, "dialog-error-symbolic");
   adw_status_page_set_title(errorPage_, _("This folder can’t be read"));
@@ -183,8 +189,8 @@ void FolderView::setListModel(GtkSelectionModel* model) {
 void FolderView::setEditing(bool editing) {
   if (editing == context_.editing) return;
   context_.editing = editing;
-  lastPressed_.clear();
   swipe_->close();
+  range_.forget();
   model_.setSelectable(editing);
   setRubberband();
   if (!editing) setSelection({});
@@ -245,15 +251,12 @@ void FolderView::setEntries(std::vector<FolderEntry> entries) {
   errorNumber_ = 0;
   loaded_ = true;
   // All rows are made anew, and the keyboard would be left without one.
-  const FolderItem* focused = focusedItem();
-  const std::optional<std::string> focusedName = focused ? std::optional(std::string(focused->name)) : std::nullopt;
+  const bool hadFocus = hasFocus();
+  keyboardRow_->hold(true);
   model_.setEntries(std::move(entries));
   showPage();
-  keepFocus(false);
-  if (focusedName) {
-    focusRevealed_ = scrollTo(*focusedName);
-    if (!focusRevealed_) grabFocus();
-  }
+  keyboardRow_->hold(false);
+  keepFocus(hadFocus);
   if (events_.itemsChanged) events_.itemsChanged();
 }
 
@@ -305,7 +308,8 @@ void FolderView::folderRead(std::shared_ptr<const FolderSnapshot> next, const st
                             int errorNumber) {
   updating_ = false;
   const bool first = !loaded_;
-  const bool hadFocus = focusedItem() != nullptr;
+  const bool hadFocus = hasFocus();
+  keyboardRow_->hold(true);
   if (next) {
     loaded_ = true;
     errorNumber_ = 0;
@@ -321,6 +325,7 @@ void FolderView::folderRead(std::shared_ptr<const FolderSnapshot> next, const st
     if (events_.readFailed) events_.readFailed(errorNumber);
   }
   showPage();
+  keyboardRow_->hold(false);
   keepFocus(hadFocus);
   if (errorNumber_ == 0 && (first || !splices.empty()) && events_.itemsChanged) events_.itemsChanged();
   if (pending_.everything || !pending_.names.empty()) lookUpChanges();
@@ -382,14 +387,8 @@ void FolderView::showPage() {
 void FolderView::pressed(guint position) {
   if (swipe_->takesPress() || position >= model_.itemCount()) return;
   if (context_.editing) {
-    const auto begin = std::exchange(extends_, false) ? model_.indexOf(lastPressed_) : std::nullopt;
-    if (begin) {
-      const guint first = std::min(position, static_cast<guint>(*begin));
-      const guint last = std::max(position, static_cast<guint>(*begin));
-      model_.selectRange(first, last - first + 1, false);
-      return;
-    }
-    lastPressed_ = nameAt(position);
+    if (std::exchange(extends_, false) && range_.extendTo(position)) return;
+    range_.begin(position);
     model_.setSelected(position, !model_.isSelected(position));
   } else if (events_.activated) {
     events_.activated(nameAt(position));
@@ -434,7 +433,45 @@ double FolderView::scrollPosition() const { return gtk_adjustment_get_value(adju
 
 void FolderView::setScrollPosition(double position) { gtk_adjustment_set_value(adjustment(), position); }
 
-void FolderView::grabFocus() { gtk_widget_grab_focus(list_); }
+bool FolderView::hasFocus() const {
+  GtkWidget* now = focus();
+  return now && gtk_widget_is_ancestor(now, widget());
+}
+
+void FolderView::grabFocus() {
+  GtkWidget* shown = gtk_stack_get_visible_child(pages_);
+  if (shown == GTK_WIDGET(errorPage_)) {
+    gtk_widget_child_focus(shown, GTK_DIR_TAB_FORWARD);
+    return;
+  }
+  const std::optional<std::size_t> row = keyboardRow_->position();
+  if (shown != scroller_ || !row) {
+    gtk_widget_grab_focus(shown == scroller_ ? list_ : shown);
+    return;
+  }
+  const FolderItem* item = model_.liveItem(nameAt(*row));
+  GtkWidget* listItem = item && item->row ? gtk_widget_get_parent(item->row) : nullptr;
+  // A row that has no place yet would make the list scroll to where it guesses it.
+  if (listItem && gtk_widget_get_height(listItem) > 0) {
+    gtk_widget_grab_focus(listItem);
+  } else {
+    focusRevealed_ = scrollTo(nameAt(*row));
+  }
+}
+
+std::string FolderView::nameOfPath(const std::string& path) const {
+  if (folder_.empty()) return path;
+  const std::size_t slash = path.rfind('/');
+  return slash != std::string::npos && path.substr(0, slash) == folder_ ? path.substr(slash + 1) : "";
+}
+
+void FolderView::itemMoved(const std::string& fromPath, const std::string& toPath) {
+  const std::string from = nameOfPath(fromPath);
+  const std::string to = nameOfPath(toPath);
+  if (!from.empty() && !to.empty()) keyboardRow_->renamed(from, to);
+}
+
+void FolderView::setKeyboardItem(const std::string& path) { keyboardRow_->set(nameOfPath(path)); }
 
 GtkWidget* FolderView::focus() const {
   GtkRoot* root = gtk_widget_get_root(widget());
@@ -452,7 +489,11 @@ void FolderView::keepFocus(bool hadFocus) {
   // A window that comes up gives the focus to its first button by itself.
   const bool stayed = now == focusBefore_ || (!focusBefore_ && !GTK_IS_EDITABLE(now));
   const bool takes = std::exchange(takesFocus_, false) && stayed;
-  if (takes || (hadFocus && !focusedItem())) grabFocus();
+  const FolderItem* focused = focusedItem();
+  const bool misplaced = hadFocus && (!focused || model_.indexOf(focused->name) != keyboardRow_->position());
+  // Whoever types a name meanwhile goes to its row in the next frame.
+  const bool goesElsewhere = focusRevealed_ && model_.indexOf(revealed_);
+  if (takes || (misplaced && !goesElsewhere)) grabFocus();
 }
 
 }  // namespace vaelo

@@ -14,7 +14,9 @@
 #include "host/gtk/list/folder_monitor.h"
 #include "host/gtk/list/folder_row.h"
 #include "host/gtk/list/icon_table.h"
+#include "host/gtk/list/keyboard_row.h"
 #include "host/gtk/list/mark_drag.h"
+#include "host/gtk/list/range_selection.h"
 #include "host/gtk/list/row_swipe.h"
 #include "host/gtk/list/type_ahead.h"
 #include "host/gtk/list/worker.h"
@@ -98,8 +100,12 @@ class FolderView {
   /// Pixels from the top, for taking a place up again.
   double scrollPosition() const;
   void setScrollPosition(double position);
-  /// Moves the keyboard's focus to the list.
+  /// Moves the keyboard's focus to the row that had it last, or what is there instead of rows.
   void grabFocus();
+  /// An item was moved, or got another name. If it has the keyboard, it keeps it.
+  void itemMoved(const std::string& fromPath, const std::string& toPath);
+  /// The keyboard belongs to the item at the path, if it is listed.
+  void setKeyboardItem(const std::string& path);
   /// The same as soon as there are rows, unless the user has gone elsewhere by then.
   void grabFocusWhenLoaded();
   /// The model behind the rows, for the owner's own tests and measurements.
@@ -135,8 +141,13 @@ class FolderView {
   GtkAdjustment* adjustment() const;
   FolderItem* focusedItem() const;
   GtkWidget* focus() const;
-  /// After the rows have changed; `hadFocus`: before, one of them had it.
+  bool hasFocus() const;
+  /// After the rows have changed; `hadFocus`: before, they had it.
   void keepFocus(bool hadFocus);
+  /// The name of what lies at the path in this list, empty for what lies elsewhere.
+  std::string nameOfPath(const std::string& path) const;
+  /// Shift and a key moved the keyboard.
+  void extendToFocus();
 
   FolderViewEvents events_;
   std::string folder_;  // empty: entries
@@ -148,7 +159,6 @@ class FolderView {
   bool focusRevealed_ = false;
   bool takesFocus_ = false;
   const GtkWidget* focusBefore_ = nullptr;  // to compare with; may be gone
-  std::string lastPressed_;                 // where a range begins
   bool extends_ = false;                    // the press that is under way has Shift
   double pressX_ = 0;                       // where it began
   double pressY_ = 0;
@@ -159,6 +169,7 @@ class FolderView {
 
   FolderModel model_;
   IconTable icons_;
+  RangeSelection range_;
   RowContext context_;
   DetailsLoader details_;
   FolderMonitor monitor_;
@@ -174,6 +185,7 @@ class FolderView {
   AdwStatusPage* errorPage_;
   guint spinnerTimer_ = 0;
   gint64 lastPull_ = 0;
+  std::unique_ptr<KeyboardRow> keyboardRow_;
   std::unique_ptr<RowSwipe> swipe_;
   std::unique_ptr<MarkDrag> markDrag_;
 };

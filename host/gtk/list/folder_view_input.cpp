@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 // Keys and gestures of FolderView.
 
+#include <algorithm>
 #include <array>
 #include <cmath>
 
@@ -11,6 +12,14 @@ namespace vaelo {
 namespace {
 
 constexpr double WandersAfter = 24;  // pixels; half a row
+constexpr std::array RowKeys = {GDK_KEY_Up,      GDK_KEY_KP_Up,      GDK_KEY_Down,      GDK_KEY_KP_Down,
+                                GDK_KEY_Left,    GDK_KEY_KP_Left,    GDK_KEY_Right,     GDK_KEY_KP_Right,
+                                GDK_KEY_Home,    GDK_KEY_KP_Home,    GDK_KEY_End,       GDK_KEY_KP_End,
+                                GDK_KEY_Page_Up, GDK_KEY_KP_Page_Up, GDK_KEY_Page_Down, GDK_KEY_KP_Page_Down};
+
+bool goesOn(guint key) {
+  return std::any_of(RowKeys.begin(), RowKeys.end(), [&](auto each) { return static_cast<guint>(each) == key; });
+}
 
 FolderItem* itemOfRow(GtkWidget* row) {
   GObject* item = row ? folderRowItem(row) : nullptr;
@@ -35,6 +44,11 @@ void FolderView::connectKeys() {
                    }),
                    this);
   gtk_widget_add_controller(widget(), keys);
+}
+
+void FolderView::extendToFocus() {
+  const FolderItem* focused = focusedItem();
+  if (const auto row = focused ? model_.indexOf(focused->name) : std::nullopt) range_.extendTo(*row);
 }
 
 bool FolderView::keyPressed(guint key, GdkModifierType modifiers) {
@@ -63,7 +77,12 @@ bool FolderView::keyPressed(guint key, GdkModifierType modifiers) {
   FolderItem* focused = focusedItem();
   const std::size_t last = model_.itemCount() - 1;
   const std::size_t focusedRow = focused ? model_.indexOf(focused->name).value_or(last) : last;
+  // Shift and a key that goes to another row select all up to there, from this row on unless they did so before.
+  if (context_.editing && focused && (modifiers & GDK_SHIFT_MASK) && !range_.endsAt(focusedRow) && goesOn(key)) {
+    range_.begin(focusedRow);
+  }
   if (key == GDK_KEY_space && plain && context_.editing && focused && !typeAhead_.isTyping(now)) {
+    extends_ = modifiers & GDK_SHIFT_MASK;
     pressed(static_cast<guint>(focusedRow));
     return true;
   }

@@ -22,6 +22,8 @@ class ViewMirror : public ViewObserver {
   ~ViewMirror() override;
   ViewMirror(const ViewMirror&) = delete;
   ViewMirror& operator=(const ViewMirror&) = delete;
+  /// Gives the keyboard to what scrolls, and so to nothing that could be changed by the first key.
+  void takeFocus() { gtk_widget_grab_focus(scroller_); }
   GtkWidget* widget() const { return outer_; }
 
   void viewChanged(View& view, ViewChange change) override;
