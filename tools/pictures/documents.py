@@ -9,7 +9,7 @@ PREVIEWS = {"preview-picture": "Pictures/Photo 3.jpg", "preview-document": "Docu
             "preview-source": "Documents/Projects/Boat/main.cpp", "preview-archive": "Archives/Old.zip",
             "preview-sound": "Media/Tone.wav", "preview-film": "Media/Clip.avi", "preview-unknown": "Archives/Disk.img",
             "preview-damaged": "Pictures/Torn.jpg"}
-NAMES = (*PREVIEWS, "preview-not-downloaded", "preview-downloading", "details", "details-rename", "details-tags")
+NAMES = (*PREVIEWS, "preview-note", "preview-mark", "preview-not-downloaded", "preview-downloading", "details", "details-rename", "details-tags")
 
 
 def add_documents(app):
@@ -20,6 +20,32 @@ def add_documents(app):
     (app.drive / "Pictures" / "Torn.jpg").write_bytes(whole[:100])
 
 
+def mark(stage):
+    """A note on the first page, and what can be done with it."""
+    app = stage.app
+    stage.show("Documents/Contract.pdf")
+    if stage.narrow:
+        stage.click("Find and Markup", None)
+        stage.choose("_Markup")
+    else:
+        stage.click("Markup", None)
+    stage.settle()
+    stage.click("Note", None)
+    place = (str(stage.size[0] * 2 // 5), str(stage.size[1] * 2 // 5))
+    app.mouse("mousemove", "--sync", *place, "click", "1")
+    stage.wait("Add Note")
+    app.type("Mind the bridge")
+    stage.shot("preview-note")
+    app.key("ctrl+Return")
+    stage.wait("Saved")
+    stage.click("Note", None)
+    app.mouse("mousemove", "--sync", *place, "click", "1")
+    stage.wait("Edit Note")
+    stage.shot("preview-mark")
+    app.key("Escape", "Escape", "Escape")
+    app.wait_title("Documents")
+
+
 def play(stage):
     app = stage.start(add_documents)
     app.wait("Documents", "list item")
@@ -27,6 +53,8 @@ def play(stage):
         if name in stage.wanted:
             stage.show(document)
             stage.shot(name)
+    if stage.wanted & {"preview-note", "preview-mark"}:
+        mark(stage)
     stage.show("Documents/Thesis.pdf")
     stage.wait("Thesis.pdf", "label")
     stage.shot("preview-not-downloaded")

@@ -57,6 +57,7 @@ void MarkPopover::show(const GdkRectangle& place, const PageMark& mark, Events e
   gtk_popover_set_pointing_to(GTK_POPOVER(popover_), &place);
   gtk_popover_popup(GTK_POPOVER(popover_));
   gtk_widget_grab_focus(mayEdit() ? edit_ : remove_);
+  gtk_label_select_region(GTK_LABEL(label_), 0, 0);  // which a text that had the focus before is
 }
 
 void MarkPopover::finish(const std::function<void()>& event) {

@@ -47,7 +47,7 @@ MarkupBar::MarkupBar(Events events)
       revealer_(GTK_WIDGET(g_object_ref_sink(gtk_revealer_new()))),
       undo_(gtk_button_new_from_icon_name("edit-undo-symbolic")),
       state_(gtk_label_new(nullptr)) {
-  GtkWidget* box = gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 6);
+  GtkWidget* box = gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 0);
   gtk_widget_add_css_class(box, "toolbar");
   gtk_box_append(GTK_BOX(box), makeTool(MarkTool::Highlight, _("Highlight"), _("Highlight Text")));
   gtk_box_append(GTK_BOX(box), makeTool(MarkTool::Ink, _("Draw"), _("Draw on the Page")));
