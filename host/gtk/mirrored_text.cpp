@@ -48,7 +48,8 @@ bool isLargeText() {
   return textScale() >= large;
 }
 
-int linesOf(const Label& label) { return isLargeText() ? 2 * label.numberOfLines() : label.numberOfLines(); }
+// A word as long as those of German is broken and fills two lines by itself.
+int linesOf(const Label& label) { return isLargeText() ? 3 * label.numberOfLines() : label.numberOfLines(); }
 
 }  // namespace
 
