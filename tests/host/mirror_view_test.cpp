@@ -274,7 +274,7 @@ TEST_F(MirrorViewTest, LargeLettersTakeFurtherLines) {
   EXPECT_TRUE(gtk_label_get_wrap(shown));
   EXPECT_EQ(gtk_label_get_lines(shown), 3);
   const double line = PangoGraphics().measure("X", label->font(), 0, 1).height;
-  EXPECT_NEAR(label->frame().height, 2 * line, 2);
+  EXPECT_NEAR(label->frame().height, 3 * line, 2);
 }
 
 TEST_F(MirrorViewTest, APictureInATextStandsNearerToWhatFollowsIt) {
