@@ -42,9 +42,10 @@ class MemoryDocumentInteraction : public DocumentInteractionController {
     wasAnimated = animated;
     return hasSomethingToOffer;
   }
-  bool presentOptionsMenuFromBarButtonItem(const BarButtonItemRef& item, bool) override {
+  bool presentOptionsMenuFromBarButtonItem(const BarButtonItemRef& item, bool animated) override {
     record_.calls.push_back("menu " + url_.path());
     fromButton = item;
+    wasAnimated = animated;
     return hasSomethingToOffer;
   }
   bool presentOpenInMenu() override {

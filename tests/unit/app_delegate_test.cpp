@@ -166,7 +166,7 @@ TEST_F(AppDelegateTest, ARecentDocumentIsFoundByItsIdentifierThenByItsURL) {
 TEST_F(AppDelegateTest, AShortcutThatLeadsNowhereDoesNothing) {
   launch();
   shortcut(RecentDocumentShortcutType);
-  shortcut("another.type");
+  shortcut("another.type", {{RecentDocumentURLKey, archiveURL(document)}});
   EXPECT_EQ(nav->viewControllers().size(), 1u);
   EXPECT_TRUE(logged("INFO", "Shortcut action: another.type"));
 }
@@ -197,6 +197,18 @@ TEST_F(AppDelegateTest, ASearchResultIsShownSoon) {
   EXPECT_EQ(shown(), document);
   EXPECT_TRUE(logged("INFO", "Quarry Search Result: open documentID \"42\""));
   EXPECT_TRUE(logged("INFO", "Quarry documentID 42 is URL: " + document.absoluteString()));
+}
+
+TEST_F(AppDelegateTest, ASearchResultThatIsNotDownloadedIsNamedAsItWillBe) {
+  const URL coming = addPromise("Plans/Coming.pdf");
+  for (auto& [path, item] : memory.disk.items) {
+    if (path.find("Coming.pdf") != std::string::npos) item.documentID = 43;
+  }
+  launch();
+  EXPECT_TRUE(continueActivity(SearchResultActivityType, {{SearchResultIdentifierKey, "43"}}));
+  runMainQueue();
+  EXPECT_TRUE(logged("INFO", "Quarry documentID 43 is URL: " + coming.absoluteString()));
+  EXPECT_EQ(shown(), coming);
 }
 
 TEST_F(AppDelegateTest, AnUnknownSearchResultIsLogged) {

@@ -200,6 +200,7 @@ TEST_F(NavStackTest, AWarpToADocumentPutsItsPreviewOnTop) {
   EXPECT_EQ(nav->topViewController(), GlimpseItemController::defaultController());
   ASSERT_NE(nav->itemManager(), nullptr);
   EXPECT_EQ(nav->itemManager()->item()->url(), document);
+  EXPECT_FALSE(loggedStarting("WARNING", "warpToNewURL failed"));
   EXPECT_EQ(nav->itemManager()->mode(), 0);
 }
 

@@ -255,6 +255,7 @@ TEST_F(PreviewBaseTest, ShareShowsTheSheetAtItsButton) {
   const auto sheet = memory.screens.interactions.front();
   EXPECT_EQ(sheet->url(), document);
   EXPECT_EQ(sheet->fromButton, screen->barButtonActionItem());
+  EXPECT_TRUE(sheet->wasAnimated);
   EXPECT_EQ(manager->documentInteractionController(), sheet);
   EXPECT_FALSE(loggedStarting("INFO", "URL resolved to "));
 }
@@ -382,6 +383,47 @@ TEST_F(PreviewBaseTest, OtherProgressIsIgnoredButStaysObserved) {
   other->setUnits(1, 2);
   none->setUnits(1, 4);
   EXPECT_EQ(screen->updates, 2);
+}
+
+TEST_F(PreviewBaseTest, NewButtonsOfAnItemWithAPlaceAreEnabledAtOnce) {
+  push();
+  screen->configureButtons();
+  for (const BarButtonItemRef& button :
+       {screen->barButtonActionItem(), screen->barButtonDeleteItem(), screen->barButtonMoveItem()}) {
+    EXPECT_TRUE(button->enabled());
+  }
+}
+
+TEST_F(PreviewBaseTest, WithoutAPlaceThereIsNoProgressToFollow) {
+  screen->setItemManager({});
+  screen->registerForProgress();
+  EXPECT_EQ(screen->subscriber(), nullptr);
+  const auto item = DRItem::initWithURL(document);
+  item->setResolvedURL(std::nullopt);
+  manager->setItemUpdatePreview(item, false);
+  screen->setItemManager(manager);
+  screen->registerForProgress();
+  EXPECT_EQ(screen->subscriber(), nullptr);
+}
+
+TEST_F(PreviewBaseTest, ProgressOfUnknownLengthIsNone) {
+  push();
+  screen->registerForProgress();
+  const auto progress = std::make_shared<MemoryProgress>();
+  memory.fileProgress.publish(document, progress);
+  progress->setUnits(70, 0);
+  EXPECT_TRUE(logged("DEBUG", "Progress 0%: " + progress->description()));
+  EXPECT_EQ(screen->lastProgressChunk(), 0);
+}
+
+TEST_F(PreviewBaseTest, AProgressMayBeWithdrawnWhenTheScreenIsGone) {
+  screen->registerForProgress();
+  const auto progress = std::make_shared<MemoryProgress>();
+  const auto withdraw = memory.fileProgress.publish(document, progress);
+  screen = nullptr;
+  progress->setUnits(1, 2);
+  withdraw();
+  EXPECT_FALSE(loggedStarting("INFO", "Progress "));
 }
 
 }  // namespace

@@ -468,5 +468,24 @@ TEST_F(PreviewFollowingTest, SaysWhatItPresents) {
   EXPECT_TRUE(logged("DEBUG", "presentedItemURL " + text(document)));
 }
 
+TEST_F(PreviewFollowingTest, NoticesDuringTheRefreshAreAbsorbedByIt) {
+  setModified(document, seconds(10));
+  const auto manager = show();
+  memory.coordination.othersChanged(document);
+  bool pending = false;
+  const auto token = glimpse()->changed().connect([&](ViewController&, ViewControllerChange) {
+    pending = manager->refreshPending();
+    manager->presentedItemDidChange();
+  });
+  glimpse()->setTitle("old");
+  pending = false;
+  advance(seconds(1));
+  EXPECT_TRUE(pending) << "until the refresh is over";
+  EXPECT_FALSE(manager->refreshPending());
+  advance(seconds(2));
+  EXPECT_EQ(times("INFO", "Refreshing " + text(document)), 1u);
+  EXPECT_FALSE(loggedStarting("ERROR", "UNEXPECTED: path changed")) << "it is where it was";
+}
+
 }  // namespace
 }  // namespace vaelo

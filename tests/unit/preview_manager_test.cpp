@@ -243,5 +243,27 @@ TEST_F(PreviewManagerTest, TheListsOfADocumentAreThoseOfItsFolder) {
   EXPECT_TRUE(logged("ERROR", ": Couldn't build DLC stack for " + text(document.deletingLastPathComponent()) + "."));
 }
 
+TEST_F(PreviewManagerTest, APreparationForgetsDetailsThatWereMadeBefore) {
+  const auto manager = makeManager(0);
+  manager->createDetailsViewController();
+  manager->previewItem(DRItem::initWithURL(document));
+  EXPECT_EQ(manager->detailsViewController(), nullptr);
+}
+
+TEST_F(PreviewManagerTest, ListsThatCouldBeMadeAreNoError) {
+  EXPECT_TRUE(PreviewItemManager::dlcStackForURL(document));
+  EXPECT_FALSE(loggedStarting("ERROR", ": Couldn't build DLC stack"));
+}
+
+TEST_F(PreviewManagerTest, WithoutAnItemNobodyIsAskedForABookmark) {
+  memory.provider.holdsAnswers = true;
+  const auto manager = makeManager();
+  becomeActive();
+  runAllQueues();
+  EXPECT_TRUE(manager->filePresenterRegistered());
+  EXPECT_TRUE(logged("DEBUG", "Becoming active for (null)"));
+  EXPECT_TRUE(memory.provider.held.empty());
+}
+
 }  // namespace
 }  // namespace vaelo
