@@ -178,9 +178,14 @@ class WhereScreensBegin(KeyboardWindow):
         app.key("Menu")
         app.wait("Share…", "menu item")
         app.key("s")
-        row = app.wait("Share Report.txt", "list")
-        first = next(each for each in app.accessibility.showing() if each[0] == "list item" and each[3] >= row[3])
-        self.at(first[1])
+        app.wait("Share Report.txt", "list")
+
+        def is_at_first():
+            roles_and_names = [row[:2] for row in app.accessibility.showing()]
+            behind = roles_and_names[roles_and_names.index(("list", "Share Report.txt")):]
+            first = next((name for role, name in behind if role == "list item"), None)
+            return ("list item", first) in app.accessibility.focused()
+        wait_for(lambda: f"the first row; the keyboard is at {app.accessibility.focused()}", is_at_first)
 
     def test_accounts_begin_with_the_first_and_end_with_the_way_back_to_them(self):
         app = self.app
