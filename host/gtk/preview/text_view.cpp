@@ -28,7 +28,6 @@ std::string noteFor(const TextPiece& piece) {
   if (!piece.brokeLines) return note;
   const char* broken = _("Lines that are too long go on in the next line.");
   return note.empty() ? broken : sentences(note, broken);
-  return note;
 }
 
 std::string sentenceFor(const std::string& error) {
