@@ -77,6 +77,25 @@ class Pictures(unittest.TestCase):
         self.wait_colours("red", "blue")
         self.leave()
 
+    def wait_percent(self, percent):
+        wait_for(lambda: f"{percent} %; showing: {self.app.names()[:30]}", lambda: self.app.find(f"{percent} %"))
+
+    def test_the_wheel_a_double_click_and_keys_look_closer(self):
+        self.open("Picture.png")
+        self.wait_colours("red", "blue")
+        x, y = map(str, self.middle)
+        self.app.mouse("mousemove", "--sync", x, y, "click", "--repeat", "2", "--delay", "80", "1")
+        self.wait_percent(200)
+        self.app.mouse("click", "4")
+        self.wait_percent(250)
+        self.app.mouse("click", "5")
+        self.wait_percent(200)
+        self.app.key("0")
+        self.wait_percent(100)
+        self.app.key("plus")
+        self.wait_percent(140)
+        self.leave()
+
     def test_an_animation_moves_for_as_long_as_it_is_seen(self):
         self.open("Moving.gif")
         for colour in ("red", "blue", "red", "blue"):

@@ -1,5 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 // What a preview's page says of a document that is not there, goes, comes, or becomes something else.
+#include <sys/stat.h>
+
 #include "host/drive/drive_file_progress.h"
 #include "host/drive/promise_file.h"
 #include "tests/host/list_test_folder.h"
@@ -94,6 +96,26 @@ TEST_F(PresenterPageTest, ADocumentThatComes) {
   rename(partial, document);
   std::filesystem::remove(promisePathFor(document));
   EXPECT_TRUE(waitUntil([&] { return !said().empty() && said().find("Not downloaded") == std::string::npos; })) << said();
+}
+
+TEST_F(PresenterPageTest, WhatTakesLongSaysSoAfterAFifthOfASecond) {
+  const std::string path = g_getenv("PATH");
+  write(root + "/bin/soffice", "#!/bin/bash\nexec tail -f /dev/null\n");
+  ASSERT_EQ(::chmod((root + "/bin/soffice").c_str(), 0755), 0);
+  g_setenv("PATH", (root + "/bin:" + path).c_str(), TRUE);
+  write(drive + "/Letter.odt", "PK\x03\x04 a letter");
+  const gint64 begun = g_get_monotonic_time();
+  show(drive + "/Letter.odt");
+  EXPECT_EQ(said(), "");
+  EXPECT_TRUE(says("Loading…")) << said();
+  EXPECT_GE(g_get_monotonic_time() - begun, 199000);
+  EXPECT_TRUE(says("Preparing the document to be shown")) << said();
+  write(document, noText);
+  source->pointTo(document);
+  controller->reloadData();
+  EXPECT_TRUE(says("9 bytes")) << "it can be left for another document";
+  EXPECT_EQ(said().find("Loading…"), std::string::npos);
+  g_setenv("PATH", path.c_str(), TRUE);
 }
 
 // An empty frame in between would flicker, and hold up the document by a whole frame.

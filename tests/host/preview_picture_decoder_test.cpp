@@ -129,10 +129,45 @@ TEST_F(PictureDecoderTest, PicturesStandAsTheCameraWasHeld) {
     const Decoded all = whole(64, 64);
     EXPECT_EQ(all.text, lies ? "32 64 32 64 -1" : "64 32 64 32 -1");
     EXPECT_EQ(corners(all, lies ? 32 : 64, lies ? 64 : 32), shown[orientation - 1]);
+    EXPECT_EQ(all.colourAt(lies ? 3 : 20, lies ? 20 : 3), shown[orientation - 1][0]) << "in rows as long as it is wide";
     EXPECT_EQ(part(lies ? "16 0 16 32" : "32 0 32 16", 8, 8).middle(), shown[orientation - 1][1])
         << "the part at the top right";
     EXPECT_EQ(part(lies ? "0 32 16 32" : "0 16 32 16", 8, 8).middle(), shown[orientation - 1][2]) << "at the bottom left";
   }
+}
+
+TEST_F(PictureDecoderTest, APhotographIsReadAgainForItsDetail) {
+  // Stripes that are grey where the photograph was read small.
+  const GRef<GdkPixbuf> striped(gdk_pixbuf_new(GDK_COLORSPACE_RGB, FALSE, 8, 512, 256));
+  gdk_pixbuf_fill(striped.get(), 0x000000ff);
+  for (int x = 0; x < 512; x += 16) {
+    const GRef<GdkPixbuf> stripe(gdk_pixbuf_new_subpixbuf(striped.get(), x, 0, 8, 256));
+    gdk_pixbuf_fill(stripe.get(), x < 256 ? 0xff0000ff : 0x0000ffff);
+  }
+  ASSERT_TRUE(gdk_pixbuf_save(striped.get(), pathOf("a.jpg").c_str(), "jpeg", nullptr, nullptr));
+  open("a.jpg");
+  EXPECT_EQ(whole(32, 32).text, "512 256 32 16 -1");
+  const Decoded left = part("0 0 32 32", 32, 32);
+  const Decoded right = part("480 200 32 32", 32, 32);
+  for (int x = 4; x < 32; x += 8) {
+    EXPECT_EQ(left.colourAt(x, 16), x % 16 < 8 ? 'R' : '-') << x;
+    EXPECT_EQ(right.colourAt(x, 16), x % 16 < 8 ? 'B' : '-') << x;
+  }
+  EXPECT_EQ(whole(32, 32).text, "512 256 32 16 -1");
+}
+
+TEST_F(PictureDecoderTest, WhatCannotBeAskedForIsRefused) {
+  writeQuarters("a.png", "png", 300, 200);
+  open("a.png");
+  EXPECT_EQ(part("0 0 10 10", 10, 10).error, DecoderError::Damaged) << "before it was opened";
+  EXPECT_EQ(whole(60, 60).error, "");
+  for (const char* area : {"290 0 30 20", "0 190 30 20", "-1 0 30 20", "0 -1 30 20", "0 0 0 20", "0 0 20 0", "x y z u"}) {
+    EXPECT_EQ(part(area, 10, 10).error, DecoderError::Damaged) << area;
+  }
+  EXPECT_EQ(part("0 0 30 20", 100000, 100000).error, DecoderError::Damaged);
+  EXPECT_EQ(whole(0, 10).error, DecoderError::Damaged);
+  EXPECT_EQ(ask("turn 1 1", 0).error, DecoderError::Unsupported);
+  EXPECT_EQ(next(10, 10).text, "10 7 -1") << "of a still one there is no other";
 }
 
 TEST_F(PictureDecoderTest, NotesThatMakeNoSenseTurnNothing) {
@@ -149,6 +184,30 @@ TEST_F(PictureDecoderTest, NotesThatMakeNoSenseTurnNothing) {
   }
 }
 
+TEST_F(PictureDecoderTest, PngStandsAsTheCameraWasHeldToo) {
+  writeQuarters("straight.png", "png", 64, 32);
+  const std::string straight = contentOf("straight.png");
+  const std::string exif = "eXIf" + notes(6, false);
+  std::uint32_t checksum = 0xFFFFFFFF;
+  for (const char byte : exif) {
+    checksum ^= static_cast<unsigned char>(byte);
+    for (int bit = 0; bit < 8; ++bit) checksum = checksum >> 1 ^ (checksum & 1 ? 0xEDB88320 : 0);
+  }
+  checksum = ~checksum;
+  const std::string end{static_cast<char>(checksum >> 24), static_cast<char>(checksum >> 16),
+                        static_cast<char>(checksum >> 8), static_cast<char>(checksum)};
+  const std::string chunk = std::string(3, '\0') + static_cast<char>(exif.size() - 4) + exif + end;
+  constexpr std::size_t afterHead = 33;
+  folder_.write("turned.png", straight.substr(0, afterHead) + chunk + straight.substr(afterHead));
+  open("turned.png");
+  const Decoded all = whole(64, 64);
+  EXPECT_EQ(all.text, "32 64 32 64 -1");
+  EXPECT_EQ(corners(all, 32, 64), "BRWG");
+  folder_.write("late.png", straight + chunk);
+  open("late.png");
+  EXPECT_EQ(whole(64, 64).text, "64 32 64 32 -1") << "behind the end is no part of the picture";
+}
+
 TEST_F(PictureDecoderTest, WebpStandsAsTheCameraWasHeldToo) {
   const GRef<GdkPixbuf> all(gdk_pixbuf_new(GDK_COLORSPACE_RGB, FALSE, 8, 32, 16));
   gdk_pixbuf_fill(all.get(), 0xff0000ff);
@@ -160,13 +219,14 @@ TEST_F(PictureDecoderTest, WebpStandsAsTheCameraWasHeldToo) {
   const auto length = [](std::size_t size) {
     return std::string{static_cast<char>(size), static_cast<char>(size >> 8), static_cast<char>(size >> 16), 0};
   };
-  const std::string exif = notes(6, true);
   const std::string picture = body.starts_with("VP8X") ? body.substr(18) : body;
-  const std::string extended = "WEBPVP8X" + length(10) + std::string("\x08\0\0\0\x1F\0\0\x0F\0\0", 10) + picture + "EXIF" +
-                               length(exif.size()) + exif;
-  folder_.write("turned.webp", "RIFF" + length(extended.size()) + extended);
-  open("turned.webp");
-  EXPECT_EQ(whole(64, 64).text.substr(0, 12), "16 32 16 32 ");
+  for (const std::string& exif : {notes(6, true), std::string("Exif\0\0", 6) + notes(6, false)}) {
+    const std::string extended = "WEBPVP8X" + length(10) + std::string("\x08\0\0\0\x1F\0\0\x0F\0\0", 10) + picture + "EXIF" +
+                                 length(exif.size()) + exif;
+    folder_.write("turned.webp", "RIFF" + length(extended.size()) + extended);
+    open("turned.webp");
+    EXPECT_EQ(whole(64, 64).text.substr(0, 12), "16 32 16 32 ");
+  }
 }
 
 TEST_F(PictureDecoderTest, AnAnimationGoesRoundInItsOwnTime) {
@@ -192,6 +252,13 @@ TEST_F(PictureDecoderTest, AnAnimationGoesRoundInItsOwnTime) {
   folder_.write("hasty.gif", head + again + frame(0, 0x44) + frame(1, 0x4C) + ";");
   open("hasty.gif");
   EXPECT_EQ(whole(10, 10).text.substr(0, 11), "1 1 1 1 100") << "nobody could see it so quickly";
+  folder_.write("once.gif", head + frame(30, 0x44) + frame(70, 0x4C) + ";");
+  open("once.gif");
+  EXPECT_EQ(whole(10, 10).text.substr(0, 11), "1 1 1 1 300");
+  EXPECT_EQ(next(10, 10).text, "1 1 700");
+  const Decoded last = next(10, 10);
+  EXPECT_EQ(last.text, "1 1 -1");
+  EXPECT_EQ(last.middle(), 'G') << "where it ends";
   folder_.write("still.gif", head + frame(30, 0x44) + ";");
   open("still.gif");
   EXPECT_EQ(whole(10, 10).text.substr(0, 10), "1 1 1 1 -1");

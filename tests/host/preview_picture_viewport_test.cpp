@@ -89,6 +89,10 @@ TEST_F(PictureViewportTest, ThePictureIsMovedNoFurtherThanToItsEdges) {
   EXPECT_FALSE(viewport.pan(1, 1));
   EXPECT_TRUE(viewport.pan(-10000, -10000));
   expectSeen(1200, 500, 400, 300);
+  viewport.zoom(2, {400, 300});
+  expectSeen(1400, 650, 200, 150);
+  EXPECT_TRUE(viewport.pan(40, 20));
+  expectSeen(1380, 640, 200, 150);
   viewport.zoom(0.3, {200, 150});
   EXPECT_NEAR(viewport.pictureArea().y, 30, 0.01) << "a side that is seen whole is in the middle";
 }
