@@ -2,6 +2,7 @@
 #include "host/gtk/gtk_screens.h"
 
 #include "host/desktop/web_page.h"
+#include "host/drive/promise_file.h"
 #include "host/gtk/drive_unavailable_screen.h"
 #include "host/gtk/folder_list_screen.h"
 #include "host/gtk/gtk_document_interaction.h"
@@ -81,7 +82,15 @@ std::shared_ptr<UpgradeFlowManager> GtkScreens::makeUpgradeFlow(StorageOfferRef 
   return std::make_shared<UpgradeFlow>(std::move(offer), pageOpener());
 }
 
-void GtkScreens::runPreOpenAlert(const URL&, const ViewControllerRef&, std::function<void()> open) { open(); }
+// What is not downloaded can't be handed over. Chosen in a list it is shown instead, which says so and shows it coming.
+void GtkScreens::runPreOpenAlert(const URL& url, const ViewControllerRef& presenter, std::function<void()> open) {
+  const bool isHere = g_file_test(url.path().c_str(), G_FILE_TEST_EXISTS);
+  if (isHere || !physicalPathOf(url.path())) return open();
+  const auto shown = window();
+  if (!shown || std::dynamic_pointer_cast<DocumentListController>(presenter)) return;
+  const std::string name = takeString(g_filename_display_name(url.lastPathComponent().c_str()));
+  shown->showToast(filled(_("“%s” is not downloaded yet."), {name}));
+}
 
 InterfaceIdiom GtkScreens::userInterfaceIdiom() {
   const auto shown = window();

@@ -42,6 +42,9 @@ def install_application(app, identifier, name, types, more=""):
     return record
 
 
+PROMISE = "[Promise]\nName=Rates.csv\nSize=4\nModified=1770000000\nPackage=false\n"
+
+
 def install_applications(app):
     install_application(app, "org.example.Table", "Table", "text/csv;")
     install_application(app, "org.example.Post", "Post", "x-scheme-handler/mailto;")
@@ -235,7 +238,7 @@ class Wide(Share):
         app = self.app
         document = app.drive / "Documents" / "Rates.csv"
         promise = document.with_name(".Rates.csv.vlopromise")
-        promise.write_text("[Promise]\nName=Rates.csv\nSize=4\nModified=1770000000\nPackage=false\n")
+        promise.write_text(PROMISE)
         self.share("Documents/Rates.csv")
         app.wait("This item is not downloaded.")
         self.assertEqual([row[1] for row in self.rows() if row[6]], ["Copy Link"])
@@ -249,6 +252,17 @@ class Wide(Share):
         self.press_share()
         self.choose("Open in “Table”")
         self.assertEqual(self.record("org.example.Table"), [str(document)])
+
+    def test_what_is_not_downloaded_is_shown_and_not_handed_over(self):
+        app = self.app
+        (app.drive / "Documents" / ".Rates.csv.vlopromise").write_text(PROMISE)
+        app.click("Documents", "list item")
+        app.wait_title("Documents")
+        app.click("Rates.csv", "list item")
+        app.wait_title("Rates.csv")
+        wait_for("the notice", lambda: any("It opens here as soon as" in name for name in app.names()))
+        self.assertIn("openInDefaultApp returned NO, showing preview", app.log())
+        self.assertFalse((app.base / "org.example.Table.record").exists())
 
     def test_a_row_of_a_list_is_shared_from_its_menu(self):
         app = self.app

@@ -118,6 +118,19 @@ TEST_F(PresenterPageTest, WhatTakesLongSaysSoAfterAFifthOfASecond) {
   g_setenv("PATH", path.c_str(), TRUE);
 }
 
+TEST_F(PresenterPageTest, OnlyWhatIsNotDownloadedIsNotHandedOver) {
+  const auto opens = [&] {
+    bool opened = false;
+    screens->runPreOpenAlert(URL(document), nullptr, [&] { opened = true; });
+    return opened;
+  };
+  EXPECT_TRUE(opens()) << "that it is gone is told by what opens it";
+  promise("Table.unknown", 9);
+  EXPECT_FALSE(opens());
+  write(document, noText);
+  EXPECT_TRUE(opens());
+}
+
 // An empty frame in between would flicker, and hold up the document by a whole frame.
 TEST_F(PresenterPageTest, WhatIsSeenStaysUntilTheNextDocumentIsThere) {
   write(document, noText);
