@@ -304,6 +304,21 @@ class Phone(Share):
         # That it can't rise before it has a size is told by the toolkit, often.
         self.assertNotIn("gtk_widget_size_allocate", app.log())
 
+    def test_the_button_of_what_is_not_downloaded_says_so(self):
+        app = self.app
+        (app.drive / "Documents" / ".Rates.csv.vlopromise").write_text(PROMISE)
+        link = urllib.parse.quote(urllib.parse.quote(f"{app.drive}/Documents/Rates.csv"))
+        self.assertEqual(app.link(f"vaelodriveapp:{link}?mode=info")[0], 0)
+        seen = []
+
+        def rests():
+            seen.append(app.find("Open in “Table”", "push button"))
+            return seen[-1] and len(seen) > 1 and seen[-1] == seen[-2]
+        wait_for("the page to rest", rests)
+        app.click("Open in “Table”", "push button")
+        app.wait("“Rates.csv” is not downloaded yet.")
+        self.assertFalse((app.base / "org.example.Table.record").exists())
+
     def test_rows_do_their_work_by_tap(self):
         self.share()
         wait_for("the sheet to have risen", lambda: self.app.find("Save a Copy…")[3] > 600)
