@@ -6,7 +6,7 @@
 #include <charconv>
 
 #include "host/gtk/preview/shared_bytes.h"
-#include "host/gtk/preview/text_buffer_end.h"
+#include "host/gtk/preview/text_widgets.h"
 
 namespace vaelo {
 
@@ -49,11 +49,9 @@ bool readForm(std::string_view line, Form& form) {
 
 MarkdownLoad::MarkdownLoad(const std::string& path, Events events)
     : events_(std::move(events)),
-      buffer_(gtk_source_buffer_new(nullptr)),
+      buffer_(takeTextBuffer()),
       forms_(GTK_TEXT_BUFFER(buffer_.get())),
       process_(std::make_unique<DecoderProcess>("markdown", path)) {
-  gtk_text_buffer_set_enable_undo(GTK_TEXT_BUFFER(buffer_.get()), FALSE);
-  gtk_source_buffer_set_highlight_matching_brackets(buffer_.get(), FALSE);
   process_->ask(
       "render", [this](DecoderProcess::Answer answer) { received(std::move(answer)); }, RenderingTakes);
 }

@@ -12,6 +12,7 @@
 #include "host/gtk/preview/text_find_bar.h"
 #include "host/gtk/preview/text_note.h"
 #include "host/gtk/preview/text_view.h"
+#include "host/gtk/preview/text_widgets.h"
 #include "host/gtk/preview/text_zoom.h"
 #include "host/support/texts.h"
 
@@ -27,7 +28,7 @@ class MarkdownView : public DocumentView {
   MarkdownView(const PreviewedDocument& document, DocumentViewEvents events)
       : document_(document),
         events_(std::move(events)),
-        view_(gtk_source_view_new()),
+        view_(makeTextWidget()),
         scrolled_(gtk_scrolled_window_new()),
         page_(gtk_box_new(GTK_ORIENTATION_VERTICAL, 0)),
         stack_(GTK_WIDGET(g_object_ref_sink(gtk_stack_new()))),
@@ -68,6 +69,7 @@ class MarkdownView : public DocumentView {
     g_signal_handler_disconnect(adw_style_manager_get_default(), styleChange_);
     // A source text's view leaves the stack before it goes.
     if (source_) gtk_stack_remove(GTK_STACK(stack_), source_->widget());
+    gtk_text_view_set_buffer(GTK_TEXT_VIEW(view_), nullptr);  // the toolkit may keep the view for a while
     g_object_unref(stack_);
   }
 

@@ -3,8 +3,8 @@
 
 #include <algorithm>
 
-#include "host/gtk/preview/text_buffer_end.h"
 #include "host/gtk/preview/text_languages.h"
+#include "host/gtk/preview/text_widgets.h"
 
 namespace vaelo {
 
@@ -29,13 +29,7 @@ std::size_t sliceEnd(const std::string& text, std::size_t begin) {
 }  // namespace
 
 TextLoad::TextLoad(const std::string& path, const std::string& name, const std::string& contentType, Events events)
-    : name_(name),
-      contentType_(contentType),
-      events_(std::move(events)),
-      reader_(path),
-      buffer_(gtk_source_buffer_new(nullptr)) {
-  gtk_text_buffer_set_enable_undo(GTK_TEXT_BUFFER(buffer_.get()), FALSE);
-  gtk_source_buffer_set_highlight_matching_brackets(buffer_.get(), FALSE);
+    : name_(name), contentType_(contentType), events_(std::move(events)), reader_(path), buffer_(takeTextBuffer()) {
   inNextTurn(&TextLoad::guessLanguage);
   reader_.next([this](TextPiece piece) { received(std::move(piece)); });
 }

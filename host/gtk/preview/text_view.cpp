@@ -8,6 +8,7 @@
 #include "host/gtk/preview/text_find_bar.h"
 #include "host/gtk/preview/text_load.h"
 #include "host/gtk/preview/text_note.h"
+#include "host/gtk/preview/text_widgets.h"
 #include "host/gtk/preview/text_zoom.h"
 #include "host/support/texts.h"
 #include "platform/platform.h"
@@ -40,7 +41,7 @@ class TextView : public DocumentView {
   TextView(const PreviewedDocument& document, DocumentViewEvents events)
       : document_(document),
         events_(std::move(events)),
-        view_(gtk_source_view_new()),
+        view_(makeTextWidget()),
         scrolled_(gtk_scrolled_window_new()),
         box_(GTK_WIDGET(g_object_ref_sink(gtk_box_new(GTK_ORIENTATION_VERTICAL, 0)))),
         note_(makePreviewNote()),
@@ -67,6 +68,7 @@ class TextView : public DocumentView {
 
   ~TextView() override {
     g_signal_handler_disconnect(adw_style_manager_get_default(), styleChange_);
+    gtk_text_view_set_buffer(GTK_TEXT_VIEW(view_), nullptr);  // the toolkit may keep the view for a while
     gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scrolled_), nullptr);
     dropLineNumbers();
     g_object_unref(box_);
