@@ -140,13 +140,13 @@ class Translations(unittest.TestCase):
         self.check_says("po/POTFILES.in: not the files that have texts")
 
     def test_updating_takes_new_texts_up_and_keeps_the_others(self):
-        self.replace("host/gtk/screen_page.cpp", '_("Main Menu")', '_("Chief Menu")')
+        self.replace("host/gtk/upgrade_flow.cpp", '_("See Offers")', '_("Look at Offers")')
         subprocess.run([sys.executable, self.root / "tools" / "translations"], check=True)
         german = (self.root / "po" / "de.po").read_text()
-        self.assertTrue('msgid "Chief Menu"\nmsgstr ""\n' in german)
-        self.assertFalse("Hauptmenü" in german)
+        self.assertTrue('msgid "Look at Offers"\nmsgstr ""\n' in german)
+        self.assertFalse("Angebote ansehen" in german)
         self.assertTrue('msgstr "Abbrechen"' in german)
-        self.check_says("untranslated: “Chief Menu”")
+        self.check_says("untranslated: “Look at Offers”")
 
 
 if __name__ == "__main__":

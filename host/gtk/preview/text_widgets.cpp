@@ -41,8 +41,15 @@ void keepForNext(GRef<GtkSourceBuffer> buffer) {
   if (isAsNew && spareBuffers().size() < MostSpares) spareBuffers().push_back(std::move(buffer));
 }
 
+// Each view leaves a mark in it, so it doesn't serve for ever.
 GtkTextBuffer* sharedEmptyBuffer(GtkTextView*) {
-  static GtkSourceBuffer* const empty = gtk_source_buffer_new(nullptr);
+  constexpr int mostViews = 64;
+  static GtkSourceBuffer* empty = nullptr;
+  static int views = 0;
+  if (views++ % mostViews == 0) {
+    g_clear_object(&empty);
+    empty = gtk_source_buffer_new(nullptr);
+  }
   return GTK_TEXT_BUFFER(g_object_ref(empty));
 }
 
