@@ -1,5 +1,6 @@
 # SPDX-License-Identifier: GPL-3.0-or-later
 """Pictures of each kind in a real window: upright as the camera was held, and moving where they move."""
+import subprocess
 import unittest
 
 from bare_desktop import without_applications
@@ -26,6 +27,7 @@ def write_pictures(folder):
     notes = Image.Exif()
     notes[0x112] = TURNED_RIGHT
     upright().rotate(90, expand=True).save(folder / "Turned.jpg", exif=notes, quality=95)
+    subprocess.run(["heif-enc", folder / "Picture.png", "-o", folder / "Picture.heic"], check=True, stdout=subprocess.DEVNULL)
     frames = [Image.new("RGB", (200, 200), colour) for colour in (RED, BLUE)]
     frames[0].save(folder / "Moving.gif", save_all=True, append_images=frames[1:], duration=400, loop=0)
 
@@ -66,7 +68,7 @@ class Pictures(unittest.TestCase):
                  lambda: (self.colour(-60), self.colour(60)) == (above, below))
 
     def test_every_kind_is_shown_as_it_is(self):
-        for kind in ("gif", "jpg", "png", "svg", "tif", "webp"):
+        for kind in ("gif", "heic", "jpg", "png", "svg", "tif", "webp"):
             with self.subTest(kind):
                 self.open(f"Picture.{kind}")
                 self.wait_colours("red", "blue")
