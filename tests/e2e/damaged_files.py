@@ -9,8 +9,10 @@ import io
 import pathlib
 import random
 import struct
+import subprocess
 import sys
 import tarfile
+import tempfile
 import typing
 import zipfile
 import zlib
@@ -152,10 +154,21 @@ def tiffs():
     yield "Strips without end.tif", directory(*shape[:5], (273, 4, 0x3FFFFFFF, 8), (279, 4, 0x3FFFFFFF, 8)) + bytes(500)
 
 
-def other_pictures():
+def heifs():
+    with tempfile.TemporaryDirectory() as folder:
+        source, made = pathlib.Path(folder, "a.png"), pathlib.Path(folder, "a.heic")
+        source.write_bytes(picture("PNG"))
+        subprocess.run(["heif-enc", source, "-o", made], check=True, stdout=subprocess.DEVNULL)
+        usual = made.read_bytes()
+    yield from cut_and_flipped("Picture", ".heic", usual, spare=24)
+    extent = usual.index(b"ispe") + 8
+    yield "100,000 pixels wide and high.heic", usual[:extent] + struct.pack(">II", 100000, 100000) + usual[extent + 8:]
     heif = struct.pack(">I", 24) + b"ftypheic\0\0\0\0mif1heic"
     yield "Noise.heic", heif + noise(4000, 3)
     yield "Boxes without end.heic", heif + struct.pack(">I", 0x7FFFFFFF) + b"meta" + (struct.pack(">I", 8) + b"iloc") * 2000
+
+
+def other_pictures():
     size = struct.pack("<IiiHHIIiiII", 40, 100000, 100000, 1, 24, 0, 0, 0, 0, 0, 0)
     yield "100,000 pixels wide and high.bmp", b"BM" + struct.pack("<IHHI", 54, 0, 0, 54) + size + bytes(100)
     yield "Cut.ico", picture("ICO")[:40]
@@ -318,7 +331,7 @@ def write(path, content):
             file.truncate(content.length)
 
 
-MAKERS = ((PICTURE, (pngs, jpegs, gifs, webps, tiffs, other_pictures, svgs)), (DOCUMENT, (documents,)), (ARCHIVE, (archives,)),
+MAKERS = ((PICTURE, (pngs, jpegs, gifs, webps, tiffs, heifs, other_pictures, svgs)), (DOCUMENT, (documents,)), (ARCHIVE, (archives,)),
           (TEXT, (texts,)), (MEDIA, (media,)))
 
 
