@@ -378,13 +378,13 @@ void GtkWindowHost::sizeChanged() {
     height = gdk_surface_get_height(surface());
   }
   if (width <= 0 || height <= 0) return;
+  height = keyboard_.windowResized(width, height);
   setTraitCollection(traitsFor(width, height));
   for (const auto& [screen, page] : pages_) {
     page->setNarrow(traitCollection().horizontalSizeClass == SizeClass::Compact);
   }
   resize(Size{static_cast<double>(width), static_cast<double>(height)}, false);
   fitToasts(ADW_TOAST_OVERLAY(toasts_));
-  keyboard_.windowResized(width, height);
 }
 
 }  // namespace vaelo

@@ -14,18 +14,20 @@ constexpr int LeastHeight = 120;
 
 }  // namespace
 
-void KeyboardArea::windowResized(int width, int height) {
+int KeyboardArea::windowResized(int width, int height) {
   const int before = std::exchange(height_, height);
   const bool turned = std::exchange(width_, width) != width;
   if (shown_) {
-    if (!turned && height < without_) return;
+    if (!turned && height < without_ && (height == before || textIsEdited())) return without_;
     shown_ = false;
     tell(KeyboardWillHideNotification, without_ - before);
   } else if (!turned && before - height >= LeastHeight && textIsEdited()) {
     shown_ = true;
     without_ = before;
     tell(KeyboardWillShowNotification, before - height);
+    return without_;
   }
+  return height;
 }
 
 bool KeyboardArea::textIsEdited() const {

@@ -14,8 +14,9 @@ class KeyboardArea {
  public:
   /// Both outlive it.
   KeyboardArea(GtkWindow* window, NotificationCenter& notifications) : window_(window), notifications_(notifications) {}
-  /// The window has this size now, in points.
-  void windowResized(int width, int height);
+  /// The window has this size now, in points. Answers the height that it has or would have without a keyboard: what comes
+  /// and goes with that is no other size to screens, which would begin anew with what is being typed.
+  int windowResized(int width, int height);
 
  private:
   bool textIsEdited() const;

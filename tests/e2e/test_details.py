@@ -58,6 +58,28 @@ class Upright(Details):
         wait_for("the wide window", lambda: self.app.find("Vaelo Drive", "frame")[4] > 700)
         self.assertEqual(narrow, width(), "cut where it is narrow")
 
+    def test_what_is_typed_stays_when_a_keyboard_on_the_screen_comes_and_goes(self):
+        def resized(height):
+            self.app.resize(360, height)
+            wait_for(f"the window to be {height} high", lambda: 0 <= height - self.app.find("Vaelo Drive", "frame")[5] <= 20)
+        self.edit()
+        resized(340)  # as a phone's shell does it
+        name = wait_for("the name above the keyboard",
+                        lambda: next((row for row in [self.app.find("Name", "text")] if row and row[3] + row[5] < 340), None))
+        self.assertLess(name[2], 20, "below the picture as before, and not beside it")
+        self.app.key("ctrl+a")
+        self.app.type("Second.txt")
+        self.app.key("Return")
+        self.app.wait("OK", "push button")  # it takes the keyboard, and with it that on the screen
+        resized(720)
+        self.app.key("Return")
+        self.app.wait_gone("OK")
+        self.app.key("Home")
+        self.app.type("Other ")
+        self.app.key("Return")
+        self.ended()
+        self.on_disk("Other Second.txt")
+
 
 class Wide(Details):
     size = (1280, 800)

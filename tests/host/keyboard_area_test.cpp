@@ -32,26 +32,36 @@ class KeyboardAreaTest : public testing::Test {
 
 TEST_F(KeyboardAreaTest, AWindowThatGetsLowerWhileATextIsEditedHasAKeyboardBelow) {
   gtk_widget_grab_focus(entry);
-  area.windowResized(360, 450);
+  EXPECT_EQ(area.windowResized(360, 450), 720);
   EXPECT_EQ(heard, std::vector<std::string>{"KeyboardWillShowNotification 270"});
-  area.windowResized(360, 460);
+  EXPECT_EQ(area.windowResized(360, 460), 720);
   EXPECT_EQ(heard.size(), 1U);
-  area.windowResized(360, 720);
+  EXPECT_EQ(area.windowResized(360, 720), 720);
   EXPECT_EQ(heard.back(), "KeyboardWillHideNotification 260");
+}
+
+TEST_F(KeyboardAreaTest, ALowWindowInWhichNoTextIsEditedAnyMoreIsThatLow) {
+  gtk_widget_grab_focus(entry);
+  area.windowResized(360, 450);
+  gtk_window_set_focus(GTK_WINDOW(window), nullptr);
+  EXPECT_EQ(area.windowResized(360, 450), 720) << "the keyboard is about to go";
+  EXPECT_EQ(heard.size(), 1U);
+  EXPECT_EQ(area.windowResized(360, 440), 440);
+  EXPECT_EQ(heard.back(), "KeyboardWillHideNotification 270");
 }
 
 TEST_F(KeyboardAreaTest, ItGoesWhenTheDeviceIsTurned) {
   gtk_widget_grab_focus(entry);
   area.windowResized(360, 450);
-  area.windowResized(720, 360);
+  EXPECT_EQ(area.windowResized(720, 360), 360);
   ASSERT_EQ(heard.size(), 2U);
   EXPECT_EQ(heard.back(), "KeyboardWillHideNotification 270");
 }
 
 TEST_F(KeyboardAreaTest, OtherSizesAreNoKeyboard) {
-  area.windowResized(360, 450);
+  EXPECT_EQ(area.windowResized(360, 450), 450);
   gtk_widget_grab_focus(entry);
-  area.windowResized(360, 400);
+  EXPECT_EQ(area.windowResized(360, 400), 400);
   area.windowResized(720, 200);
   EXPECT_TRUE(heard.empty());
 }
