@@ -11,6 +11,14 @@ namespace vaelo {
 
 namespace {
 
+/// What the toolkit keeps free at the end of the field for the clear button, whether that shows or not.
+int roomOfClearButton(GtkWidget* entry) {
+  GtkWidget* icon = gtk_widget_get_last_child(entry);
+  int width = 0;
+  if (GTK_IS_IMAGE(icon)) gtk_widget_measure(icon, GTK_ORIENTATION_HORIZONTAL, -1, nullptr, &width, nullptr, nullptr);
+  return width;
+}
+
 /// The toolkit counts from where the text itself begins; the model means sides, or where the interface begins.
 float xalignOf(const TextField& field, GtkWidget* entry) {
   if (field.textAlignment() == TextAlignment::Center) return 0.5F;
@@ -72,6 +80,9 @@ void MirroredField::update() {
   gtk_entry_set_icon_from_icon_name(entry, GTK_ENTRY_ICON_SECONDARY,
                                     clears && !field_->text().empty() ? "edit-clear-symbolic" : nullptr);
   gtk_entry_set_icon_tooltip_text(entry, GTK_ENTRY_ICON_SECONDARY, _("Clear"));
+  // As much at the beginning keeps the middle of the text in the middle of the field.
+  gtk_widget_set_margin_start(GTK_WIDGET(gtk_editable_get_delegate(GTK_EDITABLE(entry_))),
+                              field_->textAlignment() == TextAlignment::Center ? roomOfClearButton(entry_) : 0);
   // A name at rest looks like a title, and like a field while it is edited.
   gtk_entry_set_has_frame(entry, field_->isEditing());
   gtk_entry_set_input_hints(

@@ -193,6 +193,51 @@ TEST_F(MirrorViewTest, ButtonsArePressedAndFieldsAreTypedIn) {
   EXPECT_EQ(field->text(), "New.txt");
 }
 
+TEST_F(MirrorViewTest, ACentredTextIsInTheMiddleWhetherItCanBeClearedOrNot) {
+  const auto field = std::make_shared<TextField>();
+  field->setText("Report.txt");
+  field->setClearButtonMode(ClearButtonMode::WhileEditing);
+  field->setTextAlignment(TextAlignment::Center);
+  column->addArrangedSubview(field);
+  LayoutConstraint::makeConstant(*field, LayoutAttribute::Width, 200)->setActive(true);
+  show();
+  GtkWidget* entry = widgets()[1];
+  const auto middleOfText = [entry] {
+    graphene_rect_t text;
+    EXPECT_TRUE(gtk_widget_compute_bounds(GTK_WIDGET(gtk_editable_get_delegate(GTK_EDITABLE(entry))), entry, &text));
+    return static_cast<double>(text.origin.x + text.size.width / 2);
+  };
+  field->endEditing(true);
+  settle();
+  EXPECT_NEAR(middleOfText(), gtk_widget_get_width(entry) / 2.0, 1);
+  field->becomeFirstResponder();
+  settle();
+  ASSERT_NE(gtk_entry_get_icon_name(GTK_ENTRY(entry), GTK_ENTRY_ICON_SECONDARY), nullptr);
+  EXPECT_NEAR(middleOfText(), gtk_widget_get_width(entry) / 2.0, 1);
+  field->setTextAlignment(TextAlignment::Natural);
+  settle();
+  EXPECT_LT(middleOfText(), gtk_widget_get_width(entry) / 2.0 - 5) << "it begins where the field does";
+}
+
+TEST_F(MirrorViewTest, TheClearButtonShowsWhileThereIsWhatItClears) {
+  const auto field = std::make_shared<TextField>();
+  field->setText("Report.txt");
+  field->setClearButtonMode(ClearButtonMode::WhileEditing);
+  column->addArrangedSubview(field);
+  LayoutConstraint::makeConstant(*field, LayoutAttribute::Width, 200)->setActive(true);
+  show();
+  GtkWidget* entry = widgets()[1];
+  const auto shows = [entry] { return gtk_entry_get_icon_name(GTK_ENTRY(entry), GTK_ENTRY_ICON_SECONDARY) != nullptr; };
+  field->endEditing(true);
+  EXPECT_FALSE(shows()) << "nothing is edited";
+  field->becomeFirstResponder();
+  EXPECT_TRUE(shows());
+  g_signal_emit_by_name(entry, "icon-release", GTK_ENTRY_ICON_SECONDARY);
+  EXPECT_EQ(field->text(), "");
+  EXPECT_TRUE(field->isEditing());
+  EXPECT_FALSE(shows()) << "nothing is left";
+}
+
 /// Wants to scroll for itself or not.
 struct Scrolling : TextFieldDelegate {
   bool textFieldShouldScrollToVisibleWhenBecomingFirstResponder(TextField&) override { return byToolkit; }
