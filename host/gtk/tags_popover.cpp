@@ -19,6 +19,7 @@
 #include "host/gtk/list/worker.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
+#include "items/dr_item.h"
 #include "items/file_tags.h"
 
 namespace vaelo {
@@ -281,7 +282,10 @@ class TagsPopover {
 
 void showTagsPopover(GtkWidget* over, const GdkRectangle& at, const URL& item, DriveSyncedStore& tags,
                      std::function<void()> changed) {
-  new TagsPopover(over, at, item, tags, std::move(changed));
+  // Where the details of a link or bookmark have their tags from. Links themselves can't have any.
+  const std::shared_ptr<DRItem> record = DRItem::initWithURL(item);
+  const URL tagged = record ? record->resolvedURL().value_or(item) : item;
+  new TagsPopover(over, at, tagged, tags, std::move(changed));
 }
 
 }  // namespace vaelo

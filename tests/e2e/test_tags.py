@@ -75,6 +75,37 @@ class Tags(unittest.TestCase):
         self.assertIn("'To do'", self.values.read_text())
         self.assertIn("'Red'", self.values.read_text())
 
+    def test_a_new_tag_has_the_chosen_colour(self):
+        app = self.app
+        self.open_tags()
+        app.wait("Red", "check box")
+        app.key("Tab", "Tab", "Tab")
+        app.type("Garden")
+        app.key("Tab", "Tab", "Tab", "space", "shift+Tab", "shift+Tab", "shift+Tab", "Return")  # no colour, gray, green
+        wait_for("the new tag", lambda: self.tags() == "Work,Own,Garden")
+        self.assertRegex(self.values.read_text(), r"'n': <'Garden'>, 'l': <uint64 2>|'l': <uint64 2>, 'n': <'Garden'>")
+
+    def test_what_leads_to_a_document_has_its_tags(self):
+        app = self.app
+        (app.base / "Letter.txt").write_text("words")
+        (app.drive / "Letter.vaelobookmark").write_text(f"[Bookmark]\nURL=file://{app.base}/Letter.txt\n")
+        (app.drive / "Link.txt").symlink_to("Photo.png")
+        for name, target in (("Letter", app.base / "Letter.txt"), ("Link.txt", app.drive / "Photo.png")):
+            with self.subTest(name):
+                app.click(name, "list item", button=3)
+                app.wait("Tags…", "menu item")
+                app.key("i")
+                wait_for("the facts", lambda: app.find("Kind", "label"))
+                app.key("ctrl+t")
+                app.wait("Red", "check box")
+                app.key("space")
+                wait_for("the tag", lambda: "user.xdg.tags" in os.listxattr(target))
+                app.wait("Tags", "label")
+                app.key("Escape")
+                app.wait_gone("New tag")
+                app.key("Escape")
+                app.wait_gone("Kind")
+
     def test_what_another_program_adds_is_offered(self):
         new = self.values.with_suffix(".new")
         new.write_text("{'RoverTagDict': <{'RoverTagDictVersion': <uint64 2>, 'RoverTags': <[{'n': <'Garden'>, 'l': <uint64 2>}]>}>}")
