@@ -46,7 +46,8 @@ std::shared_ptr<ProviderOffer> AccountOffers::offerNow() const {
   const auto passed = std::count_if(terms->below.begin(), terms->below.end(),
                                     [share = figures_->freePercent()](double threshold) { return share < threshold; });
   if (passed == 0) return nullptr;
-  if (offer_ && offer_->level() == passed && offer_->terms() == *terms) {
+  const auto isFull = [](const StorageFigures& figures) { return figures.free == 0; };
+  if (offer_ && offer_->level() == passed && offer_->terms() == *terms && isFull(offer_->figures()) == isFull(*figures_)) {
     offer_->setFigures(*figures_);
     return offer_;
   }

@@ -32,7 +32,7 @@ class ProviderOffer : public StorageOffer {
 };
 
 /// Makes the account's offer from its provider's terms and from what each quota fetch measures. Without terms there is no
-/// offer, ever. An offer is another one when its level or its terms are.
+/// offer, ever. An offer is another one when its level or its terms are, and when nothing is left, which its button says.
 ///
 /// A change makes the application fetch the quota again, so measures that waver around a threshold would feed themselves:
 /// what was measured changes the offer at most once in ChangePause, and what comes meanwhile waits for its end.

@@ -60,7 +60,7 @@ TEST_F(AccountOffersTest, TheLevelIsHowManyThresholdsThereIsLessThan) {
     pass(AccountOffers::ChangePause);
     EXPECT_EQ(level(), row.level) << row.free;
   }
-  EXPECT_EQ(changes, 4);
+  EXPECT_EQ(changes, 5) << "that nothing is left is another one, too";
 }
 
 TEST_F(AccountOffersTest, AnAccountThatMayHoldNothingIsFull) {
@@ -75,6 +75,19 @@ TEST_F(AccountOffersTest, MeasuresAtTheSameLevelKeepTheOffer) {
   EXPECT_EQ(offers.currentOffer(), first);
   EXPECT_EQ(changes, 1);
   EXPECT_EQ(std::static_pointer_cast<ProviderOffer>(first)->figures().free, 140);
+}
+
+// The button of the one says that the storage is almost full, that of the other that it is.
+TEST_F(AccountOffersTest, WhenNothingIsLeftThereIsAnotherOfferOfTheSameLevel) {
+  measured(1);
+  const StorageOfferRef first = offers.currentOffer();
+  pass(AccountOffers::ChangePause);
+  measured(0);
+  EXPECT_NE(offers.currentOffer(), first);
+  EXPECT_EQ(level(), 3);
+  EXPECT_EQ(changes, 2);
+  measured(0);
+  EXPECT_EQ(changes, 2);
 }
 
 TEST_F(AccountOffersTest, AMeasureThatChangesByTheSecondChangesTheOfferOnceInAWhile) {
