@@ -41,11 +41,11 @@ std::int64_t usedBytes(const std::string& mirror) {
   std::int64_t used = 0;
   walkTree(mirror, [&used](const std::string& path, const struct stat& status) {
     if (!S_ISREG(status.st_mode)) return true;
-    std::int64_t size = status.st_size;
+    auto size = static_cast<std::uint64_t>(std::max<off_t>(status.st_size, 0));
     if (isPromiseName(path.substr(path.rfind('/') + 1))) {
-      if (const Result<PromiseInfo> promise = readPromise(path)) size = static_cast<std::int64_t>(promise.value->size);
+      if (const Result<PromiseInfo> promise = readPromise(path)) size = promise.value->size;
     }
-    if (__builtin_add_overflow(used, std::max<std::int64_t>(size, 0), &used)) used = INT64_MAX;
+    if (__builtin_add_overflow(used, size, &used)) used = INT64_MAX;
     return true;
   });
   return used;

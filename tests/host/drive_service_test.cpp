@@ -325,6 +325,15 @@ TEST_F(DriveServiceTest, TheQuotaIsTheSmallerOfAllowanceAndDisk) {
   writeAccount("Token=t\nSignedIn=true\nAllowance=100\n");
   start();
   EXPECT_EQ(free().value, 0);
+  info.name = "vast";
+  for (const std::uint64_t size : {std::uint64_t{1} << 63, ~std::uint64_t{0}}) {
+    info.size = size;
+    ASSERT_FALSE(writePromise(drive, info));
+    writeAccount("Token=t\nSignedIn=true\nAllowance=10000\n");
+    start();
+    EXPECT_EQ(free().value, 0) << size;
+  }
+  std::filesystem::remove(promisePathFor(drive + "/vast"));
   writeAccount("Token=t\nSignedIn=true\nAllowance=9223372036854775807\n");
   start();
   EXPECT_LT(*free().value, 9223372036854775807 / 2);
