@@ -97,10 +97,11 @@ void FileTags::_tagColorsDidChange() {
 ImageRef FileTags::blipWithTagImageSizeBlipHeightOffset(const std::string& tag, const Size& imageSize, double blipHeight,
                                                         const Point& offset) {
   if (tag.empty()) return nullptr;
-  const std::map<std::string, Color> colors = tagColorsByTag();
-  const auto color = colors.find(tag);
+  // Not a copy: there may be thousands of tags, and an item may have many of them.
+  const std::shared_ptr<const Tags> known = currentTags();
+  const auto color = known->colors.find(tag);
   return Platform::current().screens.graphics().renderImage(imageSize, [&](DrawingContext& context) {
-    if (color == colors.end()) return;
+    if (color == known->colors.end()) return;
     const Rect circle = Rect{offset.x, offset.y, blipHeight, blipHeight}.insetBy(1, 1);
     context.setFillColor(color->second);
     context.fillEllipse(circle);
