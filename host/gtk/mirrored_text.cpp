@@ -3,6 +3,7 @@
 
 #include <algorithm>
 
+#include "host/gtk/fitting_line.h"
 #include "host/gtk/pango_graphics.h"
 
 namespace vaelo {
@@ -78,11 +79,12 @@ MirroredText::MirroredText(Label& label) : label_(label), box_(gtk_box_new(GTK_O
 void MirroredText::update() {
   while (GtkWidget* child = gtk_widget_get_first_child(box_)) gtk_box_remove(GTK_BOX(box_), child);
   if (!label_.attributedText()) {
+    gtk_widget_set_layout_manager(box_, gtk_box_layout_new(GTK_ORIENTATION_HORIZONTAL));
     gtk_widget_set_hexpand(appendText(label_.text(), box_), TRUE);
     return;
   }
   const bool isColumn = isLargeText();
-  gtk_orientable_set_orientation(GTK_ORIENTABLE(box_), isColumn ? GTK_ORIENTATION_VERTICAL : GTK_ORIENTATION_HORIZONTAL);
+  gtk_widget_set_layout_manager(box_, isColumn ? gtk_box_layout_new(GTK_ORIENTATION_VERTICAL) : makeFittingLineLayout());
   GtkWidget* line = isColumn ? appendLine() : box_;
   for (const AttributedString::Run& run : label_.attributedText()->runs()) {
     const auto* image = dynamic_cast<const GtkImageData*>(run.image.get());
@@ -99,6 +101,7 @@ void MirroredText::update() {
     }
     gtk_box_append(GTK_BOX(line), picture);
   }
+  if (!isColumn) appendText("…", box_);
 }
 
 GtkWidget* MirroredText::appendLine() {

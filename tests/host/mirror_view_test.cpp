@@ -346,6 +346,57 @@ TEST_F(MirrorViewTest, APictureInATextStandsNearerToWhatFollowsIt) {
             words.intrinsicContentSize().width + 2 * dot->width() + AttributedString::RoomBeforeImage);
 }
 
+TEST_F(MirrorViewTest, OfManyThingsWithPicturesTheLastAreLeftOut) {
+  const ImageRef dot = PangoGraphics().renderImage({10, 10}, [](DrawingContext& context) {
+    context.fillRect({0, 0, 10, 10});
+  });
+  AttributedString tags;
+  for (int i = 0; i < 50; ++i) {
+    tags.appendImage(dot);
+    tags.append("Important ");
+  }
+  label->setAttributedText(tags);
+  for (const GtkTextDirection direction : {GTK_TEXT_DIR_LTR, GTK_TEXT_DIR_RTL}) {
+    gtk_widget_set_default_direction(direction);
+    show(direction);
+    GtkWidget* line = widgets()[0];
+    const double width = gtk_widget_get_width(line);
+    const double natural = [line] {
+      int wanted = 0;
+      gtk_widget_measure(gtk_widget_get_next_sibling(gtk_widget_get_first_child(line)), GTK_ORIENTATION_HORIZONTAL, -1,
+                         nullptr, &wanted, nullptr, nullptr);
+      return wanted;
+    }();
+    double end = direction == GTK_TEXT_DIR_RTL ? width : 0;
+    int whole = 0;
+    int cut = 0;
+    GtkWidget* last = nullptr;
+    for (GtkWidget* child = gtk_widget_get_first_child(line); child; child = gtk_widget_get_next_sibling(child)) {
+      if (!gtk_widget_get_child_visible(child)) continue;
+      graphene_rect_t at;
+      ASSERT_TRUE(gtk_widget_compute_bounds(child, line, &at));
+      const double left = static_cast<double>(at.origin.x);
+      const double right = left + static_cast<double>(at.size.width);
+      EXPECT_GE(left, direction == GTK_TEXT_DIR_RTL ? 0 : end);
+      EXPECT_LE(right, direction == GTK_TEXT_DIR_RTL ? end : width);
+      end = direction == GTK_TEXT_DIR_RTL ? left : right;
+      last = child;
+      if (!GTK_IS_LABEL(child)) continue;
+      const bool isWhole = gtk_widget_get_width(child) >= static_cast<int>(natural);
+      whole += isWhole ? 1 : 0;
+      cut += isWhole ? 0 : 1;
+    }
+    EXPECT_GE(whole, 2);
+    EXPECT_LT(whole, 10);
+    EXPECT_EQ(cut, 1) << "the end of the line tells that there is more";
+    EXPECT_TRUE(GTK_IS_LABEL(last)) << "no dot stands for nothing";
+    gtk_window_set_child(GTK_WINDOW(window), nullptr);
+    mirror.reset();
+    gtk_window_destroy(GTK_WINDOW(window));
+  }
+  gtk_widget_set_default_direction(GTK_TEXT_DIR_LTR);
+}
+
 TEST_F(MirrorViewTest, InLargeLettersThingsWithPicturesStandBelowEachOther) {
   const LargeLetters large;
   const ImageRef dot = PangoGraphics().renderImage({10, 10}, [](DrawingContext& context) {
