@@ -10,6 +10,7 @@
 
 #include "host/drive/account.h"
 #include "host/drive/local_accounts.h"
+#include "host/gtk/dialog_size.h"
 #include "host/gtk/list/worker.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
@@ -36,7 +37,7 @@ class AccountsPage {
     gtk_window_set_destroy_with_parent(window_, TRUE);
     gtk_window_set_modal(window_, TRUE);
     gtk_window_set_title(window_, _("Accounts"));
-    gtk_window_set_default_size(window_, 360, 480);
+    setDialogSize(window_, over, 480);
     page_ = adw_preferences_page_new();
     known_ = ADW_PREFERENCES_GROUP(adw_preferences_group_new());
     adw_preferences_group_set_title(known_, _("On This Device"));

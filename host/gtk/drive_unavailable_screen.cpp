@@ -23,6 +23,8 @@ std::string reasonOf(const std::optional<Error>& setUpFailure) {
 
 DriveUnavailableController::DriveUnavailableController(const std::optional<Error>& setUpFailure)
     : page_(GTK_WIDGET(g_object_ref_sink(adw_status_page_new()))) {
+  // So that a phone on its side has room for the button as well.
+  gtk_widget_add_css_class(page_, "compact");
   adw_status_page_set_icon_name(ADW_STATUS_PAGE(page_),
                                 setUpFailure ? "drive-harddisk-symbolic" : "network-offline-symbolic");
   adw_status_page_set_title(ADW_STATUS_PAGE(page_), _("Vaelo Drive is not available"));

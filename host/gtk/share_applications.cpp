@@ -7,6 +7,7 @@
 #include <memory>
 #include <vector>
 
+#include "host/gtk/dialog_size.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
 
@@ -95,7 +96,7 @@ void chooseApplicationFor(const std::string& itemName, GtkWindow* over, std::fun
   gtk_window_set_transient_for(GTK_WINDOW(window), over);
   gtk_window_set_modal(GTK_WINDOW(window), TRUE);
   gtk_window_set_destroy_with_parent(GTK_WINDOW(window), TRUE);
-  gtk_window_set_default_size(GTK_WINDOW(window), 360, 480);
+  setDialogSize(GTK_WINDOW(window), over, 480);
   GtkEventController* keys = gtk_shortcut_controller_new();
   gtk_shortcut_controller_add_shortcut(
       GTK_SHORTCUT_CONTROLLER(keys),

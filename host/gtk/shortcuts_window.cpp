@@ -7,6 +7,7 @@
 #include <span>
 #include <string>
 
+#include "host/gtk/dialog_size.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
 
@@ -103,7 +104,7 @@ GtkWindow* showShortcutsWindow(GtkWindow* over) {
   gtk_window_set_destroy_with_parent(window, TRUE);
   gtk_window_set_modal(window, TRUE);
   gtk_window_set_title(window, _("Keyboard Shortcuts"));
-  gtk_window_set_default_size(window, 360, 560);
+  setDialogSize(window, over, 560);
   GtkWidget* page = adw_preferences_page_new();
   GtkWidget* first = nullptr;
   for (const ShortcutGroup& group : ShortcutGroups) {

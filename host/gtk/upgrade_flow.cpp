@@ -4,6 +4,7 @@
 #include <adwaita.h>
 
 #include "host/drive/account_offers.h"
+#include "host/gtk/dialog_size.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
 #include "platform/platform.h"
@@ -34,10 +35,10 @@ class UpgradeScreen : public ViewController, public HostDialog {
     gtk_window_set_transient_for(GTK_WINDOW(window), over);
     gtk_window_set_modal(GTK_WINDOW(window), TRUE);
     gtk_window_set_title(GTK_WINDOW(window), _("Upgrade Storage"));
-    gtk_window_set_default_size(GTK_WINDOW(window), 360, 520);
+    const int height = setDialogSize(GTK_WINDOW(window), over, 520);
     GtkWidget* box = gtk_box_new(GTK_ORIENTATION_VERTICAL, 0);
     gtk_box_append(GTK_BOX(box), adw_header_bar_new());
-    gtk_box_append(GTK_BOX(box), makePage());
+    gtk_box_append(GTK_BOX(box), makePage(height));
     adw_window_set_content(ADW_WINDOW(window), box);
     GtkEventController* keys = gtk_shortcut_controller_new();
     gtk_shortcut_controller_add_shortcut(
@@ -53,12 +54,14 @@ class UpgradeScreen : public ViewController, public HostDialog {
   }
 
  private:
-  GtkWidget* makePage() {
+  GtkWidget* makePage(int height) {
     const StorageFigures& figures = offer_->figures();
     GtkWidget* page = adw_status_page_new();
     gtk_widget_set_vexpand(page, TRUE);
     gtk_widget_add_css_class(page, "compact");
-    adw_status_page_set_icon_name(ADW_STATUS_PAGE(page), "drive-harddisk-symbolic");
+    // Where there is little room it is for the buttons.
+    constexpr int pictureFrom = 440;
+    if (height >= pictureFrom) adw_status_page_set_icon_name(ADW_STATUS_PAGE(page), "drive-harddisk-symbolic");
     adw_status_page_set_title(ADW_STATUS_PAGE(page),
                               figures.free == 0 ? _("Your storage is full") : _("Your storage is almost full"));
     const std::string text = filled(_("%1$s of %2$s are free. Your provider %3$s has more."),

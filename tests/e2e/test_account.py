@@ -161,6 +161,28 @@ class Account(unittest.TestCase):
         self.app.wait_gone("Your storage is full")
         self.app.wait_log("UpgradeStorage: presenting view controller")
 
+    def test_a_phone_on_its_side_has_room_for_what_is_to_be_pressed(self):
+        high = 360
+        self.start(more="Allowance=1000\nUpgradePage=http://127.0.0.1:1/\nUpgradeAsksFirst=true\n", size=(720, high))
+        app = self.app
+
+        def is_whole(name):
+            row = app.wait(name, "push button")
+            self.assertLessEqual(row[3] + row[5], high, name)
+        app.click("Storage Full", "push button")
+        is_whole("Not Now")
+        app.key("Escape")
+        app.wait_gone("Not Now")
+        self.open_accounts()
+        is_whole("Sign Out: Ada")
+        dialog = next(row for row in app.accessibility.showing() if row[1] == "Accounts" and row[0] in ("dialog", "frame"))
+        self.assertLessEqual(dialog[5], high)
+        self.press("Sign Out: Ada")
+        app.wait("Vaelo Drive is not available")
+        app.key("Escape")
+        app.wait_gone("Sign In: Ada")
+        is_whole("Accounts…")
+
     def test_without_a_provider_there_is_no_offer(self):
         self.start(more="Allowance=1000\n")
         self.app.wait("2 items, ")
