@@ -69,6 +69,7 @@ class MirrorViewTest : public testing::Test {
     }
     return found;
   }
+  static GtkWidget* entryOf(GtkWidget* field) { return gtk_overlay_get_child(GTK_OVERLAY(field)); }
   Rect placeOf(GtkWidget* widget) {
     graphene_rect_t bounds;
     EXPECT_TRUE(gtk_widget_compute_bounds(widget, mirror->widget(), &bounds));
@@ -188,8 +189,8 @@ TEST_F(MirrorViewTest, ButtonsArePressedAndFieldsAreTypedIn) {
   ASSERT_EQ(widgets().size(), 3U);
   g_signal_emit_by_name(widgets()[1], "clicked");
   EXPECT_EQ(presses, 1);
-  EXPECT_STREQ(gtk_editable_get_text(GTK_EDITABLE(widgets()[2])), "Report.txt");
-  gtk_editable_set_text(GTK_EDITABLE(widgets()[2]), "New.txt");
+  EXPECT_STREQ(gtk_editable_get_text(GTK_EDITABLE(entryOf(widgets()[2]))), "Report.txt");
+  gtk_editable_set_text(GTK_EDITABLE(entryOf(widgets()[2])), "New.txt");
   EXPECT_EQ(field->text(), "New.txt");
 }
 
@@ -201,7 +202,7 @@ TEST_F(MirrorViewTest, ACentredTextIsInTheMiddleWhetherItCanBeClearedOrNot) {
   column->addArrangedSubview(field);
   LayoutConstraint::makeConstant(*field, LayoutAttribute::Width, 200)->setActive(true);
   show();
-  GtkWidget* entry = widgets()[1];
+  GtkWidget* entry = entryOf(widgets()[1]);
   const auto middleOfText = [entry] {
     graphene_rect_t text;
     EXPECT_TRUE(gtk_widget_compute_bounds(GTK_WIDGET(gtk_editable_get_delegate(GTK_EDITABLE(entry))), entry, &text));
@@ -219,6 +220,42 @@ TEST_F(MirrorViewTest, ACentredTextIsInTheMiddleWhetherItCanBeClearedOrNot) {
   EXPECT_LT(middleOfText(), gtk_widget_get_width(entry) / 2.0 - 5) << "it begins where the field does";
 }
 
+TEST_F(MirrorViewTest, ANameThatIsTooLongIsShortenedInItsMiddleWhileItIsNotEdited) {
+  const auto field = std::make_shared<TextField>();
+  field->setText("A name that is much too long for its field.txt");
+  column->addArrangedSubview(field);
+  LayoutConstraint::makeConstant(*field, LayoutAttribute::Width, 200)->setActive(true);
+  show();
+  GtkWidget* entry = entryOf(widgets()[1]);
+  GtkLabel* shown = GTK_LABEL(gtk_widget_get_last_child(widgets()[1]));
+  const auto editedTextIsSeen = [entry] {
+    GdkRGBA color;
+    gtk_style_context_get_color(gtk_widget_get_style_context(GTK_WIDGET(gtk_editable_get_delegate(GTK_EDITABLE(entry)))),
+                                &color);
+    return color.alpha > 0;
+  };
+  field->endEditing(true);
+  settle();
+  EXPECT_TRUE(gtk_widget_get_visible(GTK_WIDGET(shown)));
+  EXPECT_EQ(gtk_label_get_text(shown), field->text());
+  EXPECT_TRUE(pango_layout_is_ellipsized(gtk_label_get_layout(shown)));
+  EXPECT_EQ(gtk_label_get_ellipsize(shown), PANGO_ELLIPSIZE_MIDDLE);
+  EXPECT_FALSE(editedTextIsSeen());
+  EXPECT_EQ(gtk_editable_get_text(GTK_EDITABLE(entry)), field->text()) << "for screen readers";
+  graphene_rect_t resting;
+  graphene_rect_t edited;
+  ASSERT_TRUE(gtk_widget_compute_bounds(GTK_WIDGET(shown), entry, &resting));
+  ASSERT_TRUE(gtk_widget_compute_bounds(GTK_WIDGET(gtk_editable_get_delegate(GTK_EDITABLE(entry))), entry, &edited));
+  EXPECT_TRUE(graphene_rect_equal(&resting, &edited));
+  field->becomeFirstResponder();
+  settle();
+  EXPECT_FALSE(gtk_widget_get_visible(GTK_WIDGET(shown)));
+  EXPECT_TRUE(editedTextIsSeen());
+  field->setText("Other.txt");
+  field->endEditing(true);
+  EXPECT_STREQ(gtk_label_get_text(shown), "Other.txt");
+}
+
 TEST_F(MirrorViewTest, TheClearButtonShowsWhileThereIsWhatItClears) {
   const auto field = std::make_shared<TextField>();
   field->setText("Report.txt");
@@ -226,7 +263,7 @@ TEST_F(MirrorViewTest, TheClearButtonShowsWhileThereIsWhatItClears) {
   column->addArrangedSubview(field);
   LayoutConstraint::makeConstant(*field, LayoutAttribute::Width, 200)->setActive(true);
   show();
-  GtkWidget* entry = widgets()[1];
+  GtkWidget* entry = entryOf(widgets()[1]);
   const auto shows = [entry] { return gtk_entry_get_icon_name(GTK_ENTRY(entry), GTK_ENTRY_ICON_SECONDARY) != nullptr; };
   field->endEditing(true);
   EXPECT_FALSE(shows()) << "nothing is edited";
@@ -256,14 +293,14 @@ TEST_F(MirrorViewTest, AFieldIsScrolledToUnlessItsScreenRefuses) {
   show();
   ASSERT_GT(field->frame().y, 800);
   delegate->byToolkit = false;
-  gtk_widget_grab_focus(widgets().back());
+  gtk_widget_grab_focus(entryOf(widgets().back()));
   // As many frames as the toolkit would move through.
   for (int frame = 0; frame < 20; ++frame) settle();
   EXPECT_TRUE(field->isEditing());
   EXPECT_EQ(gtk_adjustment_get_value(adjustment()), 0);
   field->resignFirstResponder();
   delegate->byToolkit = true;
-  gtk_widget_grab_focus(widgets().back());
+  gtk_widget_grab_focus(entryOf(widgets().back()));
   EXPECT_TRUE(list_test::waitUntil([&] { return gtk_adjustment_get_value(adjustment()) > 0; }));
   EXPECT_TRUE(field->isEditing());
 }

@@ -3,8 +3,8 @@
 
 #include "host/gtk/mirror/mirrored_button.h"
 #include "host/gtk/mirror/mirrored_drawing.h"
+#include "host/gtk/mirror/mirrored_name.h"
 #include "host/gtk/mirror/mirrored_picture.h"
-#include "host/gtk/mirrored_field.h"
 #include "host/gtk/mirrored_text.h"
 
 namespace vaelo {
@@ -36,7 +36,7 @@ class Separator : public MirroredContent {
 
 std::unique_ptr<MirroredContent> makeMirroredContent(View& view) {
   if (auto* label = dynamic_cast<Label*>(&view)) return std::make_unique<Following<MirroredText, Label>>(*label);
-  if (auto* field = dynamic_cast<TextField*>(&view)) return std::make_unique<Following<MirroredField, TextField>>(*field);
+  if (auto* field = dynamic_cast<TextField*>(&view)) return std::make_unique<Following<MirroredName, TextField>>(*field);
   if (auto* button = dynamic_cast<Button*>(&view)) return std::make_unique<Following<MirroredButton, Button>>(*button);
   if (auto* image = dynamic_cast<ImageView*>(&view)) return std::make_unique<Following<MirroredPicture, ImageView>>(*image);
   if (view.drawsContent()) return std::make_unique<Following<MirroredDrawing, View>>(view);
