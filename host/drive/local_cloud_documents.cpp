@@ -175,8 +175,10 @@ Result<StorageFigures> LocalCloudDocuments::measureStorage() const {
   if (disk.f_blocks == 0) return fileError(FileErrorCode::ReadUnknown, mirror, "the disk doesn't tell how large it is");
   StorageFigures figures = storageFigures(disk.f_bavail, disk.f_blocks, disk.f_frsize);
   if (const std::optional<std::int64_t> allowance = account_.record().allowance) {
-    figures.free = std::clamp<std::int64_t>(*allowance - usedBytes(mirror), 0, figures.free);
-    figures.total = *allowance;
+    const std::int64_t used = usedBytes(mirror);
+    figures.free = std::clamp<std::int64_t>(*allowance - used, 0, figures.free);
+    // Of an allowance that the disk has no room for no more can be used, or bought.
+    figures.total = used < *allowance - figures.free ? used + figures.free : *allowance;
   }
   return figures;
 }

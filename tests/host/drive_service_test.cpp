@@ -365,6 +365,26 @@ TEST_F(DriveServiceTest, WhatAFetchMeasuresIsToldBesides) {
   service->observeStorage([&](const StorageFigures& figures) { measured = figures; });
   service->fetchQuota([](const Result<std::int64_t>&) {});
   EXPECT_EQ(measured, (StorageFigures{600, 1000}));
+  for (const char* less : {"400", "399", "0"}) {
+    writeAccount(std::string("Token=t\nSignedIn=true\nAllowance=") + less + "\n");
+    start();
+    service->observeStorage([&](const StorageFigures& figures) { measured = figures; });
+    service->fetchQuota([](const Result<std::int64_t>&) {});
+    EXPECT_EQ(measured, (StorageFigures{0, std::stoll(less)}));
+  }
+}
+
+TEST_F(DriveServiceTest, AnAllowanceBeyondTheDiskIsWhatTheDiskHasRoomFor) {
+  makeFolder(data);
+  writeAccount("Token=t\nSignedIn=true\nAllowance=9223372036854775807\n");
+  write(drive + "/a", std::string(400, 'x'));
+  start();
+  std::optional<StorageFigures> measured;
+  service->observeStorage([&](const StorageFigures& figures) { measured = figures; });
+  service->fetchQuota([](const Result<std::int64_t>&) {});
+  ASSERT_TRUE(measured);
+  EXPECT_GT(measured->free, 0);
+  EXPECT_EQ(measured->total, measured->free + 400);
 }
 
 TEST_F(DriveServiceTest, ARebuiltIndexIsAnnounced) {
