@@ -7,6 +7,7 @@
 
 #include "host/gtk/focus_return.h"
 #include "host/gtk/item_peek.h"
+#include "host/gtk/popover_parent.h"
 #include "host/gtk/touch_size.h"
 #include "host/support/texts.h"
 #include "platform/ui/document_list_controller_delegate.h"
@@ -124,7 +125,7 @@ void showItemActionsMenu(GtkWidget* over, const GdkRectangle& at, const std::str
   g_object_unref(act);
   gtk_widget_insert_action_group(popover, "item", G_ACTION_GROUP(group));
   g_object_unref(group);
-  gtk_widget_set_parent(popover, over);
+  setPopoverParent(popover, over);
   // What does not show yet can't be measured.
   const auto rows = static_cast<int>(std::count_if(std::begin(Entries), std::end(Entries),
                                                    [&offered](const Entry& entry) { return offered(entry.action); }));
@@ -132,18 +133,6 @@ void showItemActionsMenu(GtkWidget* over, const GdkRectangle& at, const std::str
   gtk_popover_set_pointing_to(GTK_POPOVER(popover), &place);
   gtk_popover_set_has_arrow(GTK_POPOVER(popover), FALSE);
   gtk_widget_set_halign(popover, GTK_ALIGN_START);
-  g_signal_connect(popover, "closed", G_CALLBACK(+[](GtkWidget* closed, gpointer) {
-                     // Its action may still be on its way.
-                     g_idle_add_full(
-                         G_PRIORITY_LOW,
-                         [](gpointer held) -> gboolean {
-                           gtk_widget_unparent(GTK_WIDGET(held));
-                           g_object_unref(held);
-                           return G_SOURCE_REMOVE;
-                         },
-                         g_object_ref(closed), nullptr);
-                   }),
-                   nullptr);
   returnFocusWhenClosed(popover);
   makeRowsLarge(popover);
   gtk_popover_popup(GTK_POPOVER(popover));

@@ -17,6 +17,7 @@
 #include "host/drive/small_file.h"
 #include "host/gtk/focus_return.h"
 #include "host/gtk/list/worker.h"
+#include "host/gtk/popover_parent.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
 #include "items/dr_item.h"
@@ -79,7 +80,7 @@ class TagsPopover {
   TagsPopover(GtkWidget* over, const GdkRectangle& at, const URL& item, DriveSyncedStore& tags,
               std::function<void()> changed)
       : path_(item.path()), tags_(tags), changed_(std::move(changed)), popover_(gtk_popover_new()) {
-    gtk_widget_set_parent(popover_, over);
+    setPopoverParent(popover_, over);
     gtk_popover_set_pointing_to(GTK_POPOVER(popover_), &at);
     setAccessibleName(popover_, _("Tags"));
     GtkWidget* box = gtk_box_new(GTK_ORIENTATION_VERTICAL, 6);
@@ -94,7 +95,6 @@ class TagsPopover {
     makeField(box);
     gtk_popover_set_child(GTK_POPOVER(popover_), box);
     keepFocusIn(box);
-    g_signal_connect(popover_, "closed", G_CALLBACK(closed), nullptr);
     g_signal_connect(popover_, "destroy", G_CALLBACK(+[](GtkWidget*, TagsPopover* self) { delete self; }), this);
     worker_.run([this, path = path_]() -> std::function<void()> {
       const std::optional<std::string> physical = physicalPathOf(path);
@@ -103,17 +103,6 @@ class TagsPopover {
   }
 
  private:
-  static void closed(GtkWidget* popover, gpointer) {
-    // A toggle of it may still be on its way.
-    g_idle_add_full(
-        G_PRIORITY_LOW,
-        [](gpointer held) -> gboolean {
-          gtk_widget_unparent(GTK_WIDGET(held));
-          return G_SOURCE_REMOVE;
-        },
-        g_object_ref(popover), g_object_unref);
-  }
-
   /// The parent does not know of the popover when it moves the focus, so that Tab would leave it.
   void keepFocusIn(GtkWidget* box) {
     GtkEventController* keys = gtk_event_controller_key_new();

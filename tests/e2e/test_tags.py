@@ -106,6 +106,27 @@ class Tags(unittest.TestCase):
                 app.key("Escape")
                 app.wait_gone("Kind")
 
+    def test_the_menus_of_an_item_go_with_its_list(self):
+        app = self.app
+        account = app.data / "account.ini"
+
+        def sign(signed_in):
+            new = account.with_suffix(".new")
+            new.write_text(f"[Account]\nName=x\nToken=ab\nSignedIn={signed_in}\n")
+            new.rename(account)
+        self.open_tags()
+        sign("false")
+        app.wait("Vaelo Drive is not available")
+        sign("true")
+        app.click("Photo.png", "list item", button=3)
+        app.wait("Tags…", "menu item")
+        sign("false")
+        app.wait("Vaelo Drive is not available")
+        sign("true")
+        app.wait("Report.txt", "list item")
+        for complaint in ("still has children left", "GTK_IS_ACCESSIBLE"):
+            self.assertNotIn(complaint, app.log())
+
     def test_what_another_program_adds_is_offered(self):
         new = self.values.with_suffix(".new")
         new.write_text("{'RoverTagDict': <{'RoverTagDictVersion': <uint64 2>, 'RoverTags': <[{'n': <'Garden'>, 'l': <uint64 2>}]>}>}")
