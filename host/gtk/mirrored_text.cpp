@@ -2,9 +2,11 @@
 #include "host/gtk/mirrored_text.h"
 
 #include <algorithm>
+#include <cmath>
 
 #include "host/gtk/fitting_line.h"
 #include "host/gtk/pango_graphics.h"
+#include "host/support/glib_ptr.h"
 
 namespace vaelo {
 
@@ -52,6 +54,16 @@ bool isLargeText() {
 // A word as long as those of German is broken and fills two lines by itself.
 int linesOf(const Label& label) { return isLargeText() ? 3 * label.numberOfLines() : label.numberOfLines(); }
 
+/// Pictures that were drawn for a fine screen have more pixels than points.
+GdkPaintable* inPoints(const GtkImageData& image) {
+  const auto length = [](double points) { return static_cast<float>(std::ceil(points)); };
+  const graphene_rect_t place = GRAPHENE_RECT_INIT(0, 0, length(image.width()), length(image.height()));
+  GtkSnapshot* snapshot = gtk_snapshot_new();
+  gdk_paintable_snapshot(image.paintable(), snapshot, static_cast<double>(place.size.width),
+                         static_cast<double>(place.size.height));
+  return gtk_snapshot_free_to_paintable(snapshot, &place.size);
+}
+
 }  // namespace
 
 PangoAttrList* attributesOf(const Font& font) {
@@ -93,7 +105,8 @@ void MirroredText::update() {
       continue;
     }
     if (isColumn && gtk_widget_get_first_child(line)) line = appendLine();
-    GtkWidget* picture = gtk_picture_new_for_paintable(image->paintable());
+    const GRef<GdkPaintable> paintable(inPoints(*image));
+    GtkWidget* picture = gtk_picture_new_for_paintable(paintable.get());
     gtk_picture_set_can_shrink(GTK_PICTURE(picture), FALSE);
     gtk_widget_set_valign(picture, GTK_ALIGN_CENTER);
     if (gtk_widget_get_first_child(line)) {

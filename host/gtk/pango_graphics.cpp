@@ -6,6 +6,8 @@
 
 #include "host/gtk/cairo_texture.h"
 #include "host/support/glib_ptr.h"
+#include "platform/platform.h"
+#include "platform/ui/screen_factory.h"
 
 namespace vaelo {
 
@@ -133,10 +135,12 @@ Size PangoGraphics::measure(const std::string& text, const Font& font, double ma
 }
 
 ImageRef PangoGraphics::renderImage(const Size& size, const std::function<void(DrawingContext&)>& draw) {
+  const int scale = std::max(1, static_cast<int>(std::ceil(Platform::current().screens.device().mainScreen().scale)));
   const int width = std::max(1, static_cast<int>(std::ceil(size.width)));
   const int height = std::max(1, static_cast<int>(std::ceil(size.height)));
-  cairo_surface_t* surface = cairo_image_surface_create(CAIRO_FORMAT_ARGB32, width, height);
+  cairo_surface_t* surface = cairo_image_surface_create(CAIRO_FORMAT_ARGB32, width * scale, height * scale);
   cairo_t* cairo = cairo_create(surface);
+  cairo_scale(cairo, scale, scale);
   drawWithCairo(cairo, draw);
   cairo_destroy(cairo);
   return std::make_shared<GtkImageData>(GDK_PAINTABLE(takeCairoTexture(surface)), size.width, size.height);

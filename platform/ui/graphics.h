@@ -33,7 +33,7 @@ class DrawingContext {
 /// Formats of document icons; the codes are those that the screens ask with.
 enum class IconFormat { Small = 0, Large = 12 };
 
-/// Text measuring, drawing into images, and icons. Main thread, except renderImage, which any thread may call.
+/// Text measuring, drawing into images, and icons. Main thread.
 class Graphics {
  public:
   virtual ~Graphics() = default;

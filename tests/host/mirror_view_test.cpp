@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include "host/gtk/mirror/view_mirror.h"
+#include "host/gtk/mirrored_text.h"
 #include "host/gtk/pango_graphics.h"
 #include "platform/ui/button.h"
 #include "platform/ui/image_view.h"
@@ -306,6 +307,7 @@ TEST_F(MirrorViewTest, AFieldIsScrolledToUnlessItsScreenRefuses) {
 }
 
 TEST_F(MirrorViewTest, SmallPicturesAreMagnifiedInSquaresAndOnlyOnce) {
+  memory.screens.deviceShown.screen.scale = 1;
   const auto picture = std::make_shared<ImageView>(Rect{20, 100, 45, 45});
   picture->setMagnificationFilter(MagnificationFilter::Nearest);
   picture->setImage(PangoGraphics().renderImage({10, 10}, [](DrawingContext& context) { context.fillRect({0, 0, 5, 10}); }));
@@ -381,6 +383,33 @@ TEST_F(MirrorViewTest, APictureInATextStandsNearerToWhatFollowsIt) {
   words.setText("Work Holiday");
   EXPECT_EQ(label->intrinsicContentSize().width,
             words.intrinsicContentSize().width + 2 * dot->width() + AttributedString::RoomBeforeImage);
+}
+
+TEST_F(MirrorViewTest, APictureInATextIsAsFineAsTheScreenAndNoLargerForIt) {
+  for (const int scale : {1, 2, 3}) {
+    memory.screens.deviceShown.screen.scale = scale;
+    const ImageRef dot = PangoGraphics().renderImage({10, 10}, [](DrawingContext& context) {
+      context.fillRect({5, 0, 5, 10});
+    });
+    EXPECT_EQ(dot->width(), 10);
+    GdkTexture* texture = GDK_TEXTURE(std::dynamic_pointer_cast<const GtkImageData>(dot)->paintable());
+    ASSERT_EQ(gdk_texture_get_width(texture), 10 * scale);
+    std::vector<guint32> pixels(static_cast<std::size_t>(100 * scale * scale));
+    gdk_texture_download(texture, reinterpret_cast<guchar*>(pixels.data()), static_cast<gsize>(10 * scale) * 4);
+    EXPECT_EQ(pixels[static_cast<std::size_t>(5 * scale - 1)], 0U) << "the left half is empty";
+    EXPECT_NE(pixels[static_cast<std::size_t>(5 * scale)], 0U);
+    MirroredText shown(*label);
+    AttributedString text;
+    text.appendImage(dot);
+    label->setAttributedText(text);
+    shown.update();
+    int natural = 0;
+    gtk_widget_measure(gtk_widget_get_first_child(shown.widget()), GTK_ORIENTATION_HORIZONTAL, -1, nullptr, &natural,
+                       nullptr, nullptr);
+    EXPECT_EQ(natural, 10);
+    g_object_ref_sink(shown.widget());
+    g_object_unref(shown.widget());
+  }
 }
 
 TEST_F(MirrorViewTest, OfManyThingsWithPicturesTheLastAreLeftOut) {
