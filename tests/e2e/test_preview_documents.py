@@ -188,6 +188,31 @@ class PortableDocuments(Window):
         self.assertEqual(app.process.wait(20), 0)
         self.wait_for_marks("Ink")
 
+    def write_note(self, text):
+        app = self.app
+        app.click("Markup")
+        self.wait_for_tools()
+        app.click("Note")
+        self.click_page(200, 150)
+        app.wait("Add Note")
+        app.type(text)
+
+    def test_a_note_is_kept_when_a_link_brings_another_document(self):
+        app = self.app
+        (app.drive / "Other.txt").write_text("Something else\n")
+        self.write_note("Mind the bridge")
+        status, said = app.link(f"vaelodriveapp://{app.drive}/Other.txt?mode=preview")
+        self.assertEqual(status, 0, said)
+        app.wait_title("Other.txt")
+        self.wait_for_marks("Text")
+        self.assertFalse(app.find("This document"))
+
+    def test_a_note_is_kept_when_the_program_ends(self):
+        self.write_note("Mind the bridge")
+        self.app.desktop.tool("gapplication", "action", "com.marrow.VaeloDrive", "quit")
+        self.assertEqual(self.app.process.wait(20), 0)
+        self.wait_for_marks("Text")
+
     def test_what_others_wrote_stays(self):
         app = self.app
         app.click("Markup")

@@ -4,6 +4,7 @@
 
 #include <csignal>
 #include <filesystem>
+#include <utility>
 
 #include "tests/host/preview_portable_document_marking_test.h"
 
@@ -122,6 +123,25 @@ TEST_F(PortableDocumentMarksTest, LeavingSavesWhatIsNotSavedYet) {
 TEST_F(PortableDocumentMarksTest, TheEndOfTheProgramSavesWhatIsNotSavedYet) {
   openToMark();
   drawLine();
+  PortableDocumentMarks::finishAll();
+  EXPECT_EQ(marksIn(path(), 0).size(), 1U);
+}
+
+TEST_F(PortableDocumentMarksTest, TheEndOfTheProgramKeepsTheNoteThatIsBeingWritten) {
+  openToMark();
+  screen_->markup().askForNote(100, 100);
+  screen_->markup().note().setText("Mind the bridge");
+  PortableDocumentMarks::finishAll();
+  ASSERT_EQ(marksIn(path(), 0).size(), 1U);
+  EXPECT_EQ(marksIn(path(), 0).front().text, "Mind the bridge");
+}
+
+TEST_F(PortableDocumentMarksTest, TheNoteThatIsBeingWrittenIsKeptWhenTheWindowIsClosed) {
+  openToMark();
+  screen_->markup().askForNote(100, 100);
+  screen_->markup().note().setText("Mind the bridge");
+  gtk_window_destroy(GTK_WINDOW(std::exchange(window_, nullptr)));
+  toasts_ = nullptr;
   PortableDocumentMarks::finishAll();
   EXPECT_EQ(marksIn(path(), 0).size(), 1U);
 }

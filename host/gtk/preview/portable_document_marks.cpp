@@ -168,6 +168,7 @@ void PortableDocumentMarks::fail(const std::string& sentence) {
 
 void PortableDocumentMarks::leave() {
   events_.changed = nullptr;
+  events_.ending = nullptr;
   save();
 }
 
@@ -176,7 +177,10 @@ void PortableDocumentMarks::finishAll() {
     const auto& all = living();
     return std::any_of(all.begin(), all.end(), [](const auto* marks) { return marks->state_ == State::Saving; });
   };
-  for (PortableDocumentMarks* each : living()) each->save();
+  for (PortableDocumentMarks* each : living()) {
+    if (each->events_.ending) each->events_.ending();
+    each->save();
+  }
   const gint64 end = g_get_monotonic_time() + FinishingTakes;
   const guint awake = g_timeout_add_seconds(
       1, +[](gpointer) -> gboolean { return G_SOURCE_CONTINUE; }, nullptr);

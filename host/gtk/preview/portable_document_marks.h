@@ -30,6 +30,7 @@ class PortableDocumentMarks : public std::enable_shared_from_this<PortableDocume
   struct Events {
     std::function<void()> changed;                          ///< marks, or how far they are saved; not after leave()
     std::function<void(const std::string& sentence)> told;  ///< what a person must know of, also after leave()
+    std::function<void()> ending;                           ///< what is being written is to be added now; not after leave()
   };
   enum class State { Unchanged, Unsaved, Saving, Saved, Failed };
 

@@ -34,7 +34,8 @@ void PortableDocumentMarkup::begin(PortableDocumentMarks::Document document) {
   // What is being written is meant for the place that it was asked for, which is still on the page.
   if (marks_) std::exchange(marks_, nullptr)->leave();
   stroke_.reset();
-  marks_ = PortableDocumentMarks::make(std::move(document), {[this] { changed(); }, events_.tell});
+  marks_ =
+      PortableDocumentMarks::make(std::move(document), {[this] { changed(); }, events_.tell, [this] { note_.finish(); }});
   bar_.offer(true);
   bar_.show(marks_->state(), false);
 }

@@ -169,10 +169,8 @@ void PreviewPage::makeView(const std::string& contentType) {
   events.progress = [this](const std::string& sentence) {
     adw_status_page_set_description(ADW_STATUS_PAGE(loading_), sentence.c_str());
   };
-  events.shouldSave = [this] {
-    const std::optional<URL> edited = item();
-    return edited && controller_->shouldSaveEditedItem(*edited);
-  };
+  // Of what the view shows: what is marked as another document comes is saved once that is the item.
+  events.shouldSave = [this, edited = *shown] { return controller_->shouldSaveEditedItem(edited); };
   adw_status_page_set_description(ADW_STATUS_PAGE(loading_), nullptr);
   // A label of bytes that are no UTF-8 ends the process as soon as a screen reader asks for it.
   const std::string name = takeString(g_filename_display_name(shown->lastPathComponent().c_str()));
