@@ -13,9 +13,11 @@ namespace {
 
 /// What the toolkit keeps free at the end of the field for the clear button, whether that shows or not.
 int roomOfClearButton(GtkWidget* entry) {
-  GtkWidget* icon = gtk_widget_get_last_child(entry);
   int width = 0;
-  if (GTK_IS_IMAGE(icon)) gtk_widget_measure(icon, GTK_ORIENTATION_HORIZONTAL, -1, nullptr, &width, nullptr, nullptr);
+  // Its button is the last child, or the first one where people read from the right.
+  for (GtkWidget* child = gtk_widget_get_first_child(entry); child; child = gtk_widget_get_next_sibling(child)) {
+    if (GTK_IS_IMAGE(child)) gtk_widget_measure(child, GTK_ORIENTATION_HORIZONTAL, -1, nullptr, &width, nullptr, nullptr);
+  }
   return width;
 }
 
