@@ -1,6 +1,7 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #pragma once
 
+#include <algorithm>
 #include <functional>
 #include <memory>
 #include <string>
@@ -26,8 +27,12 @@ class MemoryQueues : public Queues {
   }
   std::unique_ptr<TimerSource> makeTimer(std::shared_ptr<DispatchQueue> queue, std::chrono::nanoseconds interval,
                                          std::chrono::nanoseconds leeway, Block handler) override {
-    timers.push_back({queue ? queue->label() : "", interval, leeway});
-    return std::make_unique<MemoryTimer>(queue ? std::move(queue) : makeSerialQueue("timer"), interval, std::move(handler));
+    const auto others = std::count_if(lives_.begin(), lives_.end(), [](const auto& life) { return !life.expired(); });
+    timers.push_back({queue ? queue->label() : "", interval, leeway, others});
+    auto timer =
+        std::make_unique<MemoryTimer>(queue ? std::move(queue) : makeSerialQueue("timer"), interval, std::move(handler));
+    lives_.push_back(timer->life());
+    return timer;
   }
   Date now() override { return clock_->date(); }
 
@@ -35,6 +40,7 @@ class MemoryQueues : public Queues {
     std::string queue;  ///< its label
     std::chrono::nanoseconds interval;
     std::chrono::nanoseconds leeway;
+    std::ptrdiff_t others;  ///< timers that ran when it was made
   };
   std::vector<AskedTimer> timers;  ///< all that were asked for
 
@@ -44,6 +50,7 @@ class MemoryQueues : public Queues {
  private:
   std::shared_ptr<MemoryClock> clock_;
   MemoryDispatchQueue main_;
+  std::vector<std::weak_ptr<const void>> lives_;  // of the timers
 };
 
 }  // namespace vaelo

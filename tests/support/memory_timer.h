@@ -16,6 +16,9 @@ class MemoryTimer : public TimerSource {
         [weak = std::weak_ptr(queue), interval, handler = std::weak_ptr(handler_)] { fire(weak, interval, handler); });
   }
 
+  /// Expires when the timer is cancelled.
+  std::weak_ptr<const void> life() const { return handler_; }
+
  private:
   static void fire(const std::weak_ptr<DispatchQueue>& weakQueue, std::chrono::nanoseconds interval,
                    const std::weak_ptr<Block>& weakHandler) {

@@ -349,6 +349,20 @@ TEST_F(PreviewDetailsTest, EachRenameKeepsTheButtonsOfItsTime) {
   }
 }
 
+TEST_F(PreviewDetailsTest, TheButtonsOfARenameGoBeforeTheOthersComeBack) {
+  open();
+  const std::vector right{BarButtonItem::withTitle("Open", BarButtonStyle::Plain, nullptr)};
+  NavigationItem& bar = details->navigationItem();
+  bar.setRightBarButtonItems(right);
+  details->updateNavBarForRename(true);
+  bool wentFirst = false;
+  const auto token =
+      bar.changed().connect([&](NavigationItem& changed) { wentFirst |= changed.rightBarButtonItems().empty(); });
+  details->updateNavBarForRename(false);
+  EXPECT_TRUE(wentFirst);
+  EXPECT_EQ(bar.rightBarButtonItems(), right);
+}
+
 TEST_F(PreviewDetailsTest, DoneEndsTheEditingEvenOfARefusedName) {
   addFile("Plans/Taken.pdf");
   open();
@@ -372,6 +386,7 @@ TEST_F(PreviewDetailsTest, ARefreshInTheMiddleOfAnEditShowsTheCurrentName) {
 
 TEST_F(PreviewDetailsTest, ATapOnTheScreenAtRestChangesNothing) {
   open();
+  EXPECT_TRUE(details->view()->userInteractionEnabled());
   log().clear();
   details->view()->gestureRecognizers().at(0)->recognize();
   EXPECT_FALSE(loggedStarting("DEBUG", "ShouldEndEditing"));

@@ -264,6 +264,8 @@ TEST_F(InfoViewsTest, AThumbnailFitsWithItsMargins) {
   EXPECT_EQ(fit({100, 200}, {10, 20, 234, 434}, 17), (Rect{10 + 17, 20 + 17, 200, 400}));
   EXPECT_EQ(fit({0, 10}, {0, 0, 400, 400}, 17), (Rect{200, 200, 0, 0}));
   EXPECT_EQ(fit({10, 0}, {0, 0, 400, 400}, 17), (Rect{200, 200, 0, 0}));
+  EXPECT_EQ(view->thumbnailView()->superview(), view.get());
+  EXPECT_TRUE(view->thumbnailView()->translatesAutoresizingMaskIntoConstraints()) << "its frame places it";
   EXPECT_EQ(view->thumbnailView()->contentMode(), ContentMode::TopLeft);
   EXPECT_EQ(view->thumbnailView()->magnificationFilter(), MagnificationFilter::Nearest);
   EXPECT_EQ(view->margins(), 17);

@@ -43,6 +43,8 @@ TEST_F(QuotaFetcherTest, ASecondIntervalReplacesTheFirst) {
   const int before = quotaFetches();
   advance(std::chrono::seconds(99));
   EXPECT_EQ(quotaFetches(), before);
+  ASSERT_EQ(memory.queues.timers.size(), 2u);
+  EXPECT_EQ(memory.queues.timers[1].others, 0) << "the first is gone before there is a second";
 }
 
 TEST_F(QuotaFetcherTest, ADroppedFetcherAsksNoMore) {
