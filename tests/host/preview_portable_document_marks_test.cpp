@@ -146,6 +146,29 @@ TEST_F(PortableDocumentMarksTest, TheNoteThatIsBeingWrittenIsKeptWhenTheWindowIs
   EXPECT_EQ(marksIn(path(), 0).size(), 1U);
 }
 
+TEST_F(PortableDocumentMarksTest, ANoteIsWrittenWithinTheWindowThatAKeyboardMakesLower) {
+  openToMark();
+  screen_->markup().askForNote(100, 600);
+  screen_->markup().note().setText("Mind the bridge");
+  GtkWidget* popover = gtk_widget_get_ancestor(gtk_root_get_focus(GTK_ROOT(window_)), GTK_TYPE_POPOVER);
+  ASSERT_TRUE(popover);
+  const auto isWithin = [&] {
+    GdkRectangle pointed;
+    gtk_popover_get_pointing_to(GTK_POPOVER(popover), &pointed);
+    double x = 0;
+    double y = 0;
+    gtk_widget_translate_coordinates(gtk_widget_get_parent(popover), window_, pointed.x, pointed.y, &x, &y);
+    const bool above = gtk_popover_get_position(GTK_POPOVER(popover)) == GTK_POS_TOP;
+    const int height = gtk_widget_get_height(popover);
+    return above ? y >= height && y < gtk_widget_get_height(window_) : y + height <= gtk_widget_get_height(window_);
+  };
+  for (const int height : {400, 260, 700}) {
+    gtk_window_set_default_size(GTK_WINDOW(window_), 424, height);
+    EXPECT_TRUE(waitUntil([&] { return gtk_widget_get_height(window_) == height && isWithin(); })) << height;
+  }
+  EXPECT_EQ(screen_->markup().note().text(), "Mind the bridge");
+}
+
 /// Files of this process can't grow beyond a few bytes, as on a full disk.
 class FullDisk {
  public:

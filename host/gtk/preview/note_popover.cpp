@@ -1,6 +1,8 @@
 // SPDX-License-Identifier: GPL-3.0-or-later
 #include "host/gtk/preview/note_popover.h"
 
+#include <algorithm>
+
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
 
@@ -52,6 +54,7 @@ NotePopover::NotePopover(GtkWidget* parent, GtkWidget* content)
 }
 
 NotePopover::~NotePopover() {
+  leaveWindow();
   g_signal_handlers_disconnect_by_data(popover_, this);
   gtk_widget_unparent(popover_);
 }
@@ -61,9 +64,51 @@ void NotePopover::ask(const GdkRectangle& place, std::function<void(const std::s
   written_ = std::move(written);
   setText(text);
   gtk_button_set_label(GTK_BUTTON(done_), text.empty() ? _("Add Note") : _("Save Note"));
-  gtk_popover_set_pointing_to(GTK_POPOVER(popover_), &place);
+  place_ = place;
+  fitIntoWindow();
+  followWindow();
   gtk_popover_popup(GTK_POPOVER(popover_));
   gtk_widget_grab_focus(text_);
+}
+
+void NotePopover::followWindow() {
+  GtkNative* native = gtk_widget_get_native(gtk_widget_get_parent(popover_));
+  if (!native) return;
+  window_ = GDK_SURFACE(g_object_ref(gtk_native_get_surface(native)));
+  // The window lays its widgets out in a handler of its own, which is older.
+  layout_ = g_signal_connect_data(window_, "layout",
+                                  G_CALLBACK(+[](GdkSurface*, int, int, NotePopover* self) { self->fitIntoWindow(); }), this,
+                                  nullptr, G_CONNECT_AFTER);
+}
+
+void NotePopover::leaveWindow() {
+  if (!window_) return;
+  g_signal_handler_disconnect(window_, layout_);
+  g_clear_object(&window_);
+}
+
+// The keyboard of a phone takes the lower part of the window as soon as there is something to write, and no popover is moved
+// out of its way.
+void NotePopover::fitIntoWindow() {
+  GtkWidget* parent = gtk_widget_get_parent(popover_);
+  GtkWidget* window = GTK_WIDGET(gtk_widget_get_root(parent));
+  double x = 0;
+  double top = 0;
+  if (!window || !gtk_widget_translate_coordinates(parent, window, 0, 0, &x, &top)) return;
+  const int height = gtk_widget_get_height(window);
+  int needed = 0;
+  gtk_widget_measure(popover_, GTK_ORIENTATION_VERTICAL, -1, nullptr, &needed, nullptr, nullptr);
+  const int offset = static_cast<int>(top);
+  const bool fitsBelow = offset + place_.y + place_.height + needed <= height;
+  GdkRectangle pointed = place_;
+  if (!fitsBelow) pointed.y = std::min(std::max(place_.y, needed - offset), std::max(height - offset - place_.height, 0));
+  GdkRectangle now = {};
+  const bool isThere = gtk_popover_get_pointing_to(GTK_POPOVER(popover_), &now) && gdk_rectangle_equal(&now, &pointed);
+  const GtkPositionType side = fitsBelow ? GTK_POS_BOTTOM : GTK_POS_TOP;
+  // Either would have the window laid out anew each time.
+  if (isThere && gtk_popover_get_position(GTK_POPOVER(popover_)) == side) return;
+  gtk_popover_set_position(GTK_POPOVER(popover_), side);
+  gtk_popover_set_pointing_to(GTK_POPOVER(popover_), &pointed);
 }
 
 void NotePopover::giveUp() {
@@ -76,6 +121,7 @@ void NotePopover::setText(const std::string& text) {
 }
 
 void NotePopover::closed() {
+  leaveWindow();
   gtk_widget_grab_focus(content_);
   const std::function<void(const std::string&)> written = std::move(written_);
   written_ = nullptr;

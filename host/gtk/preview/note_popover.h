@@ -30,12 +30,18 @@ class NotePopover {
 
  private:
   void closed();
+  void followWindow();
+  void leaveWindow();
+  void fitIntoWindow();
 
   GtkWidget* content_;
   GtkWidget* popover_;
   GtkWidget* text_;
   GtkWidget* done_;
   std::function<void(const std::string&)> written_;
+  GdkRectangle place_ = {};       // that was asked for, of the parent
+  GdkSurface* window_ = nullptr;  // while it is open
+  gulong layout_ = 0;
 };
 
 }  // namespace vaelo
