@@ -134,7 +134,11 @@ std::string FolderPicker::invitation() const {
     return filled(ngettext("Move %s item to…", "Move %s items to…", items.size()),
                   {numberText(static_cast<std::int64_t>(items.size()))});
   }
-  return filled(_("Move “%s” to…"), {takeString(g_filename_display_name(items.front().lastPathComponent().c_str()))});
+  return filled(_("Move “%s” to…"), {nameOfItem()});
+}
+
+std::string FolderPicker::nameOfItem() const {
+  return takeString(g_filename_display_name(picker_->itemsToMove().front().lastPathComponent().c_str()));
 }
 
 std::string FolderPicker::titleOf(const URL& folder) const {
@@ -173,14 +177,20 @@ void FolderPicker::show(const URL& folder, MoveTarget target) {
   shown_ = true;
   gtk_widget_set_sensitive(move_, target.refusal.empty());
   gtk_widget_set_sensitive(newFolder_, target.takesFolders);
-  gtk_label_set_text(GTK_LABEL(refusal_), target.refusal.c_str());
-  gtk_widget_set_visible(refusal_, !target.refusal.empty());
+  refuse(target.refusal);
   view_.setEntries(std::move(target.folders));
   view_.grabFocus();
 }
 
+void FolderPicker::refuse(const std::string& reason) {
+  gtk_label_set_text(GTK_LABEL(refusal_), reason.c_str());
+  gtk_widget_set_visible(refusal_, !reason.empty());
+}
+
 void FolderPicker::choose() {
   gtk_widget_set_sensitive(move_, FALSE);
+  // What is moved from its preview has nobody to move it once it is gone, and the preview with it.
+  if (!picker_->delegate()) return refuse(filled(_("“%s” is no longer there."), {nameOfItem()}));
   // Not inside of the press: a long move runs the main loop, which takes this picker away.
   Platform::current().queues.main().async([kept = picker_, folder = way_.back()] {
     if (kept->presentingViewController()) kept->userSelected(folder);

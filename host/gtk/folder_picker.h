@@ -32,11 +32,14 @@ class FolderPicker : public std::enable_shared_from_this<FolderPicker> {
   void goTo(const URL& folder);
   void goUp();
   void show(const URL& folder, MoveTarget target);
+  /// Says below the folders why nothing is moved; empty for nothing.
+  void refuse(const std::string& reason);
   void choose();
   void askForNewFolder();
   std::string makeFolder(const std::string& name, bool& accepted);
   std::string titleOf(const URL& folder) const;
   std::string invitation() const;
+  std::string nameOfItem() const;
 
   std::shared_ptr<DocumentTargetSelectionController> picker_;
   CloudDocuments& drive_;

@@ -43,6 +43,22 @@ class FolderPicker(ItemsWindow):
         wait_for("the item", (made / "Second.txt").exists)
         self.on_disk("Second.txt", False)
 
+    def test_what_was_moved_from_its_preview_and_is_gone_is_told(self):
+        app = self.app
+        app.link(f"vaelodriveapp://{self.drive}/Second.txt?mode=preview")
+        app.wait_title("Second.txt")
+        app.click("Move", "push button")
+        app.wait("The item is in this folder already.")
+        (self.drive / "Second.txt").unlink()
+        app.wait_log("Accommodate deletion")
+        wait_for("the preview to go", lambda: not app.find("Share", "push button"))
+        self.walk(1)
+        wait_for("the way to move", lambda: [row for row in app.accessibility.showing() if row[1] == "Move" and row[6]])
+        self.press("Move")
+        app.wait("“Second.txt” is no longer there.")
+        self.press("Cancel")
+        app.wait_gone("Move “Second.txt” to")
+
     def test_a_name_that_cannot_be_is_told_and_the_prompt_stays(self):
         self.open_picker()
         self.press("New Folder")
