@@ -4,6 +4,8 @@
 #include <unicode/ubidi.h>
 #include <unicode/unistr.h>
 
+#include <utility>
+
 #include "host/gtk/mirrored_text.h"
 #include "host/support/texts.h"
 
@@ -38,8 +40,16 @@ float xalignOf(const TextField& field, GtkWidget* entry) {
 MirroredField::MirroredField(TextField& field)
     : field_(std::static_pointer_cast<TextField>(field.shared_from_this())),
       entry_(GTK_WIDGET(g_object_ref_sink(gtk_entry_new()))),
-      focus_(gtk_event_controller_focus_new()) {
+      focus_(gtk_event_controller_focus_new()),
+      press_(gtk_gesture_click_new()) {
   gtk_widget_add_controller(entry_, focus_);
+  gtk_event_controller_set_propagation_phase(GTK_EVENT_CONTROLLER(press_), GTK_PHASE_CAPTURE);
+  gtk_widget_add_controller(entry_, GTK_EVENT_CONTROLLER(press_));
+  for (const auto& [signal, pressed] : {std::pair("pressed", true), std::pair("released", false)}) {
+    const auto note =
+        pressed ? +[](MirroredField* self) { self->pressed_ = true; } : +[](MirroredField* self) { self->pressed_ = false; };
+    g_signal_connect_swapped(press_, signal, G_CALLBACK(note), this);
+  }
   g_signal_connect_swapped(entry_, "changed", G_CALLBACK(+[](MirroredField* self) { self->typed(); }), this);
   g_signal_connect_swapped(entry_, "activate", G_CALLBACK(+[](MirroredField* self) {
                              const std::shared_ptr<TextField> kept = self->field_;
@@ -59,8 +69,10 @@ MirroredField::MirroredField(TextField& field)
 
 MirroredField::~MirroredField() {
   g_clear_handle_id(&idle_, g_source_remove);
+  g_clear_handle_id(&refusal_, g_source_remove);
   g_signal_handlers_disconnect_by_data(entry_, this);
   g_signal_handlers_disconnect_by_data(focus_, this);
+  g_signal_handlers_disconnect_by_data(press_, this);
   g_object_unref(entry_);
 }
 
@@ -164,8 +176,25 @@ void MirroredField::focusCame() {
   if (taking_ || field_->isEditing()) return;
   const std::shared_ptr<TextField> kept = field_;
   if (kept->becomeFirstResponder()) return;
-  // What can't be changed doesn't take the keyboard either.
-  if (GtkRoot* root = gtk_widget_get_root(entry_)) gtk_root_set_focus(root, nullptr);
+  // What can't be changed doesn't keep the keyboard after a press; the toolkit is still on the way to give it. Who walks by
+  // keyboard must be able to walk on from here.
+  if (!pressed_ || refusal_ != 0) return;
+  refusal_ = g_idle_add_full(
+      G_PRIORITY_DEFAULT_IDLE,
+      [](gpointer self) -> gboolean {
+        auto* mirror = static_cast<MirroredField*>(self);
+        mirror->refusal_ = 0;
+        mirror->giveFocusBack();
+        return G_SOURCE_REMOVE;
+      },
+      this, nullptr);
+}
+
+void MirroredField::giveFocusBack() {
+  pressed_ = false;
+  GtkRoot* root = gtk_widget_get_root(entry_);
+  GtkWidget* focus = root ? gtk_root_get_focus(root) : nullptr;
+  if (!field_->isEditing() && focus && gtk_widget_is_ancestor(focus, entry_)) gtk_root_set_focus(root, nullptr);
 }
 
 void MirroredField::focusLeft() {

@@ -22,6 +22,7 @@ class MirroredField {
   void typed();
   void focusCame();
   void focusLeft();
+  void giveFocusBack();
   void selectionMoved();
   void keepSelection();
   void beginWithCaret();
@@ -30,6 +31,9 @@ class MirroredField {
   GtkWidget* entry_;
   GtkEventController* focus_;
   guint idle_ = 0;
+  GtkGesture* press_;
+  bool pressed_ = false;  ///< and what comes of it is on its way
+  guint refusal_ = 0;
   TextRange first_;      ///< the selection with which editing began
   bool edited_ = false;  ///< it was being edited at the latest update
   TextRange known_;      ///< the selection that widget and model agreed on last

@@ -198,6 +198,22 @@ class Renaming(Details):
         self.assertIsNone(self.app.find("OK", "push button"))
 
 
+class NotRenameable(Details):
+    def prepare(self, app):
+        super().prepare(app)
+        os.setxattr(app.drive / "Report.txt", "user.vaelo.share", b"participant")
+
+    def test_a_press_on_the_name_changes_nothing(self):
+        before = self.app.accessibility.focused()
+        self.app.click("Name", "text")
+        self.app.wait_log("ShouldBeginEditing: 0")
+        wait_for(lambda: f"the name not to have the keyboard; it is at {self.app.accessibility.focused()}, and was at {before}",
+                 lambda: ("text", "Name") not in self.app.accessibility.focused())
+        self.assertIsNone(self.app.find("Rename File"))
+        self.app.key("Tab", "Tab", "Tab", "Tab")  # past the name, which is there to be read
+        wait_for("the keyboard beyond the name", lambda: any(name == "Share" for _, name in self.app.accessibility.focused()))
+
+
 class TagsOfTheDetails(Details):
     def prepare(self, app):
         super().prepare(app)

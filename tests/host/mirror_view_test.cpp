@@ -133,6 +133,7 @@ TEST_F(MirrorViewTest, ACentredTextIsInTheMiddleWhetherItCanBeClearedOrNot) {
     field->setTextAlignment(TextAlignment::Natural);
     settle();
     EXPECT_GT(std::abs(fromMiddle()), 5) << "it begins where the field does";
+    field->endEditing(true);
     hide();
   }
   gtk_widget_set_default_direction(GTK_TEXT_DIR_LTR);

@@ -11,7 +11,7 @@ namespace vaelo {
 namespace {
 
 constexpr const char* RestingClass = "vaelo-resting";
-constexpr const char* RestingStyle = "entry.vaelo-resting > text { color: transparent; }";
+constexpr const char* RestingStyle = "entry.vaelo-resting > text { color: transparent; caret-color: transparent; }";
 
 void addRestingStyle() {
   static bool added = false;
