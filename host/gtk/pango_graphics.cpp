@@ -30,6 +30,18 @@ GRef<PangoLayout> layoutOf(const std::string& text, const Font& font) {
 
 double points(int pangoUnits) { return static_cast<double>(pangoUnits) / PANGO_SCALE; }
 
+/// As lists show it. Of a folder or package the name tells nothing.
+GIcon* iconFor(const std::string& fileName, const std::optional<std::string>& typeIdentifier) {
+  TypeIdentifiers& types = Platform::current().types;
+  if (typeIdentifier && types.conformsTo(*typeIdentifier, "com.marrow.package")) {
+    return g_themed_icon_new("package-x-generic");
+  }
+  const bool isFolder = typeIdentifier && types.conformsTo(*typeIdentifier, "public.directory");
+  const std::string type =
+      isFolder ? "inode/directory" : takeString(g_content_type_guess(fileName.c_str(), nullptr, 0, nullptr));
+  return g_content_type_get_icon(type.c_str());
+}
+
 class CairoContext : public DrawingContext {
  public:
   explicit CairoContext(cairo_t* cairo) : cairo_(cairo) {}
@@ -146,11 +158,11 @@ ImageRef PangoGraphics::renderImage(const Size& size, const std::function<void(D
   return std::make_shared<GtkImageData>(GDK_PAINTABLE(takeCairoTexture(surface)), size.width, size.height);
 }
 
-ImageRef PangoGraphics::documentIcon(const std::string& fileName, const std::optional<std::string>&, IconFormat format) {
+ImageRef PangoGraphics::documentIcon(const std::string& fileName, const std::optional<std::string>& typeIdentifier,
+                                     IconFormat format) {
   const int size = format == IconFormat::Large ? 128 : 32;
   const int scale = format == IconFormat::Large ? 2 : 1;  // large ones are shown at twice their size
-  const std::string type = takeString(g_content_type_guess(fileName.c_str(), nullptr, 0, nullptr));
-  const GRef<GIcon> icon(g_content_type_get_icon(type.c_str()));
+  const GRef<GIcon> icon(iconFor(fileName, typeIdentifier));
   GtkIconTheme* theme = gtk_icon_theme_get_for_display(gdk_display_get_default());
   GtkIconPaintable* paintable =
       gtk_icon_theme_lookup_by_gicon(theme, icon.get(), size, scale, GTK_TEXT_DIR_NONE, static_cast<GtkIconLookupFlags>(0));
