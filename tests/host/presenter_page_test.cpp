@@ -6,6 +6,7 @@
 #include "host/drive/promise_file.h"
 #include "tests/host/list_test_folder.h"
 #include "tests/host/preview_page_support.h"
+#include "tests/host/preview_portable_document_support.h"
 
 namespace vaelo {
 
@@ -26,10 +27,39 @@ std::string progressShownIn(GtkWidget* widget) {
   return "";
 }
 
+GtkWidget* shownIn(const PreviewPage& page) { return gtk_stack_get_visible_child(GTK_STACK(page.widget())); }
+
+std::string textIn(GtkWidget* widget) {
+  if (GTK_IS_TEXT_VIEW(widget)) {
+    GtkTextBuffer* buffer = gtk_text_view_get_buffer(GTK_TEXT_VIEW(widget));
+    GtkTextIter begin;
+    GtkTextIter end;
+    gtk_text_buffer_get_bounds(buffer, &begin, &end);
+    return takeString(gtk_text_buffer_get_text(buffer, &begin, &end, FALSE));
+  }
+  for (GtkWidget* child = gtk_widget_get_first_child(widget); child; child = gtk_widget_get_next_sibling(child)) {
+    const std::string found = textIn(child);
+    if (!found.empty()) return found;
+  }
+  return "";
+}
+
+/// A second of it, in a WAVE file.
+std::string silence() {
+  const char header[] = "RIFF\xa4\x3e\0\0WAVEfmt \x10\0\0\0\1\0\1\0\x40\x1f\0\0\x80\x3e\0\0\2\0\x10\0data\x80\x3e\0\0";
+  return std::string(header, sizeof header - 1) + std::string(16000, '\0');
+}
+
 class PresenterPageTest : public preview_test::PreviewPageTest {
  protected:
   bool says(const std::string& part) {
     return waitUntil([&] { return said().find(part) != std::string::npos; });
+  }
+  /// The view that shows, once there is one; it is kept, so that no other can be taken for it.
+  GRef<GtkWidget> waitForView() {
+    const bool shown =
+        waitUntil([&] { return shownIn(*page) && !gtk_stack_get_visible_child_name(GTK_STACK(page->widget())); });
+    return shown ? GRef<GtkWidget>(GTK_WIDGET(g_object_ref(shownIn(*page)))) : GRef<GtkWidget>();
   }
   void promise(const std::string& name, std::uint64_t size) {
     PromiseInfo info;
@@ -47,6 +77,40 @@ TEST_F(PresenterPageTest, ADocumentThatIsDeletedWhileItLoads) {
   show(document);
   std::filesystem::remove(document);
   EXPECT_TRUE(says("This document is no longer there.")) << said();
+}
+
+TEST_F(PresenterPageTest, ADocumentThatIsMovedIsShownOn) {
+  for (const char* name : {"/Minutes.txt", "/Rivers.pdf", "/Tone.wav"}) {
+    const std::string moved = drive + "/Moved" + std::string(name).substr(1);
+    write(drive + name, silence());
+    if (std::string_view(name).ends_with(".txt")) write(drive + name, "Minutes\n");
+    if (std::string_view(name).ends_with(".pdf")) portable_document_test::writeDocument(drive + name, 2);
+    show(drive + name);
+    const GRef<GtkWidget> view = waitForView();
+    ASSERT_TRUE(view) << name;
+    std::filesystem::rename(drive + name, moved);
+    source->pointTo(moved);
+    controller->reloadData();
+    EXPECT_EQ(shownIn(*page), view.get()) << name;
+    // Whatever else is there by now is no reason to go on.
+    write(drive + name, "Something else\n");
+    source->pointTo(drive + name);
+    controller->reloadData();
+    EXPECT_TRUE(waitUntil([&] { return shownIn(*page) != view.get(); })) << name;
+  }
+}
+
+TEST_F(PresenterPageTest, ADocumentThatWasMovedIsReadAnewWhereItIs) {
+  write(drive + "/Minutes.txt", "Minutes\n");
+  show(drive + "/Minutes.txt");
+  const GRef<GtkWidget> view = waitForView();
+  ASSERT_TRUE(view);
+  std::filesystem::rename(drive + "/Minutes.txt", drive + "/Moved.txt");
+  source->pointTo(drive + "/Moved.txt");
+  controller->reloadData();
+  write(drive + "/Moved.txt", "Other minutes\n");
+  controller->refreshCurrentPreviewItem();
+  EXPECT_TRUE(waitUntil([&] { return textIn(view.get()) == "Other minutes\n"; })) << textIn(view.get());
 }
 
 TEST_F(PresenterPageTest, ADocumentThatIsDeletedAndReadAnew) {

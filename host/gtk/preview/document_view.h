@@ -38,6 +38,10 @@ class DocumentView {
   virtual GtkWidget* widget() = 0;
   /// Reads the document anew, as it was changed; what the user looks at stays where it is.
   virtual void refresh() = 0;
+  /// What is shown stands at this path now, with this name. False when the view can't go on with it, and is to be made anew.
+  virtual bool follow(const std::string& /*path*/, const std::string& /*name*/) { return false; }
+  /// True when what stands at the path was written by this view.
+  virtual bool wrote(const std::string& /*path*/) const { return false; }
   /// Buttons for the end of the header bar, from the outer edge inwards; made anew for each call.
   virtual std::vector<GtkWidget*> headerWidgets() { return {}; }
   /// The user asked to find text, or left it: Ctrl+F, and Escape. False when there is nothing to do.

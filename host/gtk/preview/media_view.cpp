@@ -86,6 +86,14 @@ class MediaView : public DocumentView {
     });
   }
 
+  bool follow(const std::string& path, const std::string& name) override {
+    if (!controls_) return false;
+    document_.path = path;
+    document_.name = name;
+    showName();
+    return true;
+  }
+
  private:
   void load() {
     stream_.reset(gtk_media_file_new_for_filename(document_.path.c_str()));
@@ -129,7 +137,8 @@ class MediaView : public DocumentView {
     GtkWidget* overlay = gtk_overlay_new();
     GtkWidget* picture = gtk_picture_new_for_paintable(GDK_PAINTABLE(stream_.get()));
     gtk_widget_add_css_class(overlay, "view");
-    gtk_accessible_update_property(GTK_ACCESSIBLE(picture), GTK_ACCESSIBLE_PROPERTY_LABEL, document_.name.c_str(), -1);
+    named_ = picture;
+    showName();
     GtkGesture* tap = gtk_gesture_click_new();
     g_signal_connect(tap, "released", G_CALLBACK(+[](GtkGestureClick*, int presses, double, double, MediaView* self) {
                        toggleMedia(self->stream_.get());
@@ -157,10 +166,19 @@ class MediaView : public DocumentView {
   GtkWidget* makeCover() {
     GtkWidget* cover = adw_status_page_new();
     adw_status_page_set_icon_name(ADW_STATUS_PAGE(cover), "audio-x-generic-symbolic");
-    char* title = g_markup_escape_text(document_.name.c_str(), -1);
-    adw_status_page_set_title(ADW_STATUS_PAGE(cover), title);
-    g_free(title);
+    named_ = cover;
+    showName();
     return cover;
+  }
+
+  void showName() {
+    if (!ADW_IS_STATUS_PAGE(named_)) {
+      gtk_accessible_update_property(GTK_ACCESSIBLE(named_), GTK_ACCESSIBLE_PROPERTY_LABEL, document_.name.c_str(), -1);
+      return;
+    }
+    char* title = g_markup_escape_text(document_.name.c_str(), -1);
+    adw_status_page_set_title(ADW_STATUS_PAGE(named_), title);
+    g_free(title);
   }
 
   void addShortcuts() {
@@ -225,6 +243,7 @@ class MediaView : public DocumentView {
   PreviewedDocument document_;
   DocumentViewEvents events_;
   GtkWidget* box_;
+  GtkWidget* named_ = nullptr;  // while there are controls
   GRef<GtkMediaStream> stream_;
   std::unique_ptr<MediaControls> controls_;
   std::unique_ptr<MediaFullScreen> fullScreen_;

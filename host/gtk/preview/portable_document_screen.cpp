@@ -64,8 +64,7 @@ PortableDocumentScreen::PortableDocumentScreen(const PreviewedDocument& document
       reading_(canvas_, [this](int page) { return texts_ ? texts_->of(page) : nullptr; }) {
   gtk_stack_set_hhomogeneous(GTK_STACK(stack_.get()), FALSE);  // what doesn't show asks for no room
   gtk_stack_add_child(GTK_STACK(stack_.get()), pages_);
-  gtk_accessible_update_property(GTK_ACCESSIBLE(canvas_.widget()), GTK_ACCESSIBLE_PROPERTY_LABEL, document_.name.c_str(),
-                                 -1);
+  showName();
   gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scrolled_), canvas_.widget());
   GtkWidget* overlay = gtk_overlay_new();
   gtk_overlay_set_child(GTK_OVERLAY(overlay), scrolled_);
@@ -208,6 +207,19 @@ void PortableDocumentScreen::refresh() {
   if (refreshWhenSaved_ || markup_.wrote(document_.path)) return;
   nextSource_.reset();
   load("");
+}
+
+bool PortableDocumentScreen::follow(const std::string& path, const std::string& name) {
+  if (nextSource_) return false;
+  document_.path = path;
+  document_.name = name;
+  showName();
+  return true;
+}
+
+void PortableDocumentScreen::showName() {
+  gtk_accessible_update_property(GTK_ACCESSIBLE(canvas_.widget()), GTK_ACCESSIBLE_PROPERTY_LABEL, document_.name.c_str(),
+                                 -1);
 }
 
 void PortableDocumentScreen::beginMarkup(bool mayBeMarked) {

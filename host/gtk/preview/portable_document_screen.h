@@ -40,6 +40,8 @@ class PortableDocumentScreen {
   GtkWidget* widget() const { return stack_.get(); }
 
   void refresh();
+  bool follow(const std::string& path, const std::string& name);
+  bool wrote(const std::string& path) const { return markup_.wrote(path); }
   std::vector<GtkWidget*> headerWidgets();
   bool toggleFind();
   bool closeFind();
@@ -66,6 +68,7 @@ class PortableDocumentScreen {
   void follow(const PageLink& link, const GdkRectangle& place);
   void askForMark(const PagePlace& place, const GdkRectangle& pointed);
   void marksChanged();
+  void showName();
   void load(const std::string& password);
   void opened(const PortableDocumentSource::Opened& opened, const std::string& password);
   void askForSizes(std::size_t known);

@@ -14,6 +14,8 @@ class PortableDocumentView : public DocumentView {
       : screen_(document, std::move(events), &Platform::current().fileCoordination) {}
   GtkWidget* widget() override { return screen_.widget(); }
   void refresh() override { screen_.refresh(); }
+  bool follow(const std::string& path, const std::string& name) override { return screen_.follow(path, name); }
+  bool wrote(const std::string& path) const override { return screen_.wrote(path); }
   std::vector<GtkWidget*> headerWidgets() override { return screen_.headerWidgets(); }
   bool toggleFind() override { return screen_.toggleFind(); }
   bool closeFind() override { return screen_.closeFind(); }

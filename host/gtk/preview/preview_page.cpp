@@ -19,6 +19,11 @@ constexpr const char* FolderNow = N_("There is a folder in this document’s pla
 
 constexpr const char* QueriedAttributes = G_FILE_ATTRIBUTE_STANDARD_TYPE "," G_FILE_ATTRIBUTE_STANDARD_CONTENT_TYPE;
 
+// A label of bytes that are no UTF-8 ends the process as soon as a screen reader asks for it.
+std::string displayNameOf(const URL& document) {
+  return takeString(g_filename_display_name(document.lastPathComponent().c_str()));
+}
+
 }  // namespace
 
 PreviewPage::PreviewPage(std::shared_ptr<PreviewController> controller, std::function<void()> headerChanged,
@@ -87,7 +92,22 @@ void PreviewPage::refresh() {
 void PreviewPage::infoReadAgain(GFileInfo* info) {
   reading_.reset();
   const char* type = info ? g_file_info_get_content_type(info) : nullptr;
-  type&& viewedType_ == type ? view_->refresh() : load();
+  if (!type || viewedType_ != type) return load();
+  viewedVersion_ = versionOf(viewed_->path());
+  view_->refresh();
+}
+
+// A document that another program moved goes on where it is: its page, what is looked for in it, the place that plays.
+bool PreviewPage::followItem() {
+  const std::optional<URL> shown = item();
+  const bool isShown = shown && view_ && !reading_ && gtk_stack_get_visible_child(GTK_STACK(stack_)) == view_->widget();
+  if (!isShown || shown == viewed_ || shown->pathExtension() != viewed_->pathExtension()) return false;
+  const std::optional<FileVersion> there = versionOf(shown->path());
+  const bool isSame = there && (there == viewedVersion_ || view_->wrote(shown->path()));
+  if (!isSame || !view_->follow(shown->path(), displayNameOf(*shown))) return false;
+  viewed_ = *shown;
+  noteRecentDocument(*shown);
+  return true;
 }
 
 void PreviewPage::dropView() {
@@ -105,6 +125,7 @@ void PreviewPage::stopLoading() {
 }
 
 void PreviewPage::load() {
+  if (followItem()) return;
   stopLoading();
   dropView();
   const std::optional<URL> shown = item();
@@ -172,10 +193,11 @@ void PreviewPage::makeView(const std::string& contentType) {
   // Of what the view shows: what is marked as another document comes is saved once that is the item.
   events.shouldSave = [this, edited = *shown] { return controller_->shouldSaveEditedItem(edited); };
   adw_status_page_set_description(ADW_STATUS_PAGE(loading_), nullptr);
-  // A label of bytes that are no UTF-8 ends the process as soon as a screen reader asks for it.
-  const std::string name = takeString(g_filename_display_name(shown->lastPathComponent().c_str()));
-  const PreviewedDocument document{shown->path(), name, contentType, controller_->canEditItem(*shown), patience_};
+  const PreviewedDocument document{shown->path(), displayNameOf(*shown), contentType, controller_->canEditItem(*shown),
+                                   patience_};
   viewedType_ = contentType;
+  viewed_ = *shown;
+  viewedVersion_ = versionOf(shown->path());
   view_ = makeDocumentView(document, std::move(events));
   gtk_stack_add_child(GTK_STACK(stack_), view_->widget());
 }

@@ -11,6 +11,7 @@
 
 #include "host/gtk/preview/document_view.h"
 #include "host/gtk/preview/facts_page.h"
+#include "host/gtk/preview/file_version.h"
 #include "host/gtk/share_button.h"
 #include "host/support/glib_ptr.h"
 #include "platform/ui/preview_controller.h"
@@ -40,6 +41,7 @@ class PreviewPage {
  private:
   void changed(PreviewChange change);
   void load();
+  bool followItem();
   void dropView();
   /// What the disk says of the shown document; null when it is not there.
   using InfoRead = void (PreviewPage::*)(GFileInfo* info);
@@ -66,6 +68,8 @@ class PreviewPage {
   GtkWidget* spinner_;
   std::unique_ptr<DocumentView> view_;
   std::string viewedType_;
+  std::optional<URL> viewed_;
+  std::optional<FileVersion> viewedVersion_;
   GRef<GCancellable> reading_;
   guint loadingTimer_ = 0;
   std::shared_ptr<void> token_;

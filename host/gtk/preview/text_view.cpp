@@ -57,7 +57,7 @@ class TextView : public DocumentView {
     gtk_text_view_set_right_margin(text, 12);
     gtk_text_view_set_top_margin(text, 12);
     gtk_text_view_set_bottom_margin(text, 12);
-    gtk_accessible_update_property(GTK_ACCESSIBLE(view_), GTK_ACCESSIBLE_PROPERTY_LABEL, document_.name.c_str(), -1);
+    showName();
     gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scrolled_), view_);
     gtk_widget_set_vexpand(scrolled_, TRUE);
     for (GtkWidget* child : {find_.widget(), scrolled_, note_}) gtk_box_append(GTK_BOX(box_), child);
@@ -82,6 +82,14 @@ class TextView : public DocumentView {
         TextLoad::Events{[this] { next_ ? showNext() : showNote(); }, [this](const std::string& error) { fail(error); }});
   }
 
+  bool follow(const std::string& path, const std::string& name) override {
+    if (next_) return false;
+    document_.path = path;
+    document_.name = name;
+    showName();
+    return true;
+  }
+
   std::vector<GtkWidget*> headerWidgets() override {
     return {makeFindButton(G_CALLBACK(+[](TextView* self) { self->toggleFind(); }), this)};
   }
@@ -93,6 +101,10 @@ class TextView : public DocumentView {
   bool closeFind() override { return find_.close(); }
 
  private:
+  void showName() {
+    gtk_accessible_update_property(GTK_ACCESSIBLE(view_), GTK_ACCESSIBLE_PROPERTY_LABEL, document_.name.c_str(), -1);
+  }
+
   // What counts the lines keeps the view, which keeps it: neither would ever go by itself. So does what it knew of the lines
   // when it was painted last, of which it lets go when it is painted with nothing to be painted.
   void dropLineNumbers() {
