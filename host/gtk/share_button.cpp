@@ -11,9 +11,17 @@ ShareButton::ShareButton(std::function<std::optional<URL>()> shown)
     : shown_(std::move(shown)),
       item_(BarButtonItem::system(SystemItem::Action, [this](const BarButtonItemRef&) { pressed(); })) {}
 
-void ShareButton::pressed() {
+std::optional<URL> ShareButton::shared() const {
   const std::optional<URL> document = shown_();
-  const std::optional<URL> resolved = document ? vlo_URLByResolvingBookmark(*document) : std::nullopt;
+  return document ? vlo_URLByResolvingBookmark(*document) : std::nullopt;
+}
+
+void ShareButton::shownChanged() {
+  if (sheet_ && sheet_->url() != shared()) sheet_ = nullptr;
+}
+
+void ShareButton::pressed() {
+  const std::optional<URL> resolved = shared();
   if (!resolved) return;
   sheet_ = Platform::current().screens.makeDocumentInteraction(*resolved);
   sheet_->presentOptionsMenuFromBarButtonItem(item_, true);

@@ -15,8 +15,11 @@ class ShareButton {
   /// `shown` answers the document; nothing when none is shown.
   explicit ShareButton(std::function<std::optional<URL>()> shown);
   const BarButtonItemRef& item() const { return item_; }
+  /// Takes away the sheet of a document that is no longer what is shown.
+  void shownChanged();
 
  private:
+  std::optional<URL> shared() const;
   void pressed();
 
   std::function<std::optional<URL>()> shown_;

@@ -290,6 +290,17 @@ class Wide(Share):
 class Phone(Share):
     size = (360, 720)
 
+    def test_the_sheet_goes_with_its_document(self):
+        self.share()
+        self.open("Documents/Minutes 1.txt")
+        self.app.wait_gone("Copy Link")
+        self.press_share()
+        self.assertEqual([row[1] for row in self.app.accessibility.showing() if row[0] == "list" and row[1].startswith("Share ")],
+                         ["Share Minutes 1.txt"])
+        (self.app.drive / "Documents" / "Minutes 1.txt").unlink()
+        self.app.wait_gone("Copy Link")
+        self.app.wait("Minutes 2.txt", "list item")
+
     def test_rises_from_the_bottom_and_is_left_by_every_road(self):
         app = self.app
         for leave in (lambda: app.click("Close", "push button"), lambda: app.key("Escape"),

@@ -125,6 +125,7 @@ void PreviewPage::stopLoading() {
 }
 
 void PreviewPage::load() {
+  share_.shownChanged();
   if (followItem()) return;
   stopLoading();
   dropView();
