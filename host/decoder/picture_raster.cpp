@@ -125,8 +125,8 @@ const char* PictureRaster::load(PictureSize wanted) {
   fine = gdk_pixbuf_loader_close(loader.get(), nullptr) && fine;
   g_signal_handlers_disconnect_by_data(loader.get(), &loading);
   if (loading.tooBig) return DecoderError::TooBig;
-  if (!fine && !gdk_pixbuf_loader_get_format(loader.get())) return DecoderError::Unsupported;
-  if (!fine && loading.rows == 0) return DecoderError::Damaged;
+  // There is a loader for what its name says that it is.
+  if (!fine && (!gdk_pixbuf_loader_get_format(loader.get()) || loading.rows == 0)) return DecoderError::Damaged;
   if (const char* problem = take(loader.get())) return problem;
   stored_ = isPhotograph_ ? loading.stored : decoded();
   partial_ = comesInRows && loading.rows < decoded().height;
