@@ -104,6 +104,13 @@ TEST_F(PagesCanvasTest, RevealScrollsNoFurtherThanNeeded) {
   EXPECT_LT(area.y + 320, 500);
 }
 
+TEST_F(PagesCanvasTest, WhatIsRevealedIsNotBelowThePageNumber) {
+  canvas_->showPage(10);
+  const double bottom = (canvas_->height() - canvas_->areaOf(10).y - 55) / canvas_->zoom();
+  canvas_->reveal(10, 50, bottom - 20, 150, bottom);
+  EXPECT_LE(canvas_->areaOf(10).y + bottom * canvas_->zoom(), canvas_->height() - 60);
+}
+
 TEST_F(PagesCanvasTest, KeysWalkAndZoom) {
   GtkWidget* scrolled = GTK_WIDGET(g_object_ref_sink(gtk_scrolled_window_new()));
   {

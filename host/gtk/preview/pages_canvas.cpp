@@ -201,7 +201,7 @@ void PagesCanvas::reveal(int page, double left, double top, double right, double
   if (page < 0 || page >= layout_.count()) return;
   const PageArea area = areaOf(page);
   const auto step = [](double low, double high, double extent) {
-    const double margin = std::min(48.0, extent / 6);
+    const double margin = std::min(64.0, extent / 6);  // the number of the page lies over the last of it
     if (low < margin) return low - margin;
     return high > extent - margin ? std::min(high - extent + margin, low - margin) : 0;
   };
