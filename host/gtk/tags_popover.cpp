@@ -168,16 +168,20 @@ class TagsPopover {
   void addRow(const std::string& name, bool on) {
     if (checks_.contains(name)) return;
     const auto color = palette_.find(name);
-    GtkWidget* text = gtk_label_new(nullptr);
+    // Beside each other, and not in one text, which would begin with the name's last letters where that is written from the
+    // other side.
+    GtkWidget* line = gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 4);
+    GtkWidget* dot = gtk_label_new(nullptr);
     // One that is not among the user's tags has no dot in the details either.
-    const std::string markup = (color == palette_.end() ? std::string(NoDot) : dotOf(color->second)) + " " +
-                               takeString(g_markup_escape_text(shown(name).c_str(), -1));
-    gtk_label_set_markup(GTK_LABEL(text), markup.c_str());
+    gtk_label_set_markup(GTK_LABEL(dot), color == palette_.end() ? NoDot : dotOf(color->second).c_str());
+    gtk_box_append(GTK_BOX(line), dot);
+    GtkWidget* text = gtk_label_new(shown(name).c_str());
     gtk_label_set_ellipsize(GTK_LABEL(text), PANGO_ELLIPSIZE_END);
-    gtk_label_set_max_width_chars(GTK_LABEL(text), 28);
+    gtk_label_set_max_width_chars(GTK_LABEL(text), 26);
     gtk_label_set_xalign(GTK_LABEL(text), 0);
+    gtk_box_append(GTK_BOX(line), text);
     GtkWidget* check = gtk_check_button_new();
-    gtk_check_button_set_child(GTK_CHECK_BUTTON(check), text);
+    gtk_check_button_set_child(GTK_CHECK_BUTTON(check), line);
     gtk_check_button_set_active(GTK_CHECK_BUTTON(check), on);
     gtk_widget_set_size_request(check, -1, RowHeight);
     setAccessibleName(check, shown(name));

@@ -127,6 +127,12 @@ class Tags(unittest.TestCase):
         for complaint in ("still has children left", "GTK_IS_ACCESSIBLE"):
             self.assertNotIn(complaint, app.log())
 
+    def test_names_begin_behind_their_dots_however_they_are_written(self):
+        os.setxattr(self.app.drive / "Report.txt", "user.xdg.tags", "Work,مهم".encode())
+        self.open_tags()
+        begins = {name: self.app.wait(name, "label")[2] for name in ("Work", "مهم", "Red")}
+        self.assertEqual(len(set(begins.values())), 1, begins)
+
     def test_what_another_program_adds_is_offered(self):
         new = self.values.with_suffix(".new")
         new.write_text("{'RoverTagDict': <{'RoverTagDictVersion': <uint64 2>, 'RoverTags': <[{'n': <'Garden'>, 'l': <uint64 2>}]>}>}")
