@@ -80,10 +80,11 @@ TEST_F(PresenterPageTest, ADocumentThatIsDeletedWhileItLoads) {
 }
 
 TEST_F(PresenterPageTest, ADocumentThatIsMovedIsShownOn) {
-  for (const char* name : {"/Minutes.txt", "/Rivers.pdf", "/Tone.wav"}) {
+  for (const char* name : {"/Minutes.txt", "/Rivers.pdf", "/Tone.wav", "/Welcome.md"}) {
     const std::string moved = drive + "/Moved" + std::string(name).substr(1);
     write(drive + name, silence());
-    if (std::string_view(name).ends_with(".txt")) write(drive + name, "Minutes\n");
+    if (std::string_view(name).ends_with(".txt") || std::string_view(name).ends_with(".md"))
+      write(drive + name, "Minutes\n");
     if (std::string_view(name).ends_with(".pdf")) portable_document_test::writeDocument(drive + name, 2);
     show(drive + name);
     const GRef<GtkWidget> view = waitForView();

@@ -50,7 +50,7 @@ class MarkdownView : public DocumentView {
     gtk_text_view_set_top_margin(text, LeastMargin);
     gtk_text_view_set_bottom_margin(text, LeastMargin);
     setMargins(0);
-    gtk_accessible_update_property(GTK_ACCESSIBLE(view_), GTK_ACCESSIBLE_PROPERTY_LABEL, document_.name.c_str(), -1);
+    showName();
     g_signal_connect(view_, "map", G_CALLBACK(+[](GtkWidget* view, gpointer) { gtk_widget_grab_focus(view); }), nullptr);
     gtk_scrolled_window_set_child(GTK_SCROLLED_WINDOW(scrolled_), view_);
     gtk_widget_set_vexpand(scrolled_, TRUE);
@@ -80,6 +80,14 @@ class MarkdownView : public DocumentView {
     if (!isSourceOnly_) load();
   }
 
+  bool follow(const std::string& path, const std::string& name) override {
+    if (next_ || (source_ && !source_->follow(path, name))) return false;
+    document_.path = path;
+    document_.name = name;
+    showName();
+    return true;
+  }
+
   std::vector<GtkWidget*> headerWidgets() override {
     GtkWidget* find = gtk_button_new_from_icon_name("edit-find-symbolic");
     gtk_widget_set_tooltip_text(find, _("Find in This Document"));
@@ -106,6 +114,10 @@ class MarkdownView : public DocumentView {
   bool closeFind() override { return showsSource() ? source_->closeFind() : find_.close(); }
 
  private:
+  void showName() {
+    gtk_accessible_update_property(GTK_ACCESSIBLE(view_), GTK_ACCESSIBLE_PROPERTY_LABEL, document_.name.c_str(), -1);
+  }
+
   bool showsSource() const { return source_ && gtk_stack_get_visible_child(GTK_STACK(stack_)) == source_->widget(); }
 
   void load() {
