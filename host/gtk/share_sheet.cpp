@@ -47,6 +47,8 @@ GtkWidget* makeHeader(const SharedItem& item, Callback closed) {
   gtk_box_append(GTK_BOX(texts), name);
   GtkWidget* facts = makeText(factsOf(item), "dim-label");
   gtk_label_set_ellipsize(GTK_LABEL(facts), PANGO_ELLIPSIZE_END);
+  gtk_label_set_wrap(GTK_LABEL(facts), TRUE);
+  gtk_label_set_lines(GTK_LABEL(facts), 3);
   gtk_box_append(GTK_BOX(texts), facts);
   gtk_box_append(GTK_BOX(header), texts);
   if (closed) {

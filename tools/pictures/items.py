@@ -135,6 +135,7 @@ def play(stage):
     stage.shot("refusal")
     app.key("Escape")
     stage.wait_gone("This can’t be done with this item.")
+    stage.wait_gone("Undo")  # it stands over the last rows
     stage.app.click(SKETCHBOOK.get(stage.style, "Sketchbook"), "list item", button=3)
     stage.choose("_Delete…")
     stage.wait("Delete from Vaelo Drive")
