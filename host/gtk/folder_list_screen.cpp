@@ -5,6 +5,7 @@
 
 #include "host/gtk/item_actions_menu.h"
 #include "host/gtk/tags_popover.h"
+#include "host/support/display_name.h"
 #include "host/support/texts.h"
 #include "platform/platform.h"
 
@@ -33,10 +34,7 @@ std::string titleOf(const URL& folder, CloudDocuments& drive) {
     const Result<CloudContainerRef> container = drive.containerForURL(folder);
     if (container.value) return (*container.value)->localizedName();
   }
-  char* name = g_filename_display_name(folder.lastPathComponent().c_str());
-  std::string title = name;
-  g_free(name);
-  return title;
+  return displayNameOf(folder);
 }
 
 }  // namespace

@@ -2,7 +2,7 @@
 #include "host/gtk/folder_picker.h"
 
 #include "fileops/ui_utils.h"
-#include "host/support/glib_ptr.h"
+#include "host/support/display_name.h"
 #include "host/support/texts.h"
 #include "items/file_utils.h"
 #include "platform/localized.h"
@@ -137,16 +137,14 @@ std::string FolderPicker::invitation() const {
   return filled(_("Move “%s” to…"), {nameOfItem()});
 }
 
-std::string FolderPicker::nameOfItem() const {
-  return takeString(g_filename_display_name(picker_->itemsToMove().front().lastPathComponent().c_str()));
-}
+std::string FolderPicker::nameOfItem() const { return displayNameOf(picker_->itemsToMove().front()); }
 
 std::string FolderPicker::titleOf(const URL& folder) const {
   if (drive_.isDocumentsContainer(folder)) {
     const Result<CloudContainerRef> container = drive_.containerForURL(folder);
     if (container.value && *container.value) return (*container.value)->localizedName();
   }
-  return takeString(g_filename_display_name(folder.lastPathComponent().c_str()));
+  return displayNameOf(folder);
 }
 
 void FolderPicker::goTo(const URL& folder) {

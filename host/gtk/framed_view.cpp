@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "host/gtk/mirrored_text.h"
+#include "host/gtk/style.h"
 #include "platform/ui/button.h"
 #include "platform/ui/label.h"
 
@@ -20,17 +21,6 @@ constexpr double TouchSide = 44;  // a finger needs more than a line of small te
 // A model's button is its title with a little room around it; a theme's is higher than a toolbar's line may be.
 constexpr const char* ButtonStyle =
     "button.vaelo-framed { min-height: 0; min-width: 0; padding: 5px 6px; border-radius: 9px; font-weight: normal; }";
-
-void addStyle() {
-  static bool added = false;
-  GdkDisplay* display = gdk_display_get_default();
-  if (added || !display) return;
-  added = true;
-  GtkCssProvider* provider = gtk_css_provider_new();
-  gtk_css_provider_load_from_data(provider, ButtonStyle, -1);
-  gtk_style_context_add_provider_for_display(display, GTK_STYLE_PROVIDER(provider), GTK_STYLE_PROVIDER_PRIORITY_APPLICATION);
-  g_object_unref(provider);
-}
 
 GtkWidget* textOf(const Label& label) {
   GtkWidget* text = gtk_label_new(label.text().c_str());
@@ -162,7 +152,7 @@ FramedView& mirrorOf(GtkWidget* box) { return *static_cast<FramedView*>(g_object
 }  // namespace
 
 GtkWidget* makeFramedView(const ViewRef& view) {
-  addStyle();
+  addStyle(ButtonStyle);
   GtkWidget* box = gtk_box_new(GTK_ORIENTATION_VERTICAL, 0);
   g_object_set_data_full(G_OBJECT(box), MirrorKey, new FramedView(view, box),
                          [](gpointer mirror) { delete static_cast<FramedView*>(mirror); });

@@ -10,6 +10,7 @@
 #include "host/gtk/offer_button.h"
 #include "host/gtk/root_list_screen.h"
 #include "host/gtk/upgrade_flow.h"
+#include "host/support/display_name.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
 
@@ -88,8 +89,7 @@ void GtkScreens::runPreOpenAlert(const URL& url, const ViewControllerRef& presen
   if (isHere || !physicalPathOf(url.path())) return open();
   const auto shown = window();
   if (!shown || std::dynamic_pointer_cast<DocumentListController>(presenter)) return;
-  const std::string name = takeString(g_filename_display_name(url.lastPathComponent().c_str()));
-  shown->showToast(filled(_("“%s” is not downloaded yet."), {name}));
+  shown->showToast(filled(_("“%s” is not downloaded yet."), {displayNameOf(url)}));
 }
 
 InterfaceIdiom GtkScreens::userInterfaceIdiom() {

@@ -8,6 +8,7 @@
 #include "host/gtk/focus_return.h"
 #include "host/gtk/item_peek.h"
 #include "host/gtk/popover_parent.h"
+#include "host/gtk/style.h"
 #include "host/gtk/touch_size.h"
 #include "host/support/texts.h"
 #include "platform/ui/document_list_controller_delegate.h"
@@ -59,15 +60,7 @@ void choose(GSimpleAction*, GVariant* parameter, gpointer data) {
 
 /// A finger that opened the menu by a long press is what chooses from it.
 void makeRowsLarge(GtkWidget* menu) {
-  static GtkCssProvider* const provider = [] {
-    const std::string style = ".vaelo-item-menu modelbutton { min-height: " + std::to_string(TouchSize) + "px; }";
-    GtkCssProvider* made = gtk_css_provider_new();
-    gtk_css_provider_load_from_data(made, style.c_str(), -1);
-    gtk_style_context_add_provider_for_display(gdk_display_get_default(), GTK_STYLE_PROVIDER(made),
-                                               GTK_STYLE_PROVIDER_PRIORITY_APPLICATION);
-    return made;
-  }();
-  static_cast<void>(provider);
+  addStyle((".vaelo-item-menu modelbutton { min-height: " + std::to_string(TouchSize) + "px; }").c_str());
   gtk_widget_add_css_class(menu, "vaelo-item-menu");
 }
 

@@ -10,6 +10,7 @@
 #include "host/gtk/mirror/view_mirror.h"
 #include "host/gtk/pango_graphics.h"
 #include "host/gtk/preview/preview_page.h"
+#include "host/gtk/style.h"
 #include "host/support/glib_ptr.h"
 #include "host/support/texts.h"
 #include "preview/preview_details_view_controller.h"
@@ -24,16 +25,6 @@ constexpr const char* TightStyle =
     ".vaelo-tight headerbar button.text-button, .vaelo-tight .toolbar button { padding-left: 6px; padding-right: 6px; }"
     ".vaelo-tight headerbar windowtitle .title { font-size: 70%; }";
 constexpr int MostTitleLines = 2;
-
-void addStyle() {
-  static bool added = false;
-  GdkDisplay* display = gdk_display_get_default();
-  if (std::exchange(added, true) || !display) return;
-  const GRef<GtkCssProvider> provider(gtk_css_provider_new());
-  gtk_css_provider_load_from_data(provider.get(), TightStyle, -1);
-  gtk_style_context_add_provider_for_display(display, GTK_STYLE_PROVIDER(provider.get()),
-                                             GTK_STYLE_PROVIDER_PRIORITY_APPLICATION);
-}
 
 void setLines(GtkWidget* title, int lines) {
   for (GtkWidget* child = gtk_widget_get_first_child(title); child; child = gtk_widget_get_next_sibling(child)) {
@@ -57,7 +48,7 @@ ScreenPage::ScreenPage(ViewControllerRef screen, std::function<void()> goBack, G
       toolbarEdge_(gtk_separator_new(GTK_ORIENTATION_HORIZONTAL)),
       toolbar_(gtk_box_new(GTK_ORIENTATION_HORIZONTAL, 6)),
       goBack_(std::move(goBack)) {
-  addStyle();
+  addStyle(TightStyle);
   // What is in the page looks for its actions here only if this has had a place for them from the beginning.
   gtk_widget_insert_action_group(box_, NarrowActions, nullptr);
   adw_header_bar_set_title_widget(ADW_HEADER_BAR(header_), title_);

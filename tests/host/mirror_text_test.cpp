@@ -7,7 +7,22 @@
 namespace vaelo {
 namespace {
 
-using MirrorTextTest = MirrorViewTest;
+constexpr double DotSize = 10;
+
+class MirrorTextTest : public MirrorViewTest {
+ protected:
+  void setTwoTags() {
+    const ImageRef dot = PangoGraphics().renderImage({DotSize, DotSize}, [](DrawingContext& context) {
+      context.fillRect({0, 0, DotSize, DotSize});
+    });
+    AttributedString tags;
+    for (const char* name : {"Work ", "Holiday"}) {
+      tags.appendImage(dot);
+      tags.append(name);
+    }
+    label->setAttributedText(tags);
+  }
+};
 
 /// Letters of twice the size, for as long as it lives.
 struct LargeLetters {
@@ -35,15 +50,7 @@ TEST_F(MirrorTextTest, LargeLettersTakeFurtherLines) {
 }
 
 TEST_F(MirrorTextTest, APictureInATextStandsNearerToWhatFollowsIt) {
-  const ImageRef dot = PangoGraphics().renderImage({10, 10}, [](DrawingContext& context) {
-    context.fillRect({0, 0, 10, 10});
-  });
-  AttributedString tags;
-  for (const char* name : {"Work ", "Holiday"}) {
-    tags.appendImage(dot);
-    tags.append(name);
-  }
-  label->setAttributedText(tags);
+  setTwoTags();
   show();
   GtkWidget* first = gtk_widget_get_first_child(widgets()[0]);
   GtkWidget* work = gtk_widget_get_next_sibling(first);
@@ -54,7 +61,7 @@ TEST_F(MirrorTextTest, APictureInATextStandsNearerToWhatFollowsIt) {
   Label words;
   words.setText("Work Holiday");
   EXPECT_EQ(label->intrinsicContentSize().width,
-            words.intrinsicContentSize().width + 2 * dot->width() + AttributedString::RoomBeforeImage);
+            words.intrinsicContentSize().width + 2 * DotSize + AttributedString::RoomBeforeImage);
 }
 
 TEST_F(MirrorTextTest, APictureInATextIsAsFineAsTheScreenAndNoLargerForIt) {
@@ -131,15 +138,7 @@ TEST_F(MirrorTextTest, OfManyThingsWithPicturesTheLastAreLeftOut) {
 
 TEST_F(MirrorTextTest, InLargeLettersThingsWithPicturesStandBelowEachOther) {
   const LargeLetters large;
-  const ImageRef dot = PangoGraphics().renderImage({10, 10}, [](DrawingContext& context) {
-    context.fillRect({0, 0, 5, 10});
-  });
-  AttributedString tags;
-  for (const char* name : {"Work ", "Holiday"}) {
-    tags.appendImage(dot);
-    tags.append(name);
-  }
-  label->setAttributedText(tags);
+  setTwoTags();
   show();
   GtkWidget* box = widgets()[0];
   ASSERT_EQ(gtk_orientable_get_orientation(GTK_ORIENTABLE(box)), GTK_ORIENTATION_VERTICAL);

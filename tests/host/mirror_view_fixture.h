@@ -12,6 +12,7 @@
 #include "platform/ui/scroll_view.h"
 #include "platform/ui/stack_view.h"
 #include "platform/ui/visual_format.h"
+#include "tests/host/painted_frame.h"
 #include "tests/support/memory_platform.h"
 
 namespace vaelo {
@@ -54,15 +55,7 @@ class MirrorViewTest : public testing::Test {
     gtk_widget_show(window);
     settle();
   }
-  void settle() {
-    // Until a frame was drawn after the last change.
-    bool drawn = false;
-    gtk_widget_queue_draw(window);
-    g_signal_connect(gtk_widget_get_frame_clock(window), "after-paint",
-                     G_CALLBACK(+[](GdkFrameClock*, bool* flag) { *flag = true; }), &drawn);
-    while (!drawn) g_main_context_iteration(nullptr, TRUE);
-    g_signal_handlers_disconnect_by_data(gtk_widget_get_frame_clock(window), &drawn);
-  }
+  void settle() { waitForFrame(window); }
   std::vector<GtkWidget*> widgets() {
     GtkWidget* scroller = gtk_widget_get_first_child(mirror->widget());
     GtkWidget* area = gtk_widget_get_first_child(gtk_scrolled_window_get_child(GTK_SCROLLED_WINDOW(scroller)));

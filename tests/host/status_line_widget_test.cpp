@@ -8,6 +8,7 @@
 #include "host/gtk/mirrored_text.h"
 #include "host/gtk/offer_button.h"
 #include "host/gtk/pango_graphics.h"
+#include "tests/host/painted_frame.h"
 #include "tests/support/memory_platform.h"
 
 namespace vaelo {
@@ -27,15 +28,7 @@ class StatusLineWidgetTest : public testing::Test {
   }
   ~StatusLineWidgetTest() override { gtk_window_destroy(GTK_WINDOW(window)); }
 
-  void settle() {
-    // Until a frame was drawn after the last change.
-    bool drawn = false;
-    gtk_widget_queue_draw(window);
-    g_signal_connect(gtk_widget_get_frame_clock(window), "after-paint",
-                     G_CALLBACK(+[](GdkFrameClock*, bool* flag) { *flag = true; }), &drawn);
-    while (!drawn) g_main_context_iteration(nullptr, TRUE);
-    g_signal_handlers_disconnect_by_data(gtk_widget_get_frame_clock(window), &drawn);
-  }
+  void settle() { waitForFrame(window); }
   GtkWidget* text() { return gtk_widget_get_first_child(widget); }
   GtkWidget* press() { return gtk_widget_get_last_child(widget); }
   double middleOf(GtkWidget* part) {

@@ -4,7 +4,7 @@
 #include <cmath>
 
 #include "host/gtk/mirrored_text.h"
-#include "host/support/glib_ptr.h"
+#include "host/gtk/style.h"
 
 namespace vaelo {
 
@@ -13,17 +13,6 @@ namespace {
 constexpr const char* RestingClass = "vaelo-resting";
 constexpr const char* RestingStyle = "entry.vaelo-resting > text { color: transparent; caret-color: transparent; }";
 
-void addRestingStyle() {
-  static bool added = false;
-  GdkDisplay* display = gdk_display_get_default();
-  if (added || !display) return;
-  added = true;
-  const GRef<GtkCssProvider> provider(gtk_css_provider_new());
-  gtk_css_provider_load_from_data(provider.get(), RestingStyle, -1);
-  gtk_style_context_add_provider_for_display(display, GTK_STYLE_PROVIDER(provider.get()),
-                                             GTK_STYLE_PROVIDER_PRIORITY_APPLICATION);
-}
-
 }  // namespace
 
 MirroredName::MirroredName(TextField& field)
@@ -31,7 +20,7 @@ MirroredName::MirroredName(TextField& field)
       field_(field),
       overlay_(GTK_WIDGET(g_object_ref_sink(gtk_overlay_new()))),
       text_(gtk_label_new(nullptr)) {
-  addRestingStyle();
+  addStyle(RestingStyle);
   gtk_overlay_set_child(GTK_OVERLAY(overlay_), field_.widget());
   gtk_label_set_ellipsize(GTK_LABEL(text_), PANGO_ELLIPSIZE_MIDDLE);
   gtk_label_set_single_line_mode(GTK_LABEL(text_), TRUE);

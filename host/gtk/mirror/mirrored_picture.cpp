@@ -8,6 +8,7 @@
 
 #include "host/gtk/cairo_texture.h"
 #include "host/gtk/pango_graphics.h"
+#include "host/gtk/style.h"
 #include "host/support/glib_ptr.h"
 
 namespace vaelo {
@@ -17,17 +18,6 @@ namespace {
 constexpr const char* BorderClass = "vaelo-bordered";
 constexpr const char* BorderStyle =
     "picture.vaelo-bordered { outline: 1px solid alpha(currentColor, .16); outline-offset: -1px; }";
-
-void addPictureStyle() {
-  static bool added = false;
-  GdkDisplay* display = gdk_display_get_default();
-  if (added || !display) return;
-  added = true;
-  const GRef<GtkCssProvider> provider(gtk_css_provider_new());
-  gtk_css_provider_load_from_data(provider.get(), BorderStyle, -1);
-  gtk_style_context_add_provider_for_display(display, GTK_STYLE_PROVIDER(provider.get()),
-                                             GTK_STYLE_PROVIDER_PRIORITY_APPLICATION);
-}
 
 /// The picture with each pixel as a square of `times` by `times`: the toolkit itself would blur small ones.
 GdkPaintable* magnified(GdkTexture* texture, int times) {
@@ -59,7 +49,7 @@ int magnification(const ImageView& view, GdkPaintable* picture) {
 }  // namespace
 
 MirroredPicture::MirroredPicture(ImageView& view) : view_(view), area_(GTK_WIDGET(g_object_ref_sink(gtk_picture_new()))) {
-  addPictureStyle();
+  addStyle(BorderStyle);
   gtk_picture_set_content_fit(GTK_PICTURE(area_), GTK_CONTENT_FIT_FILL);
   update();
 }

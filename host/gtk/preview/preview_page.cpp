@@ -6,6 +6,7 @@
 #include "host/desktop/recent_documents.h"
 #include "host/drive/packages.h"
 #include "host/gtk/bar_item_widget.h"
+#include "host/support/display_name.h"
 #include "host/support/texts.h"
 
 namespace vaelo {
@@ -18,11 +19,6 @@ constexpr const char* NoLongerThere = N_("This document is no longer there.");
 constexpr const char* FolderNow = N_("There is a folder in this document’s place now.");
 
 constexpr const char* QueriedAttributes = G_FILE_ATTRIBUTE_STANDARD_TYPE "," G_FILE_ATTRIBUTE_STANDARD_CONTENT_TYPE;
-
-// A label of bytes that are no UTF-8 ends the process as soon as a screen reader asks for it.
-std::string displayNameOf(const URL& document) {
-  return takeString(g_filename_display_name(document.lastPathComponent().c_str()));
-}
 
 }  // namespace
 
@@ -192,7 +188,7 @@ void PreviewPage::makeView(const std::string& contentType) {
     adw_status_page_set_description(ADW_STATUS_PAGE(loading_), sentence.c_str());
   };
   // Of what the view shows: what is marked as another document comes is saved once that is the item.
-  events.shouldSave = [this, edited = *shown] { return controller_->shouldSaveEditedItem(edited); };
+  events.shouldSave = [this] { return viewed_ && controller_->shouldSaveEditedItem(*viewed_); };
   adw_status_page_set_description(ADW_STATUS_PAGE(loading_), nullptr);
   const PreviewedDocument document{shown->path(), displayNameOf(*shown), contentType, controller_->canEditItem(*shown),
                                    patience_};
